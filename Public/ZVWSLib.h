@@ -1,0 +1,582 @@
+// The web-service library: a flat interface over the storefront's browse, account and stream services.
+//
+// Sessions. ZV_WS_initialize makes a session, ZV_WS_duplicate makes a further one with the same settings, ZV_WS_release
+// ends either. A session serves one thread at a time; threads that work at once take a session each. Calls without a
+// session may be made from any thread.
+//
+// Records. Everything a call hands out is a record derived from ZV_WS_Object. The rules for all of them:
+//  1. A call empties and tags its output before anything else, without looking at what it held: release a record before
+//     using it for another call.
+//  2. Whatever the status, the caller owns the output afterwards and frees it with ZV_WS_release, which also takes
+//  records
+//     that a failed call left empty, and records released before.
+//  3. char* members are UTF-8 texts owned by the record; null when the service sent none. Arrays are `size` elements
+//  behind a
+//     pointer that is null when size is 0. Absent numbers are 0, absent booleans false.
+//
+// Results. Every call returns a ZV_WS_Status (ZV_WS_Status.h) and throws nothing. For calls that ask a service:
+//  - ZV_WS_Status_invalid_param: the handle has no session, or an argument is null or empty where that is not allowed;
+//  nothing
+//    was sent.
+//  - -2011, -2012, -4xxx, -5030, -6xxx: the transport failed; the output is empty. A later call may succeed.
+//  - other values: the service refused. Records that extend ZV_WS_StandardResponse hold its code and message.
+//  - ZV_WS_Status_general_error is also an answer without its result element, and memory exhaustion.
+// An output pointer must not be null (assertion).
+//
+// Blocking. A call that asks a service blocks until the answer is there, at most for the session's timeouts (30 s to
+// connect or send, 88 s to receive). No other call blocks on the network unless its comment says so.
+#pragma once
+
+#include <time.h>
+
+#include "ZV_WS_Status.h"
+
+// ---- Enumerations. Numbers outside of the lists occur (a service may know more) and are values like others.
+
+enum ZV_WS_PurchaseType : int { PURCHASE_TYPE_RENT = 0, PURCHASE_TYPE_BUY = 1, PURCHASE_TYPE_ANY = 2 };
+
+enum ZV_WS_TitleTypeFilter : int { TITLE_TYPE_FILTER_ANY = 0, TITLE_TYPE_FILTER_TV = 1, TITLE_TYPE_FILTER_MOVIE = 2 };
+
+enum ZV_WS_FileProfile : int {
+    FILE_PROFILE_UNKNOWN = 0,
+    FILE_PROFILE_STANDARD = 1,
+    FILE_PROFILE_HIGHDEFINITION = 2,
+    FILE_PROFILE_PORTABLE = 3,
+    FILE_PROFILE_PORTABLE_STANDARD = 4,
+    FILE_PROFILE_TEMP5 = 5,
+    FILE_PROFILE_PORTABLE_WIDE = 6,
+    FILE_PROFILE_STANDARD_DEFINITION_3D = 7,
+    FILE_PROFILE_HIGH_DEFINITION_3D = 8,
+    FILE_PROFILE_STANDARD_DEFINITION_REALD_3D = 9,
+    FILE_PROFILE_HIGH_DEFINITION_REALD_3D = 10,
+};
+
+enum ZV_WS_AudioProfile : int {
+    AUDIO_PROFILE_STEREO_STANDARD = 0,
+    AUDIO_PROFILE_DOLBY_STEREO_AC3 = 1,
+    AUDIO_PROFILE_DOLBY_DIGITAL_PLUS_STEREO = 2,
+    AUDIO_PROFILE_DOLBY_DIGITAL_PLUS_51 = 3,
+    AUDIO_PROFILE_DTS_EXPRESS_STEREO = 4,
+    AUDIO_PROFILE_DTS_EXPRESS_51 = 5,
+};
+
+enum ZV_WS_BonusAssetType : int { BONUS_ASSET_TYPE_TRAILER = 0 };
+
+enum ZV_WS_WatchStatus : int {
+    WATCH_STATUS_WATCHNOW = 0,
+    WATCH_STATUS_RENTAGAIN = 1,
+    WATCH_STATUS_NOTAVAILABLE = 2,
+    WATCH_STATUS_UNDEFINED = 3,
+};
+
+enum ZV_WS_StreamStatus : int {
+    STREAM_STATUS_PLAY = 0,
+    STREAM_STATUS_STOPPED = 1,
+    STREAM_STATUS_PAUSED = 2,
+    STREAM_STATUS_RESUMEPLAY = 3,
+    STREAM_STATUS_ERRORINPLAYBACK = 4,
+};
+
+enum ZV_WS_SortOrder : int {
+    SORT_ORDER_DATEADDED = 0,
+    SORT_ORDER_TITLENAME = 1,
+    SORT_ORDER_RATING = 2,
+    SORT_ORDER_USERRATING = 3,
+};
+
+enum ZV_WS_DRMProvider : int {
+    DRM_PROVIDER_UNKNOWN = 0,
+    DRM_PROVIDER_WMDRM10 = 1,
+    DRM_PROVIDER_TIVODRM = 2,
+    DRM_PROVIDER_WIDEVINE = 3,
+    DRM_PROVIDER_WMDRM7 = 4,
+    DRM_PROVIDER_WMDRM9 = 5,
+    DRM_PROVIDER_FLUX = 6,
+    DRM_PROVIDER_DIVX = 7,
+};
+
+enum ZV_WS_AccessType : int { ACCESS_TYPE_UNKNOWN = 0, ACCESS_TYPE_DOWNLOAD = 1, ACCESS_TYPE_STREAM = 2 };
+
+enum ZV_WS_VideoFormat : int {
+    VIDEO_FORMAT_UNKNOWN = 0,
+    VIDEO_FORMAT_WMV9 = 1,
+    VIDEO_FORMAT_MPEG2_TIVO = 2,
+    VIDEO_FORMAT_MPEG2_STANDARD = 3,
+    VIDEO_FORMAT_VC1 = 4,
+    VIDEO_FORMAT_DIVX = 5,
+    VIDEO_FORMAT_H264 = 6,
+    VIDEO_FORMAT_FLUX = 7,
+};
+
+enum ZV_WS_FileExtension : int {
+    FILE_EXTENSION_AUTOPOPULATE = 0,
+    FILE_EXTENSION_UNKNOWN = 1,
+    FILE_EXTENSION_WMV = 2,
+    FILE_EXTENSION_MPEG = 3,
+    FILE_EXTENSION_MP4 = 4,
+    FILE_EXTENSION_FLUX = 5,
+    FILE_EXTENSION_AVI = 6,
+    FILE_EXTENSION_QT = 7,
+    FILE_EXTENSION_FLV = 8,
+    FILE_EXTENSION_RM = 9,
+    FILE_EXTENSION_DIVX = 10,
+};
+
+/// Not sorted by size: the numbers are stored in cache files and stay as they are.
+enum ZV_WS_BoxArtSize : int {
+    BOX_ART_SIZE_95 = 0,
+    BOX_ART_SIZE_175 = 1,
+    BOX_ART_SIZE_65 = 2,
+    BOX_ART_SIZE_77 = 3,
+    BOX_ART_SIZE_102 = 4,
+    BOX_ART_SIZE_126 = 5,
+    BOX_ART_SIZE_135S = 6,
+    BOX_ART_SIZE_137 = 7,
+    BOX_ART_SIZE_153 = 8,
+    BOX_ART_SIZE_177 = 9,
+    BOX_ART_SIZE_203 = 10,
+    BOX_ART_SIZE_269 = 11,
+    BOX_ART_SIZE_321 = 12,
+};
+
+/// The environment a session works in. Discovery stores the digit the service sent, also one outside of this list.
+enum ZV_WS_EnvID : int { ENVID_APISTG = 0, ENVID_INTERNALSTG = 1, ENVID_PRODUCTION = 2 };
+
+/// The environment asked for at set-up; ENVNUM_DEFAULT (and anything larger) asks the service.
+enum ZV_WS_EnvNum : int { ENVNUM_APISTG = 0, ENVNUM_INTERNALSTG = 1, ENVNUM_PRODUCTION = 2, ENVNUM_DEFAULT = 3 };
+
+/// General or adult catalogue.
+enum ContentType : int { ContentType_ZV = 0, ContentType_KAC = 1 };
+
+enum CacheType : int { CacheType_None = 0, CacheType_Memory = 1, CacheType_File = 2 };
+
+// ---- Set-up, filled by the caller. Texts are borrowed for the call; nothing of them is kept.
+
+struct ZV_WS_CacheParam {
+    /// Which kinds of answer are cached: bits of `Data`. The last three are the cache's own names of the same bits.
+    enum CacheData : unsigned int {
+        CacheData_Metadata = 1,
+        CacheData_BoxArtImage = 2,
+        CacheData_Userdata = 4,
+        CacheData_Service = CacheData_Metadata,
+        CacheData_BoxArt = CacheData_BoxArtImage,
+        CacheData_UserData = CacheData_Userdata,
+    };
+
+    CacheType Type = CacheType_None;
+    unsigned int Data = 0;
+    unsigned int Limit = 0;  ///< Bytes for everything cached; 0 is no limit, else at least 358400.
+    const char* Path =
+        nullptr;  ///< Cache folder, made when absent. Needed for CacheType_File; "" is the current folder.
+};
+
+/// Proxy for all connections of the session; none when Host is null or empty.
+struct ZV_WS_ProxyParam {
+    const char* Host = nullptr;
+    int Port = 0;
+    const char* UserName = nullptr;
+    const char* Password = nullptr;
+};
+
+struct ZV_WS_SetupParams {
+    const char* APIKey = nullptr;               ///< Required.
+    const char* AuthToken = nullptr;            ///< Null until the device is authorised.
+    const char* DestinationUniqueID = nullptr;  ///< Required; the device's identifier, at most 350 characters.
+    int DestinationTypeID = 0;
+    const char* UserName = nullptr;        ///< Required.
+    const char* Password = nullptr;        ///< Required.
+    const char* ServiceBaseURL = nullptr;  ///< Not used: discovery decides.
+    ContentType Type = ContentType_ZV;
+    ZV_WS_EnvNum EnvNum = ENVNUM_DEFAULT;
+    ZV_WS_CacheParam CacheParam;
+    ZV_WS_ProxyParam ProxyParam;
+    ZV_WS_AccessType AccessType = ACCESS_TYPE_UNKNOWN;  ///< Unknown: the service is asked (getFileType).
+    const char* ApplicationRevision = nullptr;
+    const char* FirmwareRevision = nullptr;
+    const char* ModelCode = nullptr;
+};
+
+struct ZV_WS_Pagination {
+    unsigned int CurrentPageNumber = 1;  ///< The first page is 1.
+    unsigned int ItemsPerPage = 0;
+};
+
+struct ZV_WS_Environment {
+    ZV_WS_EnvNum envNum;
+    const char* endpoint;  ///< Display name.
+};
+
+/// Points at a static table: nothing to release.
+struct ZV_WS_EnvironmentLists {
+    unsigned int size = 0;
+    const ZV_WS_Environment* env = nullptr;
+};
+
+// ---- Records. ZV_WS_Records.h tells tag and members of each as data, for code that treats them alike.
+
+/// Base of every record. `_pImpl` points to the record's type tag; null means empty.
+struct ZV_WS_Object {
+    unsigned int* _pImpl = nullptr;
+};
+
+struct SessionImpl;
+
+struct ZV_WS_Session : ZV_WS_Object {
+    SessionImpl* _pSessionImpl = nullptr;
+};
+
+struct ZV_WS_String : ZV_WS_Object {
+    unsigned int size = 0;  ///< Bytes, without the terminator.
+    char* data = nullptr;
+};
+
+/// Bytes of a JPEG file.
+struct ZV_WS_Image : ZV_WS_Object {
+    unsigned int size = 0;
+    unsigned char* data = nullptr;
+};
+
+struct ZV_WS_VersionInfo : ZV_WS_Object {
+    int Major = 0;
+    int Minor = 0;
+    int Revision = 0;
+};
+
+/// Base of most answers. ResponseCode is the service's own: 0 success, else what the operation defines.
+struct ZV_WS_StandardResponse : ZV_WS_Object {
+    int ResponseCode = 0;
+    char* ResponseMessage = nullptr;
+};
+
+struct ZV_WS_Genre : ZV_WS_Object {
+    int ID = 0;
+    char* Name = nullptr;
+    bool Visible = false;
+    int ParentID = 0;
+};
+
+/// The genre tree, flat: each genre names its parent.
+struct ZV_WS_GenreArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_Genre* Genre = nullptr;
+};
+
+struct ZV_WS_GenreLabelResponse : ZV_WS_StandardResponse {
+    char* Label = nullptr;
+    char* LabelMessage = nullptr;
+};
+
+struct ZV_WS_BonusAsset : ZV_WS_Object {
+    int BonusAssetID = 0;
+    ZV_WS_FileProfile Profile = FILE_PROFILE_UNKNOWN;
+    ZV_WS_BonusAssetType BonusType = BONUS_ASSET_TYPE_TRAILER;
+};
+
+struct ZV_WS_BonusAssetArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_BonusAsset* BonusAsset = nullptr;
+};
+
+struct ZV_WS_FileProfileArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_FileProfile* FileProfile = nullptr;
+};
+
+struct ZV_WS_AudioFile : ZV_WS_Object {
+    int AssetAudioID = 0;
+    char* FileLocation = nullptr;
+    bool ContainsVideo = false;
+    ZV_WS_AudioProfile AudioAssetProfile = AUDIO_PROFILE_STEREO_STANDARD;
+};
+
+struct ZV_WS_AudioFileArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_AudioFile* AudioFile = nullptr;
+};
+
+/// One way to buy or rent a title.
+struct ZV_WS_ProductListing : ZV_WS_Object {
+    int SkuID = 0;
+    ZV_WS_PurchaseType PurchaseType = PURCHASE_TYPE_RENT;
+    char* Price = nullptr;  ///< Decimal text as the service sent it.
+    ZV_WS_FileProfileArray AvailableAssets;
+    char* ExpireDate = nullptr;  ///< "YYYY/MM/DD HH:MM:SS".
+    ZV_WS_AudioFileArray AvailableAudioProfiles;
+    int RentalPeriod = 0;
+};
+
+struct ZV_WS_ProductListingArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_ProductListing* ProductListing = nullptr;
+};
+
+struct ZV_WS_TitleListing : ZV_WS_Object {
+    int TitleID = 0;
+    char* TitleName = nullptr;
+    char* BoxArtPrefix = nullptr;
+    short TitlePosition = 0;
+    int EpisodeNumber = 0;
+    ZV_WS_BonusAssetArray BonusAssets;
+    bool IsTvListing = false;
+    char* MPAARating = nullptr;
+    ZV_WS_ProductListingArray AvailableProducts;
+    bool IsTHXMediaDirectorEnabled = false;
+    bool IsTHXMediaDirectorEnabledForTrailer = false;
+    char* CHVRSRating = nullptr;
+    char* LoyaltyPointsForBuy = nullptr;
+    char* LoyaltyPointsForRent = nullptr;
+};
+
+struct ZV_WS_TitleListingArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_TitleListing* TitleListing = nullptr;
+};
+
+/// A title's details.
+struct ZV_WS_TitleListingResponse : ZV_WS_TitleListing {
+    int ResponseCode = 0;
+    char* ResponseMessage = nullptr;
+    char* Synopsis = nullptr;
+    int UserRating = 0;
+    char* Directors = nullptr;
+    char* Actors = nullptr;
+    char* Writers = nullptr;
+    char* Producers = nullptr;
+    char* Copyright = nullptr;
+    char* RunTime = nullptr;
+    char* RatingReason = nullptr;
+};
+
+struct ZV_WS_TitleListingResponseArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_TitleListingResponse* TitleListingResponse = nullptr;
+};
+
+/// A page of titles.
+struct ZV_WS_TitlesResponse : ZV_WS_StandardResponse {
+    int GenreID = 0;
+    short CurrentPageNumber = 0;
+    short ItemsPerPage = 0;
+    short TotalPages = 0;
+    short TotalItems = 0;
+    ZV_WS_TitleListingArray Titles;
+};
+
+/// One page for each genre asked.
+struct ZV_WS_TitlesResponseArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_TitlesResponse* TitlesResponse = nullptr;
+};
+
+struct ZV_WS_TvEpisode : ZV_WS_Object {
+    int EpisodeID = 0;
+    char* EpisodeName = nullptr;
+    int EpisodeNumber = 0;
+};
+
+struct ZV_WS_TvEpisodeArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_TvEpisode* TvEpisode = nullptr;
+};
+
+struct ZV_WS_TvEpisodeListResponse : ZV_WS_StandardResponse {
+    ZV_WS_TvEpisodeArray Episodes;
+};
+
+struct ZV_WS_TranslateSkuIDResponse : ZV_WS_StandardResponse {
+    int TitleID = 0;
+};
+
+struct ZV_WS_TranslateTivoExternalIDResponse : ZV_WS_StandardResponse {
+    char* TivoExternalID = nullptr;
+    int TitleID = 0;
+};
+
+struct ZV_WS_RecommendedTitlesResponse : ZV_WS_StandardResponse {
+    ZV_WS_TitleListingArray Titles;
+};
+
+/// A title the account has bought or rented (or, in a wish list, wishes for).
+struct ZV_WS_TitleListingPurchased : ZV_WS_TitleListing {
+    int EpisodeID = 0;
+    int TvListingTitleID = 0;
+    ZV_WS_PurchaseType PurchaseType = PURCHASE_TYPE_RENT;
+    ZV_WS_WatchStatus Status = WATCH_STATUS_WATCHNOW;
+    char* RentalPeriod = nullptr;
+    int PassID = 0;
+    ZV_WS_StreamStatus PlayStatus = STREAM_STATUS_PLAY;
+    int StartTimeSeconds = 0;  ///< Where playback resumes.
+};
+
+struct ZV_WS_TitleListingPurchasedArray : ZV_WS_Object {
+    unsigned int size = 0;
+    ZV_WS_TitleListingPurchased* TitleListingPurchased = nullptr;
+};
+
+struct ZV_WS_MyVideosResponse : ZV_WS_StandardResponse {
+    short CurrentPageNumber = 0;
+    short ItemsPerPage = 0;
+    short TotalPages = 0;
+    short TotalItems = 0;
+    ZV_WS_TitleListingPurchasedArray Titles;
+};
+
+struct ZV_WS_WishlistItemsResponse : ZV_WS_MyVideosResponse {
+    int SortOrder = 0;
+};
+
+/// One value for each title asked, in the order asked.
+struct ZV_WS_TitlesInWishlist : ZV_WS_Object {
+    unsigned int size = 0;
+    bool* IsAvailInUserWishlist = nullptr;
+};
+
+struct ZV_WS_GiftCertificateResponse : ZV_WS_StandardResponse {
+    int Balance = 0;
+};
+
+struct ZV_WS_CheckAdultVerificationEnabledResponse : ZV_WS_StandardResponse {
+    bool IsAdultVerificationEnabled = false;
+};
+
+struct ZV_WS_CheckAdultVerificationPinResponse : ZV_WS_StandardResponse {
+    bool IsPinVerified = false;
+};
+
+struct ZV_WS_PurchaseResponse : ZV_WS_StandardResponse {
+    int PassID = 0;
+    int TransactionID = 0;
+    char* TransactionAuthNum = nullptr;
+};
+
+struct ZV_WS_StreamingAssetLocationResponse : ZV_WS_StandardResponse {
+    char* StreamingAssetLocation = nullptr;
+    int AssetID = 0;
+    char* StreamID = nullptr;  ///< Names this playback in ZV_WS_manageStreamingInstanceStatus.
+    char* DRMServerURL = nullptr;
+    char* DRMACKServerURL = nullptr;
+    ZV_WS_StreamStatus Status = STREAM_STATUS_PLAY;  ///< How the last playback ended.
+    int StartTimeSeconds = 0;
+    char* HeartbeatURL = nullptr;
+    int HeartbeatPollInSeconds = 0;
+};
+
+struct ZV_WS_PPCardBalanceResponse : ZV_WS_StandardResponse {
+    int Balance = 0;
+};
+
+struct ZV_WS_ConfigurationItem : ZV_WS_Object {
+    char* Key = nullptr;
+    char* Value = nullptr;
+};
+
+struct ZV_WS_ConfigResponse : ZV_WS_StandardResponse {
+    unsigned int size = 0;
+    ZV_WS_ConfigurationItem* ConfigurationItem = nullptr;
+};
+
+struct ZV_WS_BillingInfoResponse : ZV_WS_StandardResponse {
+    char* CCLastFour = nullptr;
+    int CCTypeID = 0;
+    char* CCType = nullptr;
+};
+
+struct ZV_WS_BillingInfoAndPPCBalanceResponse : ZV_WS_Object {
+    ZV_WS_BillingInfoResponse BillingInfo;
+    ZV_WS_PPCardBalanceResponse PPCardBalance;
+};
+
+struct ZV_WS_SettingsPageInfoResponse : ZV_WS_StandardResponse {
+    char* Account = nullptr;
+    char* DeviceID = nullptr;
+    char* DeviceName = nullptr;
+};
+
+struct ZV_WS_EmailAddressResponse : ZV_WS_StandardResponse {
+    char* EmailAddress = nullptr;
+};
+
+struct ZV_WS_CalcOrderTaxResponse : ZV_WS_StandardResponse {
+    char* SubTotal = nullptr;
+    char* TotalPrice = nullptr;
+    char* Tax = nullptr;
+};
+
+struct ZV_WS_RentalExpirationResponse : ZV_WS_StandardResponse {
+    bool ShouldDisplay = false;
+    int HoursRemaining = 0;
+};
+
+/// What the device can play, as the service knows it.
+struct ZV_WS_FileType : ZV_WS_Object {
+    ZV_WS_DRMProvider DRMProvider = DRM_PROVIDER_UNKNOWN;
+    ZV_WS_AccessType AccessType = ACCESS_TYPE_UNKNOWN;
+    ZV_WS_FileProfile FileProfile = FILE_PROFILE_UNKNOWN;
+    ZV_WS_VideoFormat VideoFormat = VIDEO_FORMAT_UNKNOWN;
+    ZV_WS_FileExtension FileExtension = FILE_EXTENSION_AUTOPOPULATE;
+};
+
+struct ZV_WS_THXMediaDirectorResponse : ZV_WS_StandardResponse {
+    char* LongFormat = nullptr;
+    char* ShortFormat = nullptr;
+};
+
+struct ZV_WS_AuthorizeDeviceResponse : ZV_WS_StandardResponse {
+    char* AuthToken = nullptr;
+};
+
+// ---- Session
+
+/// Makes a session: checks `params`, discovers the service environment unless EnvNum names one, and asks the service
+/// for the access type unless AccessType does. Blocks on the network for both. `params` must not be null. Failures
+/// leave the handle empty, except ZV_WS_Status_ssl_error, after which it still has to be released:
+///  - ZV_WS_Status_invalid_param: a required text is missing or empty, the identifier is too long, a file cache has no
+///  path, or
+///    the cache limit is too small;
+///  - ZV_WS_Status_failed_to_create_cache_folder;
+///  - ZV_WS_Status_file_operation_error: the deployment file cannot be used (one line on the error stream says why);
+///  - ZV_WS_Status_ssl_error: the certificate authorities cannot be loaded;
+///  - ZV_WS_Status_connection_error: discovery could not reach the service;
+///  - ZV_WS_Status_local_cache_error: the cache cannot be opened, not even anew.
+ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* params);
+
+/// Makes a session with the settings of `source`, for another thread. Nothing is asked from the network.
+/// ZV_WS_Status_invalid_param without a source session. After ssl_error or local_cache_error the new handle has to be
+/// released.
+ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* source);
+
+/// Frees whatever the record owns and empties it; ends a session. Always ZV_WS_Status_ok; null and empty records are
+/// fine.
+ZV_WS_Status ZV_WS_release(ZV_WS_Object* any);
+
+/// The library's version, 1.3.1.
+ZV_WS_Status ZV_WS_getVersion(ZV_WS_VersionInfo* version);
+
+/// The environments to choose from at set-up. Needs no session.
+ZV_WS_Status ZV_WS_getAvailableEnvLists(ZV_WS_EnvironmentLists* list);
+
+/// Asks the service for the device's environment anew. ZV_WS_Status_net_error when it cannot be reached.
+ZV_WS_Status ZV_WS_getDefaultEnvID(ZV_WS_Session* handle, ZV_WS_EnvID* env);
+
+/// The environment found at set-up.
+ZV_WS_Status ZV_WS_getDeviceEnv(ZV_WS_Session* handle, ZV_WS_EnvID* env);
+
+/// The text that every request carries as its user agent; empty when neither revisions nor model were given.
+ZV_WS_Status ZV_WS_getUserAgent(ZV_WS_Session* handle, ZV_WS_String* userAgent);
+
+/// The device's identifier as given at set-up.
+ZV_WS_Status ZV_WS_getDestinationUniqueID(ZV_WS_Session* handle, ZV_WS_String* id);
+
+// ---- Catalogue
+
+ZV_WS_Status ZV_WS_getNavigation(ZV_WS_Session* handle, ZV_WS_GenreArray* genres);
+
+/// A page of a genre's titles. `purchaseType` is a ZV_WS_PurchaseType.
+ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pagination* page, int purchaseType,
+                             ZV_WS_TitlesResponse* titles);
+
+ZV_WS_Status ZV_WS_getTitleListing(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponse* listing);
+
+// ---- Account
+
+ZV_WS_Status ZV_WS_getFileType(ZV_WS_Session* handle, ZV_WS_FileType* fileType);
