@@ -199,11 +199,11 @@ public:
 
 class ZV1__FileType {
 public:
-    enum ZV1__DRMProvider File_DRMProvider 1;
-    enum ZV1__AccessType File_AccessType 1;
-    enum ZV1__FileProfile File_FileProfile 1;
-    enum ZV1__VideoFormat File_VideoFormat 1;
-    enum ZV1__FileExtension File_FileExtension 1;
+    enum ZV1__DRMProvider File_USCOREDRMProvider 1;
+    enum ZV1__AccessType File_USCOREAccessType 1;
+    enum ZV1__FileProfile File_USCOREFileProfile 1;
+    enum ZV1__VideoFormat File_USCOREVideoFormat 1;
+    enum ZV1__FileExtension File_USCOREFileExtension 1;
 };
 
 class ZV1__ArrayOfInt {

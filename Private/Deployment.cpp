@@ -1,0 +1,189 @@
+#include "Deployment.h"
+
+#include <errno.h>
+#include <stdio.h>
+#include <stdlib.h>
+#include <string.h>
+
+#include <fstream>
+#include <list>
+#include <string>
+
+#include "ZVMutex.h"
+
+namespace {
+
+enum class Kind { Host, File };
+
+struct Key {
+    const char* name;
+    ZVString Deployment::*value;
+    Kind kind;
+    const char* standard;
+};
+
+const Key kKeys[] = {
+    {"production_host", &Deployment::production_host, Kind::Host, "api.zorvane.example"},
+    {"api_staging_host", &Deployment::api_staging_host, Kind::Host, "apistg.zorvane.example"},
+    {"internal_staging_host", &Deployment::internal_staging_host, Kind::Host, "stg.zorvane.example"},
+    {"adult_production_host", &Deployment::adult_production_host, Kind::Host, "kac.zorvane.example"},
+    {"adult_staging_host", &Deployment::adult_staging_host, Kind::Host, "kacstg.zorvane.example"},
+    {"image_host", &Deployment::image_host, Kind::Host, "images.zorvane.example"},
+    {"web_host", &Deployment::web_host, Kind::Host, "www.zorvane.example"},
+    {"ca_file", &Deployment::ca_file, Kind::File, ""},
+    {"device_key_file", &Deployment::device_key_file, Kind::File, ""},
+};
+
+Deployment Defaults()
+{
+    Deployment values;
+    for (const Key& key : kKeys) values.*key.value = key.standard;
+    return values;
+}
+
+std::string Trimmed(const std::string& text)
+{
+    const char* const kBlank = " \t\r";
+    const size_t first = text.find_first_not_of(kBlank);
+    if (first == std::string::npos) return std::string();
+    return text.substr(first, text.find_last_not_of(kBlank) - first + 1);
+}
+
+// What is wrong with the line, or null.
+const char* ReadLine(const std::string& line, Deployment& values)
+{
+    const std::string text = Trimmed(line);
+    if (text.empty() || text[0] == '#') return nullptr;
+    const size_t equals = text.find('=');
+    if (equals == std::string::npos) return "no '=' between key and value";
+    const std::string name = Trimmed(text.substr(0, equals));
+    const ZVString value(Trimmed(text.substr(equals + 1)).c_str());
+    for (const Key& key : kKeys) {
+        if (name != key.name) continue;
+        ZVString host;
+        int port = 0;
+        if (key.kind == Kind::Host && !SplitHostPort(value, 1, host, port)) return "not a host or host:port";
+        values.*key.value = value;
+        return nullptr;
+    }
+    return "unknown key";
+}
+
+bool ReadFile(const char* name, Deployment& values)
+{
+    std::ifstream file(name, std::ios::binary);
+    std::string line;
+    int number = 0;
+    errno = 0;
+    while (std::getline(file, line)) {
+        ++number;
+        if (const char* mistake = ReadLine(line, values)) {
+            fprintf(stderr, "%s:%d: %s: %s\n", name, number, mistake, Trimmed(line).c_str());
+            return false;
+        }
+    }
+    if (file.eof() && !file.bad()) return true;
+    fprintf(stderr, "%s: cannot read the deployment file: %s\n", name, strerror(errno ? errno : EIO));
+    return false;
+}
+
+bool Same(const Deployment& a, const Deployment& b)
+{
+    for (const Key& key : kKeys) {
+        if (!(a.*key.value == b.*key.value)) return false;
+    }
+    return true;
+}
+
+}  // namespace
+
+// Every set of values that was ever current; there are few, and sessions and base URLs point into them.
+struct DeploymentRegistry {
+    ZVMutex mutex;
+    std::list<Deployment> all ZV_GUARDED_BY(mutex);
+    const Deployment* current ZV_GUARDED_BY(mutex) = nullptr;
+
+    const Deployment* MakeCurrent(const Deployment& values)
+    {
+        ZVMutexLock lock(mutex);
+        current = nullptr;
+        for (const Deployment& known : all) {
+            if (Same(known, values)) current = &known;
+        }
+        if (!current) {
+            Deployment& added = all.emplace_back(values);
+            added.MakeBaseUrls();
+            current = &added;
+        }
+        return current;
+    }
+};
+
+namespace {
+
+DeploymentRegistry& TheRegistry()
+{
+    static auto* registry = new DeploymentRegistry;  // outlives every thread that still runs at exit
+    return *registry;
+}
+
+}  // namespace
+
+void Deployment::MakeBaseUrls()
+{
+    const struct {
+        ZVString Deployment::*host;
+        const char* path;
+    } table[2 * kEnvironments] = {
+        {&Deployment::api_staging_host, "/api/"},      // general catalogue: staging for the interface,
+        {&Deployment::internal_staging_host, "/api/"}, // internal staging,
+        {&Deployment::production_host, "/api/"},       // production
+        {&Deployment::api_staging_host, "/kac/api/"},  // adult catalogue: the same three
+        {&Deployment::adult_staging_host, "/api/"},
+        {&Deployment::adult_production_host, "/api/"},
+    };
+    for (int i = 0; i < 2 * kEnvironments; ++i) m_BaseUrls[i] = ZVString("https://") + this->*table[i].host + table[i].path;
+}
+
+const char* Deployment::BaseUrl(ContentType type, int environment) const
+{
+    if (environment < 0 || environment >= kEnvironments) environment = ENVID_PRODUCTION;
+    return m_BaseUrls[(type == ContentType_KAC ? kEnvironments : 0) + environment].c_str();
+}
+
+const Deployment* Deployment::Load()
+{
+    Deployment values = Defaults();
+    const char* name = getenv("ZV_DEPLOYMENT");
+    if (name && !ReadFile(name, values)) return nullptr;
+    return TheRegistry().MakeCurrent(values);
+}
+
+const Deployment& Deployment::Current()
+{
+    DeploymentRegistry& registry = TheRegistry();
+    {
+        ZVMutexLock lock(registry.mutex);
+        if (registry.current) return *registry.current;
+    }
+    const Deployment* loaded = Load();
+    return loaded ? *loaded : *registry.MakeCurrent(Defaults());
+}
+
+bool SplitHostPort(const ZVString& hostPort, int defaultPort, ZVString& host, int& port)
+{
+    const std::string text(hostPort.c_str(), hostPort.length());
+    const size_t colon = text.rfind(':');
+    const std::string name = text.substr(0, colon);
+    host = name.c_str();
+    port = defaultPort;
+    if (name.empty() || name.size() > 255) return false;
+    for (const char c : name) {
+        if (!isalnum(static_cast<unsigned char>(c)) && c != '.' && c != '-' && c != '_') return false;
+    }
+    if (colon == std::string::npos) return true;
+    const std::string digits = text.substr(colon + 1);
+    if (digits.empty() || digits.size() > 5 || digits.find_first_not_of("0123456789") != std::string::npos) return false;
+    port = atoi(digits.c_str());
+    return port >= 1 && port <= 65535;
+}

@@ -1,0 +1,40 @@
+// Where the services are and whom to trust: the values that differ between a store in production and one on a desk.
+#pragma once
+
+#include "ZVString.h"
+#include "ZVWSLib.h"
+
+/// Hosts are "host" or "host:port". Compiled-in defaults stand unless the file named by the environment variable
+/// ZV_DEPLOYMENT replaces them; docs/deployment.md lists the keys.
+struct Deployment {
+    ZVString production_host;
+    ZVString api_staging_host;
+    ZVString internal_staging_host;
+    ZVString adult_production_host;
+    ZVString adult_staging_host;
+    ZVString image_host;
+    ZVString web_host;
+    ZVString ca_file;
+    ZVString device_key_file;
+
+    /// The services' base URL for a content type and an environment; production for any other environment.
+    const char* BaseUrl(ContentType type, int environment) const;
+
+    /// Reads the values anew and makes them the current ones. Null after one line on the error stream when the file cannot be
+    /// read or holds a mistake; the current ones stay. The object lives as long as the process. Any thread.
+    static const Deployment* Load();
+
+    /// The values of the last successful Load; those of a first Load, or the defaults if that fails, before any.
+    static const Deployment& Current();
+
+private:
+    static constexpr int kEnvironments = 3;
+    friend struct DeploymentRegistry;
+    void MakeBaseUrls();
+
+    ZVString m_BaseUrls[2 * kEnvironments];
+};
+
+/// Splits "host:port"; `defaultPort` when there is no port. False for a host that is empty or holds characters that no host
+/// name has, and for a port outside of 1 to 65535.
+bool SplitHostPort(const ZVString& hostPort, int defaultPort, ZVString& host, int& port);

@@ -1,0 +1,102 @@
+#include "RawHttp.h"
+
+#include <stdlib.h>
+#include <string.h>
+
+#include <algorithm>
+
+#include "ZVUtilities.h"
+
+namespace {
+
+const char kLineEnd[] = "\r\n";
+const char kHeadEnd[] = "\r\n\r\n";
+
+// Splits "scheme://host[:port]..." for a connection.
+bool SplitUrl(const ZVString& url, ZVString& host, int& port)
+{
+    const bool tls = strncasecmp(url.c_str(), "https:", 6) == 0;
+    const char* start = strstr(url.c_str(), "//");
+    if (!start) return false;
+    start += 2;
+    return SplitHostPort(ZVString(start, strcspn(start, "/")), tls ? 443 : 80, host, port);
+}
+
+}  // namespace
+
+RawHttp::RawHttp(Transport& transport) : m_Transport(transport)
+{
+    const soap& context = transport.context();
+    m_Deadline = ZVUtilities::MillisecondTime() + 1000ull * (context.connect_timeout + context.recv_timeout);
+    m_Head[0] = '\0';
+    m_Transport.Close();
+}
+
+bool RawHttp::Connect(const ZVString& url)
+{
+    ZVString host;
+    int port = 0;
+    if (!SplitUrl(url, host, port) || !m_Transport.UseHost(url.c_str())) return false;
+    soap& context = m_Transport.context();
+    context.error = SOAP_OK;
+    m_Transport.BeginExchange();
+    context.socket = context.fopen(&context, url.c_str(), host.c_str(), port);
+    return context.error == SOAP_OK && soap_valid_socket(context.socket);
+}
+
+bool RawHttp::Send(const ZVString& text)
+{
+    soap& context = m_Transport.context();
+    return context.fsend(&context, text.c_str(), text.length()) == SOAP_OK;
+}
+
+size_t RawHttp::Receive(char* buffer, size_t size)
+{
+    if (ZVUtilities::MillisecondTime() >= m_Deadline) return 0;
+    soap& context = m_Transport.context();
+    return context.frecv(&context, buffer, size);
+}
+
+bool RawHttp::ReceiveHead()
+{
+    m_HeadLength = Receive(m_Head, sizeof m_Head - 1);
+    m_Head[m_HeadLength] = '\0';
+    return m_HeadLength != 0;
+}
+
+bool RawHttp::Holds(const char* text) const { return strstr(m_Head, text) != nullptr; }
+
+bool RawHttp::StatusIs(const char* line) const
+{
+    const char* found = strstr(m_Head, line);
+    return found && strncmp(found + strlen(line), kLineEnd, 2) == 0;
+}
+
+bool RawHttp::Header(const char* name, ZVString& value) const
+{
+    const ZVString start = ZVString(name) + ": ";
+    const char* found = strstr(m_Head, start.c_str());
+    if (!found) return false;
+    found += start.length();
+    const char* end = strstr(found, kLineEnd);
+    if (!end) return false;
+    value.assign(found, end - found);
+    return true;
+}
+
+unsigned int RawHttp::ContentLength() const
+{
+    ZVString text;
+    if (!Header("Content-Length", text)) return 0;
+    const long long length = strtoll(text.c_str(), nullptr, 10);
+    return static_cast<unsigned int>(std::clamp(length, 0ll, 0x7fffffffll));
+}
+
+bool RawHttp::BodyStart(const char*& bytes, size_t& length) const
+{
+    const char* end = strstr(m_Head, kHeadEnd);
+    if (!end) return false;
+    bytes = end + strlen(kHeadEnd);
+    length = m_Head + m_HeadLength - bytes;
+    return true;
+}

@@ -1,0 +1,100 @@
+// What the library does with every record alike: empty and tag it, fill an array, free it. All of it follows from the
+// description of the records in ZV_WS_Records.h.
+#pragma once
+
+#include <new>
+#include <type_traits>
+
+#include "ZV_WS_Records.h"
+
+namespace Records {
+
+template <class T>
+constexpr bool kIsRecord = std::is_base_of_v<ZV_WS_Object, T>;
+
+template <class R>
+void Tag(R& record);
+
+namespace detail {
+
+// Zeroes every member and tags the records embedded in the record, so that each can be released whatever happens next.
+struct Emptier {
+    template <class T>
+    void Member(const char*, T& value)
+    {
+        value = T();
+        if constexpr (kIsRecord<T>) Tag(value);
+    }
+    template <class T>
+    void Elements(const char*, unsigned int& size, T*& elements)
+    {
+        size = 0;
+        elements = nullptr;
+    }
+};
+
+struct Freer {
+    template <class T>
+    void Member(const char*, T& value)
+    {
+        if constexpr (kIsRecord<T>) {
+            ZV_WS_release(&value);
+        } else if constexpr (std::is_same_v<T, char*>) {
+            delete[] value;
+        }
+        value = T();
+    }
+    template <class T>
+    void Elements(const char*, unsigned int& size, T*& elements)
+    {
+        if constexpr (kIsRecord<T>) {
+            for (unsigned int i = 0; i < size; ++i) ZV_WS_release(&elements[i]);
+        }
+        delete[] elements;
+        size = 0;
+        elements = nullptr;
+    }
+};
+
+template <class R, class Visitor>
+void VisitAll(R& record, Visitor& visitor)
+{
+    if constexpr (!std::is_same_v<R, ZV_WS_Object>) {
+        VisitAll<typename ZV_WS_RecordTraits<R>::Base>(record, visitor);
+        ZV_WS_RecordTraits<R>::Visit(record, visitor);
+    }
+}
+
+}  // namespace detail
+
+/// Empties the record without looking at what it held, and tags it and the records embedded in it.
+template <class R>
+void Tag(R& record)
+{
+    record._pImpl = nullptr;
+    detail::Emptier emptier;
+    detail::VisitAll(record, emptier);
+    record._pImpl = new unsigned int(ZV_WS_RecordTraits<R>::kTag);
+}
+
+/// Frees what the members own and zeroes them; the tag stays.
+template <class R>
+void FreeMembers(R& record)
+{
+    detail::Freer freer;
+    detail::VisitAll(record, freer);
+}
+
+/// Gives an array record `count` zeroed elements; records among them get their tags. The record can be released at any moment.
+template <class T>
+void Allocate(unsigned int& size, T*& elements, unsigned int count)
+{
+    if (count == 0) return;
+    elements = new T[count]();
+    size = count;
+    if constexpr (kIsRecord<T>) {
+        for (unsigned int i = 0; i < count; ++i) Tag(elements[i]);
+    }
+}
+
+}  // namespace Records

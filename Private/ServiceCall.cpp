@@ -1,0 +1,24 @@
+#include "ServiceCall.h"
+
+#include "ZV_Log.h"
+
+ZV_LOG_AREA(ZVWS_SoapProxyLOG_AREA_NAME)
+
+ServiceCallBase::ServiceCallBase(const char* function, const ZV_WS_Session* handle)
+    : m_Function(function), m_Session(handle ? handle->_pSessionImpl : nullptr)
+{}
+
+void ServiceCallBase::LogProxy(const char* verb, const char* proxy, const char* operation)
+{
+    ZV_LogOutput(GetZV_LogAreaID(), 4, "%s %s::%s\n", verb, proxy, operation);
+}
+
+ZV_WS_Status ServiceCallBase::Finish(soap& context, int result, bool answered, int responseCode)
+{
+    soap_destroy(&context);
+    soap_end(&context);
+    context.header = nullptr;
+    ZV_LogOutput(GetZV_LogAreaID(), 4, "%s, ret:%d,responseCode:%d\n", m_Function, result, responseCode);
+    if (result == SOAP_OK && !answered) return ZV_WS_Status_general_error;
+    return ZVUtilities::To_ZV_WS_Status(result, responseCode, m_Function);
+}

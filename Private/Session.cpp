@@ -1,0 +1,190 @@
+#include <stdio.h>
+
+#include "CallGuard.h"
+#include "SessionImpl.h"
+#include "ZVAssert.h"
+#include "ZVFile.h"
+#include "ZVUtilities.h"
+#include "ZV_Log.h"
+
+ZV_LOG_AREA(ZVWS_SoapProxyLOG_AREA_NAME)
+
+namespace {
+
+constexpr size_t kLongestUniqueID = 350;
+constexpr unsigned int kSmallestCacheLimit = 350 * 1024;
+
+const ZV_WS_Environment kEnvironments[] = {
+    {ENVNUM_APISTG, "apistg"},
+    {ENVNUM_INTERNALSTG, "stg"},
+    {ENVNUM_PRODUCTION, "production"},
+    {ENVNUM_DEFAULT, "default"},
+};
+
+bool IsGiven(const char* text) { return text && *text; }
+
+// Everything that ends up in a header or a request line; a control character there would let one value write others.
+bool HoldsNoControls(const char* text)
+{
+    for (; text && *text; ++text) {
+        if (static_cast<unsigned char>(*text) < 0x20 || *text == 0x7f) return false;
+    }
+    return true;
+}
+
+bool AreValid(const ZV_WS_SetupParams& params)
+{
+    for (const char* required : {params.APIKey, params.DestinationUniqueID, params.UserName, params.Password}) {
+        if (!IsGiven(required)) return false;
+    }
+    const ZV_WS_CacheParam& cache = params.CacheParam;
+    if (cache.Type == CacheType_File && !cache.Path) return false;
+    if (strlen(params.DestinationUniqueID) > kLongestUniqueID) return false;
+    if (cache.Type != CacheType_None && cache.Limit != 0 && cache.Limit < kSmallestCacheLimit) return false;
+    for (const char* sent : {params.ApplicationRevision, params.FirmwareRevision, params.ModelCode}) {
+        if (!HoldsNoControls(sent)) return false;
+    }
+    return true;
+}
+
+void CopyGiven(ZVString& to, const char* from)
+{
+    if (from) to = from;
+}
+
+void CopyIdentity(ZV_WS_SetupParams2& to, const ZV_WS_SetupParams& from)
+{
+    to.APIKey = from.APIKey;
+    CopyGiven(to.AuthToken, from.AuthToken);
+    to.DestinationUniqueID = from.DestinationUniqueID;
+    to.DestinationTypeID = from.DestinationTypeID;
+    to.UserName = from.UserName;
+    to.Password = from.Password;
+}
+
+void CopyProxy(ZV_WS_SetupParams2& to, const ZV_WS_ProxyParam& from)
+{
+    CopyGiven(to.ProxyHost, from.Host);
+    if (to.ProxyHost.empty()) return;
+    to.ProxyPort = from.Port;
+    CopyGiven(to.ProxyUserName, from.UserName);
+    CopyGiven(to.ProxyPassword, from.Password);
+}
+
+uint32_t HashOf(const ZVString& text) { return ZVUtilities::Hash(text.c_str(), text.length(), 0); }
+
+// The folder with its separator; an empty one is the current folder.
+ZVString CacheFolder(const char* path)
+{
+    ZVString folder = *path ? path : ".";
+    if (folder[folder.length() - 1] != ZVFile::PATH_SEPERATOR) folder.append(&ZVFile::PATH_SEPERATOR, 1);
+    return folder;
+}
+
+// One file for each account, device and kind of cache: with other credentials another one is used.
+ZVString CacheFileName(const ZV_WS_SetupParams2& params)
+{
+    char text[100];
+    // The base URL is not known yet when the name is made, so its hash is always that of the empty text.
+    snprintf(text, sizeof text, "%u_%u_%d_%u_%u_%u_%u_%u_%u", HashOf(params.ServiceBaseURL),
+             HashOf(params.DestinationUniqueID), params.DestinationTypeID, HashOf(params.APIKey), HashOf(params.UserName),
+             HashOf(params.Password), params.CacheData, params.CacheLimit, 1u);
+    return ZVString(text) + ".zv";
+}
+
+void CopyCache(ZV_WS_SetupParams2& to, const ZV_WS_CacheParam& from)
+{
+    to.CacheKind = from.Type;
+    to.CacheData = from.Data;
+    to.CacheLimit = from.Limit;
+    if (from.Type == CacheType_File) to.CachePath = CacheFolder(from.Path) + CacheFileName(to);
+}
+
+ZVString MakeUserAgent(const ZV_WS_SetupParams2& params)
+{
+    ZVString agent;
+    if (!params.ApplicationRevision.empty() || !params.FirmwareRevision.empty()) {
+        agent = ZVString("ZVSDK: ") + params.FirmwareRevision + "|" + params.ApplicationRevision;
+    }
+    if (!params.ModelCode.empty()) agent += ZVString(" ZVMODEL:") + params.ModelCode;
+    return agent;
+}
+
+bool LoadAuthorities(SessionImpl& session)
+{
+    return session.m_Browse.transport().LoadAuthorities() && session.m_Stream.transport().LoadAuthorities() &&
+           session.m_Download.transport().LoadAuthorities();
+}
+
+void SetParams(SessionImpl& session)
+{
+    session.m_Browse.SetParams(&session.m_Params);
+    session.m_Stream.SetParams(&session.m_Params);
+    session.m_Download.SetParams(&session.m_Params);
+}
+
+void InitFacade(SessionImpl& session)
+{
+    session.m_Facade.Init(&session.m_Stream, &session.m_Download, session.m_Params.AccessType);
+}
+
+void MakeEmptySession(ZV_WS_Session& handle)
+{
+    handle._pSessionImpl = nullptr;
+    handle._pImpl = new unsigned int(SessionImpl::kTag);
+    handle._pSessionImpl = new SessionImpl;
+}
+
+// The device's kind of access, asked from the service when the caller does not know it.
+ZV_WS_AccessType AccessTypeOf(ZV_WS_Session* handle, ZV_WS_AccessType given)
+{
+    if (given == ACCESS_TYPE_DOWNLOAD || given == ACCESS_TYPE_STREAM) return given;
+    ZV_WS_FileType fileType;
+    ZV_WS_getFileType(handle, &fileType);
+    const ZV_WS_AccessType asked = fileType.AccessType;
+    ZV_WS_release(&fileType);
+    return asked;
+}
+
+ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
+{
+    if (!AreValid(params)) return ZV_WS_Status_invalid_param;
+    if (!Deployment::Load()) return ZV_WS_Status_file_operation_error;
+    if (params.CacheParam.Type == CacheType_File) {
+        const ZVString folder = CacheFolder(params.CacheParam.Path);
+        if (!ZVFile::FolderExist(folder.c_str()) && !ZVFile::CreateFolder(folder.c_str())) {
+            return ZV_WS_Status_failed_to_create_cache_folder;
+        }
+    }
+    SessionImpl& session = *handle->_pSessionImpl;
+    ZV_WS_SetupParams2& own = session.m_Params;
+    CopyIdentity(own, params);
+    CopyProxy(own, params.ProxyParam);
+    CopyCache(own, params.CacheParam);
+
+    if (!LoadAuthorities(session)) return ZV_WS_Status_ssl_error;
+    own.ServiceBaseURL =
+        ZVUtilities::QueryServiceBaseURL(params.Type, &session.m_Stream, own.DestinationUniqueID.c_str(),
+                                         own.DestinationTypeID, params.EnvNum, own.EnvID);
+    if (own.ServiceBaseURL.empty()) return ZV_WS_Status_connection_error;
+
+    CopyGiven(own.ApplicationRevision, params.ApplicationRevision);
+    CopyGiven(own.FirmwareRevision, params.FirmwareRevision);
+    CopyGiven(own.ModelCode, params.ModelCode);
+    own.UserAgent = MakeUserAgent(own);
+    if (!own.UserAgent.empty()) printf("\n***---> User-Agent = %s", own.UserAgent.c_str());
+    SetParams(session);
+    own.AccessType = AccessTypeOf(handle, params.AccessType);
+    InitFacade(session);
+    return ZV_WS_Status_ok;
+}
+
+// Calls `use(session)` with the session behind the handle.
+template <class Use>
+ZV_WS_Status WithSession(ZV_WS_Session* handle, Use use)
+{
+    if (!handle || !handle->_pSessionImpl) return ZV_WS_Status_invalid_param;
+    return GuardCall([&] { return use(*handle->_pSessionImpl); });
+}
+
+}  // namespace

@@ -1,0 +1,107 @@
+#include "Tls.h"
+
+#include <arpa/inet.h>
+#include <openssl/err.h>
+#include <openssl/x509v3.h>
+#include <stdsoap2.h>
+
+#include <map>
+#include <string>
+#include <utility>
+
+#include "ZVMutex.h"
+
+namespace {
+
+// Sets up the TLS library for the process; made on the first session's thread.
+struct Library {
+    Library() { soap_ssl_init(); }
+};
+
+bool IsAddress(const std::string& host)
+{
+    unsigned char address[sizeof(in6_addr)];
+    return inet_pton(AF_INET, host.c_str(), address) == 1 || inet_pton(AF_INET6, host.c_str(), address) == 1;
+}
+
+class Contexts {
+public:
+    X509_STORE* Authorities(const std::string& caFile) ZV_EXCLUDES(m_Mutex)
+    {
+        ZVMutexLock lock(m_Mutex);
+        return AuthoritiesLocked(caFile);
+    }
+
+    SSL_CTX* Context(const std::string& caFile, const std::string& host) ZV_EXCLUDES(m_Mutex)
+    {
+        ZVMutexLock lock(m_Mutex);
+        SSL_CTX*& context = m_Contexts[{caFile, host}];
+        if (!context) context = Make(AuthoritiesLocked(caFile), host);
+        if (context) SSL_CTX_up_ref(context);
+        return context;
+    }
+
+private:
+    X509_STORE* AuthoritiesLocked(const std::string& caFile) ZV_REQUIRES(m_Mutex)
+    {
+        const auto known = m_Authorities.find(caFile);
+        if (known != m_Authorities.end()) return known->second;
+        X509_STORE* store = X509_STORE_new();
+        const int loaded = !store          ? 0
+                           : caFile.empty() ? X509_STORE_set_default_paths(store)
+                                            : X509_STORE_load_file(store, caFile.c_str());
+        ERR_clear_error();
+        if (loaded != 1) {
+            X509_STORE_free(store);
+            return nullptr;
+        }
+        return m_Authorities[caFile] = store;
+    }
+
+    static SSL_CTX* Make(X509_STORE* authorities, const std::string& host)
+    {
+        if (!authorities) return nullptr;
+        SSL_CTX* context = SSL_CTX_new(TLS_client_method());
+        if (!context) return nullptr;
+        SSL_CTX_set_min_proto_version(context, TLS1_2_VERSION);
+        SSL_CTX_set_mode(context, SSL_MODE_AUTO_RETRY);
+        // A peer that cuts the connection without a TLS goodbye is told from a whole answer by the answer's length.
+        SSL_CTX_set_options(context, SSL_OP_NO_RENEGOTIATION | SSL_OP_IGNORE_UNEXPECTED_EOF);
+        SSL_CTX_set_session_cache_mode(context, SSL_SESS_CACHE_CLIENT);
+        SSL_CTX_set1_cert_store(context, authorities);
+        SSL_CTX_set_verify(context, SSL_VERIFY_PEER, nullptr);
+        X509_VERIFY_PARAM* verify = SSL_CTX_get0_param(context);
+        X509_VERIFY_PARAM_set_hostflags(verify, X509_CHECK_FLAG_NO_PARTIAL_WILDCARDS | X509_CHECK_FLAG_NEVER_CHECK_SUBJECT);
+        const int named = IsAddress(host) ? X509_VERIFY_PARAM_set1_ip_asc(verify, host.c_str())
+                                          : X509_VERIFY_PARAM_set1_host(verify, host.c_str(), host.size());
+        if (named == 1) return context;
+        SSL_CTX_free(context);
+        return nullptr;
+    }
+
+    ZVMutex m_Mutex;
+    std::map<std::string, X509_STORE*> m_Authorities ZV_GUARDED_BY(m_Mutex);
+    std::map<std::pair<std::string, std::string>, SSL_CTX*> m_Contexts ZV_GUARDED_BY(m_Mutex);
+};
+
+Contexts& TheContexts()
+{
+    static Library library;
+    static auto* contexts = new Contexts;  // outlives threads that still end a session at exit
+    return *contexts;
+}
+
+std::string Text(const ZVString& text) { return std::string(text.c_str(), text.length()); }
+
+}  // namespace
+
+namespace Tls {
+
+bool LoadAuthorities(const ZVString& caFile) { return TheContexts().Authorities(Text(caFile)) != nullptr; }
+
+SSL_CTX* ContextFor(const ZVString& caFile, const ZVString& host)
+{
+    return TheContexts().Context(Text(caFile), Text(host));
+}
+
+}  // namespace Tls

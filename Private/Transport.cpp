@@ -1,0 +1,185 @@
+#include "Transport.h"
+
+#include <string.h>
+#include <sys/socket.h>
+
+#include "Namespaces.h"
+#include "Tls.h"
+#include "TrafficLog.h"
+
+namespace {
+
+// The largest page of titles is below 100 KiB; what is larger than this is an attack or a fault. Counts inflated bytes too.
+constexpr size_t kLongestMessage = 4u << 20;
+constexpr long kLongestString = 1l << 20;
+constexpr long kMostElements = 4096;
+constexpr unsigned int kDeepestLevel = 64;
+
+// Until a session's settings are there (discovery comes first).
+constexpr int kSendSeconds = 30;
+constexpr int kReceiveSeconds = 88;
+
+// The toolkit's own text, sent by a session without a user agent.
+const char kToolkitAgent[] = "gSOAP/2.7";
+
+bool IsTls(const char* url) { return strncasecmp(url, "https:", 6) == 0; }
+
+// The host of "scheme://host[:port]/...".
+ZVString HostOf(const char* url)
+{
+    const char* start = strstr(url, "//");
+    if (!start) return ZVString();
+    start += 2;
+    return ZVString(start, strcspn(start, ":/"));
+}
+
+}  // namespace
+
+SigpipeGuard::SigpipeGuard()
+{
+    sigset_t pipe, pending;
+    sigemptyset(&pipe);
+    sigaddset(&pipe, SIGPIPE);
+    sigpending(&pending);
+    m_WasPending = sigismember(&pending, SIGPIPE) == 1;
+    pthread_sigmask(SIG_BLOCK, &pipe, &m_Before);
+}
+
+SigpipeGuard::~SigpipeGuard()
+{
+    if (!m_WasPending) {
+        sigset_t pipe;
+        sigemptyset(&pipe);
+        sigaddset(&pipe, SIGPIPE);
+        const timespec now = {0, 0};
+        while (sigtimedwait(&pipe, nullptr, &now) == -1 && errno == EINTR) {
+        }
+    }
+    pthread_sigmask(SIG_SETMASK, &m_Before, nullptr);
+}
+
+Transport::Transport(soap& context)
+    : m_Soap(context),
+      m_Deployment(&Deployment::Current()),
+      m_Open(context.fopen),
+      m_Send(context.fsend),
+      m_Receive(context.frecv),
+      m_Header(context.fposthdr)
+{
+    soap_set_namespaces(&context, namespaces);
+    context.user = this;
+    context.fopen = OpenHook;
+    context.fsend = SendHook;
+    context.frecv = ReceiveHook;
+    context.fposthdr = HeaderHook;
+    context.fshutdownsocket = ShutdownHook;
+    context.cookie_max = 0;
+    context.recv_maxlength = kLongestMessage;
+    context.maxlength = kLongestString;
+    context.maxoccurs = kMostElements;
+    context.maxlevel = kDeepestLevel;
+    context.ssl_flags = SOAP_SSL_DEFAULT | SOAP_TLSv1_2 | SOAP_TLSv1_3 | SOAP_SSL_NO_DEFAULT_CA_PATH;
+    SetTimeouts(kSendSeconds, kReceiveSeconds);
+}
+
+Transport::~Transport()
+{
+    Close();
+    ForgetTls();
+}
+
+bool Transport::LoadAuthorities()
+{
+    m_Deployment = &Deployment::Current();
+    return Tls::LoadAuthorities(m_Deployment->ca_file);
+}
+
+bool Transport::UseHost(const char* url)
+{
+    if (!IsTls(url)) return true;
+    const ZVString host = HostOf(url);
+    if (m_Soap.ctx && host == m_TlsHost) return true;
+    Close();
+    ForgetTls();
+    m_Soap.ctx = Tls::ContextFor(m_Deployment->ca_file, host);
+    m_TlsHost = host;
+    return m_Soap.ctx != nullptr;
+}
+
+void Transport::ForgetTls()
+{
+    if (m_Soap.session) SSL_SESSION_free(m_Soap.session);
+    m_Soap.session = nullptr;
+    if (m_Soap.ctx) SSL_CTX_free(m_Soap.ctx);
+    m_Soap.ctx = nullptr;
+}
+
+void Transport::SetTimeouts(int sendSeconds, int receiveSeconds)
+{
+    m_Soap.connect_timeout = sendSeconds;
+    m_Soap.send_timeout = sendSeconds;
+    m_Soap.recv_timeout = receiveSeconds;
+    m_Soap.transfer_timeout = sendSeconds + receiveSeconds;  // a peer that drips bytes never meets the others
+}
+
+void Transport::BeginExchange()
+{
+    m_Connected = false;
+    m_Received = 0;
+}
+
+void Transport::EndExchange(int result)
+{
+    const bool leftOver = m_Soap.bufidx < m_Soap.buflen;
+    if (result != SOAP_OK || leftOver) Close();
+}
+
+void Transport::Close()
+{
+    if (!soap_valid_socket(m_Soap.socket)) return;
+    SigpipeGuard guard;
+    const int error = m_Soap.error;
+    m_Soap.keep_alive = 0;
+    soap_force_closesock(&m_Soap);
+    m_Soap.error = error;
+    m_Soap.keep_alive = 1;
+    m_Soap.bufidx = m_Soap.buflen = 0;
+}
+
+SOAP_SOCKET Transport::OpenHook(soap* context, const char* endpoint, const char* host, int port)
+{
+    Transport& self = Of(context);
+    self.m_Connected = true;
+    return self.m_Open(context, endpoint, host, port);
+}
+
+int Transport::SendHook(soap* context, const char* data, size_t length)
+{
+    TrafficLog::Sent(data, length);
+    return Of(context).m_Send(context, data, length);
+}
+
+size_t Transport::ReceiveHook(soap* context, char* buffer, size_t size)
+{
+    Transport& self = Of(context);
+    const size_t received = self.m_Receive(context, buffer, size);
+    self.m_Received += received;
+    TrafficLog::Received(buffer, received);
+    return received;
+}
+
+int Transport::HeaderHook(soap* context, const char* key, const char* value)
+{
+    Transport& self = Of(context);
+    if (key && strcmp(key, "User-Agent") == 0) {
+        value = self.m_UserAgent.empty() ? kToolkitAgent : self.m_UserAgent.c_str();
+    }
+    return self.m_Header(context, key, value);
+}
+
+// A result other than 0 keeps the runtime from waiting for the peer's side of the close.
+int Transport::ShutdownHook(soap*, SOAP_SOCKET socket, int how)
+{
+    shutdown(socket, how);
+    return SOAP_TCP_ERROR;
+}

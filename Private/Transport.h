@@ -1,0 +1,82 @@
+// What the library adds to a SOAP context: trust, limits, the user agent, the traffic log, and the rules for kept connections.
+//
+// One Transport belongs to one context and, like it, to one thread at a time.
+#pragma once
+
+#include <signal.h>
+#include <stdsoap2.h>
+
+#include "Deployment.h"
+#include "ZVString.h"
+
+/// While one exists, a connection that the peer has reset does not kill the process: SIGPIPE is blocked in the calling thread and
+/// taken off it afterwards. The process's own handling of the signal stays as it is.
+class SigpipeGuard {
+public:
+    SigpipeGuard();
+    ~SigpipeGuard();
+    SigpipeGuard(const SigpipeGuard&) = delete;
+    SigpipeGuard& operator=(const SigpipeGuard&) = delete;
+
+private:
+    sigset_t m_Before;
+    bool m_WasPending;
+};
+
+class Transport {
+public:
+    /// Sets up the context (borrowed; it must outlive this object): flags, limits, timeouts, hooks.
+    explicit Transport(soap& context);
+    ~Transport();
+    Transport(const Transport&) = delete;
+    Transport& operator=(const Transport&) = delete;
+
+    static Transport& Of(soap* context) { return *static_cast<Transport*>(context->user); }
+
+    /// Loads the certificate authorities of the current deployment. False when they cannot be loaded.
+    bool LoadAuthorities();
+
+    /// Gets the context ready for connections to the URL's host: its TLS context for "https:". False when there is none.
+    bool UseHost(const char* url);
+
+    void SetTimeouts(int sendSeconds, int receiveSeconds);
+    void SetUserAgent(const ZVString& text) { m_UserAgent = text; }
+
+    /// Before an exchange: what AnswerMissed tells is about bytes from here on.
+    void BeginExchange();
+
+    /// True when the exchange went over a connection kept from an earlier one and no byte of an answer came: the peer may
+    /// have closed it before it saw the request.
+    bool KeptConnectionDied() const { return !m_Connected && m_Received == 0; }
+
+    /// After an exchange with the SOAP runtime's result: keeps the connection only when the answer was whole and nothing is left
+    /// over.
+    void EndExchange(int result);
+
+    /// Closes the connection at once, without waiting for the peer.
+    void Close();
+
+    const Deployment& deployment() const { return *m_Deployment; }
+    soap& context() { return m_Soap; }
+
+private:
+    static SOAP_SOCKET OpenHook(soap* context, const char* endpoint, const char* host, int port);
+    static int SendHook(soap* context, const char* data, size_t length);
+    static size_t ReceiveHook(soap* context, char* buffer, size_t size);
+    static int HeaderHook(soap* context, const char* key, const char* value);
+    static int ShutdownHook(soap* context, SOAP_SOCKET socket, int how);
+
+    void ForgetTls();
+
+    soap& m_Soap;
+    const Deployment* m_Deployment;
+    ZVString m_TlsHost;
+    ZVString m_UserAgent;
+    bool m_Connected = false;
+    size_t m_Received = 0;
+
+    decltype(soap::fopen) m_Open;
+    decltype(soap::fsend) m_Send;
+    decltype(soap::frecv) m_Receive;
+    decltype(soap::fposthdr) m_Header;
+};

@@ -1,0 +1,56 @@
+#include "ZVUtilities.h"
+
+#include <string.h>
+
+#include <chrono>
+
+namespace ZVUtilities {
+
+char* StrDup(const char* text)
+{
+    if (!text) return nullptr;
+    const size_t size = strlen(text) + 1;
+    char* copy = new char[size];
+    memcpy(copy, text, size);
+    return copy;
+}
+
+bool Str2Bool(const char* text) { return text && strcmp(text, "true") == 0; }
+
+int SortOrder2Int(ZV_WS_SortOrder order) { return order; }
+
+ZVString TM2Str(const struct tm& time)
+{
+    char text[64];
+    const size_t length = strftime(text, sizeof text, "%Y/%m/%d %H:%M:%S", &time);
+    return ZVString(text, length);
+}
+
+uint64_t MillisecondTime()
+{
+    using namespace std::chrono;
+    return duration_cast<milliseconds>(steady_clock::now().time_since_epoch()).count();
+}
+
+uint32_t Hash(const char* text, size_t length, uint32_t seed)
+{
+    uint32_t hash = seed;
+    for (size_t i = 0; i < length; ++i) hash = (hash * 16777619u) ^ static_cast<unsigned char>(text[i]);
+    return hash;
+}
+
+ZVString UrlEncode(const ZVString& text)
+{
+    static const char kHex[] = "0123456789ABCDEF";
+    ZVString encoded;
+    for (size_t i = 0; i < text.length(); ++i) {
+        const unsigned char byte = text[i];
+        const bool unreserved = (byte >= 'A' && byte <= 'Z') || (byte >= 'a' && byte <= 'z') ||
+                                (byte >= '0' && byte <= '9') || (byte != 0 && strchr("-._~", byte));
+        const char out[] = {unreserved ? static_cast<char>(byte) : '%', kHex[byte >> 4], kHex[byte & 15]};
+        encoded.append(out, unreserved ? 1 : 3);
+    }
+    return encoded;
+}
+
+}  // namespace ZVUtilities
