@@ -1,6 +1,8 @@
 #include <stdio.h>
+#include <string.h>
 
 #include "CallGuard.h"
+#include "Records.h"
 #include "SessionImpl.h"
 #include "ZVAssert.h"
 #include "ZVFile.h"
@@ -179,12 +181,106 @@ ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
     return ZV_WS_Status_ok;
 }
 
-// Calls `use(session)` with the session behind the handle.
-template <class Use>
-ZV_WS_Status WithSession(ZV_WS_Session* handle, Use use)
+// Empties and tags the output, then calls `use(session)` with the session behind the handle.
+template <class Output, class Use>
+ZV_WS_Status WithSession(const ZV_WS_Session* handle, Output* out, Use use)
 {
-    if (!handle || !handle->_pSessionImpl) return ZV_WS_Status_invalid_param;
-    return GuardCall([&] { return use(*handle->_pSessionImpl); });
+    ZV_ASSERT(out != 0);
+    return GuardCall([&] {
+        if constexpr (Records::kIsRecord<Output>) Records::Tag(*out);
+        if (!handle || !handle->_pSessionImpl) return ZV_WS_Status_invalid_param;
+        return use(*handle->_pSessionImpl);
+    });
+}
+
+ZV_WS_Status SetText(ZV_WS_String& to, const ZVString& text)
+{
+    to.data = ZVUtilities::StrDup(text.c_str());
+    to.size = static_cast<unsigned int>(text.length());
+    return ZV_WS_Status_ok;
 }
 
 }  // namespace
+
+ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* params)
+{
+    ZV_ASSERT(handle != 0);
+    ZV_ASSERT(params != 0);
+    return GuardCall([&] {
+        MakeEmptySession(*handle);
+        const ZV_WS_Status status = Initialize(handle, *params);
+        if (status != ZV_WS_Status_ok && status != ZV_WS_Status_ssl_error) ZV_WS_release(handle);
+        return status;
+    });
+}
+
+ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* source)
+{
+    ZV_ASSERT(newHandle != 0);
+    newHandle->_pImpl = nullptr;
+    newHandle->_pSessionImpl = nullptr;
+    if (!source || !source->_pSessionImpl) return ZV_WS_Status_invalid_param;
+    return GuardCall([&] {
+        MakeEmptySession(*newHandle);
+        SessionImpl& session = *newHandle->_pSessionImpl;
+        if (!LoadAuthorities(session)) return ZV_WS_Status_ssl_error;
+        session.m_Params = source->_pSessionImpl->m_Params;
+        SetParams(session);
+        InitFacade(session);
+        return ZV_WS_Status_ok;
+    });
+}
+
+ZV_WS_Status ZV_WS_getVersion(ZV_WS_VersionInfo* version)
+{
+    ZV_ASSERT(version != 0);
+    return GuardCall([&] {
+        Records::Tag(*version);
+        version->Major = 1;
+        version->Minor = 3;
+        version->Revision = 1;
+        return ZV_WS_Status_ok;
+    });
+}
+
+ZV_WS_Status ZV_WS_getAvailableEnvLists(ZV_WS_EnvironmentLists* list)
+{
+    ZV_ASSERT(list != 0);
+    list->size = std::size(kEnvironments);
+    list->env = kEnvironments;
+    return ZV_WS_Status_ok;
+}
+
+ZV_WS_Status ZV_WS_getDefaultEnvID(ZV_WS_Session* handle, ZV_WS_EnvID* env)
+{
+    return WithSession(handle, env, [&](SessionImpl& session) {
+        const ZV_WS_SetupParams2& own = session.m_Params;
+        const char* url = ZVUtilities::QueryServiceBaseURL(ContentType_ZV, &session.m_Stream,
+                                                           own.DestinationUniqueID.c_str(), own.DestinationTypeID,
+                                                           ENVNUM_DEFAULT, *env);
+        return *url ? ZV_WS_Status_ok : ZV_WS_Status_net_error;
+    });
+}
+
+ZV_WS_Status ZV_WS_getDeviceEnv(ZV_WS_Session* handle, ZV_WS_EnvID* env)
+{
+    return WithSession(handle, env, [&](SessionImpl& session) {
+        *env = session.m_Params.EnvID;
+        return ZV_WS_Status_ok;
+    });
+}
+
+ZV_WS_Status ZV_WS_getUserAgent(ZV_WS_Session* handle, ZV_WS_String* userAgent)
+{
+    return WithSession(handle, userAgent, [&](SessionImpl& session) {
+        const ZVString& text = session.m_Params.UserAgent;
+        ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s,User Agent:%s\n", "ZV_WS_getUserAgent", text.c_str());
+        return SetText(*userAgent, text);
+    });
+}
+
+ZV_WS_Status ZV_WS_getDestinationUniqueID(ZV_WS_Session* handle, ZV_WS_String* id)
+{
+    return WithSession(handle, id,
+                       [&](SessionImpl& session) { return SetText(*id, session.m_Params.DestinationUniqueID); });
+}

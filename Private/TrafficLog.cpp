@@ -25,6 +25,7 @@ Area s_Test = {ZVWS_SoapTestLOG_AREA_NAME};
 
 void Write(const Area& area, SecretFilter& filter, const char* data, size_t length)
 {
+    if (length == 0 || !ZV_LogWouldOutput(area.id, kSeverity)) return;
     const ZVString text = filter.Filter(data, length);
     ZV_LogOutputwithLen(area.id, kSeverity, text.c_str(), static_cast<unsigned int>(text.length()));
 }

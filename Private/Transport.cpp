@@ -1,11 +1,11 @@
 #include "Transport.h"
 
+#include <errno.h>
 #include <string.h>
 #include <sys/socket.h>
 
 #include "Namespaces.h"
 #include "Tls.h"
-#include "TrafficLog.h"
 
 namespace {
 
@@ -66,6 +66,7 @@ Transport::Transport(soap& context)
       m_Receive(context.frecv),
       m_Header(context.fposthdr)
 {
+    soap_init_zv_log();
     soap_set_namespaces(&context, namespaces);
     context.user = this;
     context.fopen = OpenHook;
@@ -126,6 +127,8 @@ void Transport::BeginExchange()
 {
     m_Connected = false;
     m_Received = 0;
+    m_SentSecrets.Restart();
+    m_ReceivedSecrets.Restart();
 }
 
 void Transport::EndExchange(int result)
@@ -155,8 +158,9 @@ SOAP_SOCKET Transport::OpenHook(soap* context, const char* endpoint, const char*
 
 int Transport::SendHook(soap* context, const char* data, size_t length)
 {
-    TrafficLog::Sent(data, length);
-    return Of(context).m_Send(context, data, length);
+    Transport& self = Of(context);
+    TrafficLog::Sent(self.m_SentSecrets, data, length);
+    return self.m_Send(context, data, length);
 }
 
 size_t Transport::ReceiveHook(soap* context, char* buffer, size_t size)
@@ -164,7 +168,7 @@ size_t Transport::ReceiveHook(soap* context, char* buffer, size_t size)
     Transport& self = Of(context);
     const size_t received = self.m_Receive(context, buffer, size);
     self.m_Received += received;
-    TrafficLog::Received(buffer, received);
+    TrafficLog::Received(self.m_ReceivedSecrets, buffer, received);
     return received;
 }
 

@@ -7,6 +7,7 @@
 #include <stdsoap2.h>
 
 #include "Deployment.h"
+#include "TrafficLog.h"
 #include "ZVString.h"
 
 /// While one exists, a connection that the peer has reset does not kill the process: SIGPIPE is blocked in the calling thread and
@@ -42,7 +43,7 @@ public:
     void SetTimeouts(int sendSeconds, int receiveSeconds);
     void SetUserAgent(const ZVString& text) { m_UserAgent = text; }
 
-    /// Before an exchange: what AnswerMissed tells is about bytes from here on.
+    /// Before an exchange: what KeptConnectionDied tells is about bytes from here on.
     void BeginExchange();
 
     /// True when the exchange went over a connection kept from an earlier one and no byte of an answer came: the peer may
@@ -74,6 +75,8 @@ private:
     ZVString m_UserAgent;
     bool m_Connected = false;
     size_t m_Received = 0;
+    SecretFilter m_SentSecrets;
+    SecretFilter m_ReceivedSecrets;
 
     decltype(soap::fopen) m_Open;
     decltype(soap::fsend) m_Send;

@@ -1,0 +1,51 @@
+// The mutex that all code here uses: std::mutex with the annotations that let Clang check who may touch what.
+#pragma once
+
+#include <condition_variable>
+#include <mutex>
+
+#ifdef __clang__
+#define ZV_THREAD_ATTRIBUTE(x) __attribute__((x))
+#else
+#define ZV_THREAD_ATTRIBUTE(x)
+#endif
+
+/// The member is read and written only with the mutex held.
+#define ZV_GUARDED_BY(mutex) ZV_THREAD_ATTRIBUTE(guarded_by(mutex))
+/// The caller holds the mutex.
+#define ZV_REQUIRES(mutex) ZV_THREAD_ATTRIBUTE(requires_capability(mutex))
+/// The caller does not hold the mutex.
+#define ZV_EXCLUDES(mutex) ZV_THREAD_ATTRIBUTE(locks_excluded(mutex))
+
+class ZV_THREAD_ATTRIBUTE(capability("mutex")) ZVMutex {
+public:
+    void lock() ZV_THREAD_ATTRIBUTE(acquire_capability()) { m_Mutex.lock(); }
+    void unlock() ZV_THREAD_ATTRIBUTE(release_capability()) { m_Mutex.unlock(); }
+
+private:
+    std::mutex m_Mutex;
+};
+
+class ZV_THREAD_ATTRIBUTE(scoped_lockable) ZVMutexLock {
+public:
+    explicit ZVMutexLock(ZVMutex& mutex) ZV_THREAD_ATTRIBUTE(acquire_capability(mutex)) : m_Mutex(mutex)
+    {
+        m_Mutex.lock();
+    }
+    ~ZVMutexLock() ZV_THREAD_ATTRIBUTE(release_capability()) { m_Mutex.unlock(); }
+    ZVMutexLock(const ZVMutexLock&) = delete;
+    ZVMutexLock& operator=(const ZVMutexLock&) = delete;
+
+private:
+    ZVMutex& m_Mutex;
+};
+
+/// Waits with a ZVMutex held, which is free while it waits. Wake-ups without a cause occur: wait in a loop.
+class ZVCondition {
+public:
+    void Wait(ZVMutex& mutex) ZV_REQUIRES(mutex) { m_Condition.wait(mutex); }
+    void NotifyAll() { m_Condition.notify_all(); }
+
+private:
+    std::condition_variable_any m_Condition;
+};

@@ -1,0 +1,45 @@
+// The process's one logger, behind the functions of Public/ZV_Log.h.
+#pragma once
+
+#include <array>
+#include <atomic>
+
+#include "ZVMutex.h"
+#include "ZVString.h"
+#include "ZV_Log.h"
+
+class ZV_Log {
+public:
+    static ZV_Log& GetInstance();
+
+    int RegisterArea(const char* name, int& id) ZV_EXCLUDES(m_Mutex);
+    void ActivateArea(int id, bool on);
+    void SetAreaSeverityMask(int id, int mask);
+    void SetTarget(ZV_LogTarget target, void* user) ZV_EXCLUDES(m_Mutex);
+
+    bool WouldOutput(int id, int severity) const;
+    void Output(int id, int severity, const char* text) ZV_EXCLUDES(m_Mutex);
+    void Output(int id, int severity, const char* text, unsigned int length) ZV_EXCLUDES(m_Mutex);
+
+    static ZVString GetCurrentTime();
+
+private:
+    static constexpr int kMostAreas = 50;
+
+    struct Area {
+        ZVString name;  // never changes once the area counts
+        std::atomic<bool> active{false};
+        std::atomic<int> mask{0};
+    };
+
+    bool IsArea(int id) const { return id >= 0 && id < m_Count.load(std::memory_order_acquire); }
+    void Emit(const ZVString& line, unsigned int length) ZV_EXCLUDES(m_Mutex);
+    ZVString LineStart(int id) const;
+
+    ZVMutex m_Mutex;
+    std::array<Area, kMostAreas> m_Areas;
+    std::atomic<int> m_Count{0};
+    std::atomic<bool> m_HasTarget{false};
+    ZV_LogTarget m_Target ZV_GUARDED_BY(m_Mutex) = nullptr;
+    void* m_User ZV_GUARDED_BY(m_Mutex) = nullptr;
+};
