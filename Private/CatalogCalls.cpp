@@ -6,7 +6,9 @@ ZV_WS_Status ZV_WS_getNavigation(ZV_WS_Session* handle, ZV_WS_GenreArray* genres
 {
     ServiceCall<Operation::getNavigation> call("ZV_WS_getNavigation", handle, genres);
     if (!call.Accepts()) return call.Refusal();
-    return call.Into(genres, ZVUtilities::ZV1__ArrayOfGenre2ZV_WS_GenreArray);
+    return call.Into(genres, [](const ZV1__GenreRequest* t, ZV_WS_GenreArray& to) {
+        if (t->Genres) ZVUtilities::ZV1__ArrayOfGenre2ZV_WS_GenreArray(t->Genres, to);
+    });
 }
 
 ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pagination* page, int purchaseType,
@@ -17,7 +19,7 @@ ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pag
     call->GenreID = genreID;
     call->CurrentPageNumber = page->CurrentPageNumber;
     call->ItemsPerPage = page->ItemsPerPage;
-    call->PurchaseType = static_cast<ZV1__PurchaseType>(purchaseType);
+    call->PurchaseType = static_cast<ZV1__StreamAPIPurchaseType>(purchaseType);
     return call.Into(titles, ZVUtilities::ZV1__GetTitlesResponse2ZV_WS_TitlesResponse);
 }
 

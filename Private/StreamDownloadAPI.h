@@ -5,6 +5,15 @@
 #include "StreamAPI.h"
 
 class StreamDownloadAPI {
+    // Calls `action` with the wrapper that serves the device.
+    template <class Action>
+    decltype(auto) Chosen(Action action)
+    {
+        ZV_ASSERT(m_StreamAPI != 0);
+        ZV_ASSERT(m_DownloadAPI != 0);
+        return m_AccessType == ACCESS_TYPE_DOWNLOAD ? action(*m_DownloadAPI) : action(*m_StreamAPI);
+    }
+
 public:
     /// Both wrappers are borrowed. Devices that download use the download service, all others (also of unknown kind) the stream
     /// service.
@@ -63,14 +72,6 @@ public:
 #undef ZV_FORWARD
 
 private:
-    template <class Action>
-    decltype(auto) Chosen(Action action)
-    {
-        ZV_ASSERT(m_StreamAPI != 0);
-        ZV_ASSERT(m_DownloadAPI != 0);
-        return m_AccessType == ACCESS_TYPE_DOWNLOAD ? action(*m_DownloadAPI) : action(*m_StreamAPI);
-    }
-
     StreamAPI* m_StreamAPI = nullptr;
     DownloadAPI* m_DownloadAPI = nullptr;
     ZV_WS_AccessType m_AccessType = ACCESS_TYPE_UNKNOWN;
