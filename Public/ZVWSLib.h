@@ -567,16 +567,155 @@ ZV_WS_Status ZV_WS_getUserAgent(ZV_WS_Session* handle, ZV_WS_String* userAgent);
 /// The device's identifier as given at set-up.
 ZV_WS_Status ZV_WS_getDestinationUniqueID(ZV_WS_Session* handle, ZV_WS_String* id);
 
-// ---- Catalogue
+// ---- Catalogue. Ids that the service does not know are its refusals (ZV_WS_Status_general_error).
 
 ZV_WS_Status ZV_WS_getNavigation(ZV_WS_Session* handle, ZV_WS_GenreArray* genres);
+
+ZV_WS_Status ZV_WS_getGenreLabel(ZV_WS_Session* handle, int genreID, ZV_WS_GenreLabelResponse* label);
 
 /// A page of a genre's titles. `purchaseType` is a ZV_WS_PurchaseType.
 ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pagination* page, int purchaseType,
                              ZV_WS_TitlesResponse* titles);
 
-ZV_WS_Status ZV_WS_getTitleListing(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponse* listing);
+/// The same page of each of `count` genres.
+ZV_WS_Status ZV_WS_getTitlesByGenreIDs(ZV_WS_Session* handle, const int* genreIDs, unsigned int count,
+                                       const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
+                                       ZV_WS_TitlesResponseArray* titles);
 
-// ---- Account
+ZV_WS_Status ZV_WS_getTitleListing(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponse* listing);
+ZV_WS_Status ZV_WS_getTvEpisodeListing(ZV_WS_Session* handle, int episodeID, ZV_WS_TitleListingResponse* listing);
+ZV_WS_Status ZV_WS_getTvEpisodeListByTitleID(ZV_WS_Session* handle, int titleID, ZV_WS_TvEpisodeListResponse* episodes);
+ZV_WS_Status ZV_WS_getAllTvEpisodeListings(ZV_WS_Session* handle, int titleID,
+                                           ZV_WS_TitleListingResponseArray* listings);
+
+ZV_WS_Status ZV_WS_translateSkuID(ZV_WS_Session* handle, int skuID, ZV_WS_TranslateSkuIDResponse* title);
+ZV_WS_Status ZV_WS_translateTivoExternalID(ZV_WS_Session* handle, const char* externalID,
+                                           ZV_WS_TranslateTivoExternalIDResponse* title);
+
+/// Titles whose names hold the text.
+ZV_WS_Status ZV_WS_searchForTitle(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
+                                  ZV_WS_TitleTypeFilter typeFilter, const char* query, ZV_WS_TitlesResponse* titles);
+/// The same with all that the service knows of each title.
+ZV_WS_Status ZV_WS_searchForTitleDetail(ZV_WS_Session* handle, const ZV_WS_Pagination* page,
+                                        ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter,
+                                        const char* query, ZV_WS_TitlesResponse* titles);
+
+ZV_WS_Status ZV_WS_getRecommendedTitles(ZV_WS_Session* handle, int titleID, ZV_WS_RecommendedTitlesResponse* titles);
+
+// ---- The device at the service
 
 ZV_WS_Status ZV_WS_getFileType(ZV_WS_Session* handle, ZV_WS_FileType* fileType);
+
+/// Activates the device with the PIN that the customer was shown. On success the session's later requests carry the
+/// token; other sessions, also duplicates made before, do not. A PIN is required.
+ZV_WS_Status ZV_WS_authorizeDevice(ZV_WS_Session* handle, const char* pin, ZV_WS_AuthorizeDeviceResponse* answer);
+ZV_WS_Status ZV_WS_deactivateDevice(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
+
+/// Whether the service still takes the session's token.
+ZV_WS_Status ZV_WS_checkAuthToken(ZV_WS_Session* handle, bool* isValid);
+
+ZV_WS_Status ZV_WS_getConfig(ZV_WS_Session* handle, ZV_WS_ConfigResponse* config);
+ZV_WS_Status ZV_WS_getSettingsPageInfo(ZV_WS_Session* handle, ZV_WS_SettingsPageInfoResponse* info);
+ZV_WS_Status ZV_WS_getCountryID(ZV_WS_Session* handle, int* countryID);
+
+ZV_WS_Status ZV_WS_setAudioDefaultProperty(ZV_WS_Session* handle, ZV_WS_AudioProfile profile,
+                                           ZV_WS_StandardResponse* answer);
+ZV_WS_Status ZV_WS_getAudioDefaultProperty(ZV_WS_Session* handle, ZV_WS_AudioProfile* profile);
+
+// ---- The customer's account
+
+/// A page of what the customer bought or rented. `watchStatus` is a ZV_WS_WatchStatus.
+ZV_WS_Status ZV_WS_getMyVideos(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
+                               ZV_WS_TitleTypeFilter typeFilter, int watchStatus, ZV_WS_MyVideosResponse* videos);
+
+/// The purchased titles behind `count` passes.
+ZV_WS_Status ZV_WS_getTitleListingPurchaseds(ZV_WS_Session* handle, const int* passIDs, unsigned int count,
+                                             ZV_WS_TitleListingPurchasedArray* titles);
+
+ZV_WS_Status ZV_WS_checkForPurchasedTitle(ZV_WS_Session* handle, int titleID, bool* isPurchased);
+ZV_WS_Status ZV_WS_checkForPurchasedSku(ZV_WS_Session* handle, int skuID, bool* isPurchased);
+ZV_WS_Status ZV_WS_checkRentalExpiration(ZV_WS_Session* handle, int passID, ZV_WS_RentalExpirationResponse* expiration);
+
+/// Forgets every purchase of the account. The account's password is required.
+ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* password, ZV_WS_StandardResponse* answer);
+
+ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortOrder, const ZV_WS_Pagination* page,
+                                    ZV_WS_TitleTypeFilter typeFilter, ZV_WS_WishlistItemsResponse* items);
+ZV_WS_Status ZV_WS_addItemToWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer);
+ZV_WS_Status ZV_WS_removeItemFromWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer);
+ZV_WS_Status ZV_WS_removeAllItemsFromWishlist(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
+ZV_WS_Status ZV_WS_checkTitleInWishlist(ZV_WS_Session* handle, int titleID, bool* isInWishlist);
+
+/// One answer for each of `count` titles; asks for as many pages of the wish list as it has.
+ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* titleIDs, unsigned int count,
+                                         ZV_WS_TitleTypeFilter typeFilter, ZV_WS_TitlesInWishlist* answers);
+
+ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
+                                                 ZV_WS_CheckAdultVerificationEnabledResponse* answer);
+/// The PIN is sent with at least four digits.
+ZV_WS_Status ZV_WS_checkAdultVerificationPin(ZV_WS_Session* handle, int pin,
+                                             ZV_WS_CheckAdultVerificationPinResponse* answer);
+
+ZV_WS_Status ZV_WS_getEmailAddress(ZV_WS_Session* handle, ZV_WS_EmailAddressResponse* address);
+ZV_WS_Status ZV_WS_getBillingInfo(ZV_WS_Session* handle, ZV_WS_BillingInfoResponse* billing);
+ZV_WS_Status ZV_WS_getBillingInfoAndPPCBalance(ZV_WS_Session* handle, ZV_WS_BillingInfoAndPPCBalanceResponse* billing);
+ZV_WS_Status ZV_WS_getPrePaidCardBalance(ZV_WS_Session* handle, ZV_WS_PPCardBalanceResponse* balance);
+ZV_WS_Status ZV_WS_assignGiftCertificateToUser(ZV_WS_Session* handle, const char* code,
+                                               ZV_WS_GiftCertificateResponse* answer);
+
+/// Buys with the card on file, or from prepaid money. `ipAddress` is the customer's address. Sent once only: after a
+/// transport failure the purchase may have been made.
+ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, const char* ipAddress, bool usePrepaidFund,
+                                          ZV_WS_PurchaseResponse* purchase);
+ZV_WS_Status ZV_WS_calcOrderTax(ZV_WS_Session* handle, int skuID, ZV_WS_CalcOrderTaxResponse* tax);
+
+// ---- Playback
+
+ZV_WS_Status ZV_WS_getStreamingAssetLocation(ZV_WS_Session* handle, int passID, ZV_WS_FileProfile fileProfile,
+                                             ZV_WS_StreamingAssetLocationResponse* location);
+ZV_WS_Status ZV_WS_getStreamingBonusAssetLocation(ZV_WS_Session* handle, int bonusAssetID,
+                                                  ZV_WS_StreamingAssetLocationResponse* location);
+ZV_WS_Status ZV_WS_loadLastStreamingAssetLocation(ZV_WS_Session* handle, int passID, ZV_WS_FileProfile fileProfile,
+                                                  ZV_WS_StreamingAssetLocationResponse* location);
+
+/// Reports what became of a playback. `streamID` is that of its location and required; `stopTime` is its position in
+/// seconds.
+ZV_WS_Status ZV_WS_manageStreamingInstanceStatus(ZV_WS_Session* handle, const char* streamID, ZV_WS_StreamStatus status,
+                                                 int stopTime, ZV_WS_StandardResponse* answer);
+
+/// A refusal by the service leaves the status of these two at ok: it is in the record only.
+ZV_WS_Status ZV_WS_getTHXMediaDirector(ZV_WS_Session* handle, int passID, ZV_WS_FileProfile fileProfile,
+                                       ZV_WS_AudioProfile audioProfile, ZV_WS_THXMediaDirectorResponse* data);
+ZV_WS_Status ZV_WS_getTHXMediaDirectorBonusAsset(ZV_WS_Session* handle, int bonusAssetID, ZV_WS_FileProfile fileProfile,
+                                                 ZV_WS_BonusAssetType bonusAssetType,
+                                                 ZV_WS_THXMediaDirectorResponse* data);
+
+/// Tell the service of a timeout or an error that the device has met.
+ZV_WS_Status ZV_WS_returnTimeout(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
+ZV_WS_Status ZV_WS_returnError(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
+
+// ---- Clock, bandwidth, address
+
+/// The service's clock in seconds since 1970 UTC; -1 on failure. Needs no session. ZV_WS_Status_connection_error,
+/// ZV_WS_Status_net_error, or ZV_WS_Status_general_error for an answer that is no time.
+ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime);
+
+/// The download rate in bits per second, measured on at most 200 KiB; 0 on failure. The file's address is asked once
+/// per session (ZV_WS_getConfig, whose failures are returned). Others: connection_error; net_error;
+/// bandwidth_file_not_found (404); bandwidth_url_not_found and invalid_bandwidth_url for the address.
+ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSecond);
+
+/// The device's IPv4 address as text: its only one, or that of a connection to the service.
+ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address);
+
+// ---- Files. ZV_WS_Status_invalid_param for a null path, ZV_WS_Status_file_operation_error when the operation fails.
+
+/// A file that is not there counts as removed.
+ZV_WS_Status ZV_WS_removeFile(const char* path);
+ZV_WS_Status ZV_WS_copyFile(const char* source, const char* target);
+/// The path up to and including its last "/".
+ZV_WS_Status ZV_WS_getFolderName(const char* path, ZV_WS_String* folder);
+ZV_WS_Status ZV_WS_folderExist(const char* path, bool* exists);
+/// Makes the missing folders above, too.
+ZV_WS_Status ZV_WS_createFolder(const char* path);
+ZV_WS_Status ZV_WS_fileExist(const char* path, bool* exists);
