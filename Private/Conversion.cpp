@@ -6,123 +6,268 @@
 
 namespace {
 
-// One member: texts are copied to the heap, numbers, booleans and enumerations keep their number.
-void Copy(const char* from, char*& to) { to = ZVUtilities::StrDup(from); }
-
+// One member: texts are copied to the heap, numbers, flags and enumerations keep their number.
 template <class From, class To>
 void Copy(const From& from, To& to)
 {
-    to = static_cast<To>(from);
+    if constexpr (std::is_same_v<To, char*>) {
+        to = ZVUtilities::StrDup(from);
+    } else {
+        to = static_cast<To>(from);
+    }
 }
 
-// The elements of an array; `convert` gets each one that is there: the service may send an element marked as nil.
-template <class From, class To, class Convert>
-void CopyElements(int count, From* from, unsigned int& size, To*& to, Convert convert)
+// The elements of an array, each through its Convert; the service may send an element marked as nil, which stays empty.
+template <class From, class To>
+void CopyElements(int count, From* from, unsigned int& size, To*& to)
 {
     Records::Allocate(size, to, from && count > 0 ? count : 0);
     for (unsigned int i = 0; i < size; ++i) {
-        if constexpr (std::is_pointer_v<From>) {
-            if (!from[i]) continue;
+        if constexpr (!Records::kIsRecord<To>) {
+            Copy(from[i], to[i]);
+        } else if (from[i]) {
+            ZVUtilities::Convert(from[i], to[i]);
         }
-        convert(from[i], to[i]);
     }
 }
 
 }  // namespace
 
+namespace ZVUtilities {
+
+// A conversion's head, and a conversion that copies members of the same name.
+#define ZV_CONVERT(From, To) void ZV1__##From##2ZV_WS_##To(const ZV1__##From* t, ZV_WS_##To& to)
+#define ZV_CONVERT_MEMBERS(From, To, ...) \
+    ZV_CONVERT(From, To)                  \
+    {                                     \
+        ZV_ASSERT(t != 0);                \
+        ZV_COPY(__VA_ARGS__)              \
+    }
 // Members of the same name on both sides, in the order of the record.
 #define ZV_COPY_MEMBER(name) Copy(t->name, to.name);
 #define ZV_COPY(...) ZV_WS_EACH(ZV_COPY_MEMBER, __VA_ARGS__)
+// An array record from the array `from`; null is an empty one.
+#define ZV_COPY_ARRAY(from, to, element) \
+    if (from) CopyElements((from)->__size##element, (from)->element, (to).size, (to).element)
+// A record that is nothing but an array.
+#define ZV_CONVERT_ARRAY(From, To, element) \
+    ZV_CONVERT(From, To)                    \
+    {                                       \
+        ZV_ASSERT(t != 0);                  \
+        ZV_COPY_ARRAY(t, to, element);      \
+    }
 
-// An array that is a member, through the conversion of its elements; null is an empty one.
-#define ZV_COPY_ARRAY(member, element, convert) \
-    if (t->member) CopyElements(t->member->__size##element, t->member->element, to.member.size, to.member.element, convert)
+ZV_CONVERT_MEMBERS(StandardResponse, StandardResponse, ResponseCode, ResponseMessage)
+ZV_CONVERT_MEMBERS(WishListActionResponse, StandardResponse, ResponseCode, ResponseMessage)
 
-namespace ZVUtilities {
+// ---- Catalogue
 
-namespace {
-
-template <class From, class To>
-void CopyNumber(const From& from, To& to)
+ZV_CONVERT(Genre, Genre)
 {
-    to = static_cast<To>(from);
-}
-
-void BonusAsset(const ZV1__BonusAsset* t, ZV_WS_BonusAsset& to) { ZV_COPY(BonusAssetID, Profile, BonusType) }
-
-void AudioFile(const ZV1__AudioFile* t, ZV_WS_AudioFile& to)
-{
-    ZV_COPY(AssetAudioID, FileLocation, ContainsVideo, AudioAssetProfile)
-}
-
-void ProductListing(const ZV1__ProductListing* t, ZV_WS_ProductListing& to)
-{
-    ZV_COPY(SkuID, PurchaseType, Price, ExpireDate, RentalPeriod)
-    ZV_COPY_ARRAY(AvailableAssets, FileProfile, (CopyNumber<ZV1__FileProfile, ZV_WS_FileProfile>));
-    ZV_COPY_ARRAY(AvailableAudioProfiles, AudioFile, AudioFile);
-}
-
-void Genre(const ZV1__Genre* t, ZV_WS_Genre& to)
-{
+    ZV_ASSERT(t != 0);
     ZV_COPY(ID, Name, Visible)
     to.ParentID = t->ParentId;
 }
 
-}  // namespace
-
-void ZV1__StandardResponse2ZV_WS_StandardResponse(const ZV1__StandardResponse* t, ZV_WS_StandardResponse& to)
+ZV_CONVERT(GenreRequest, GenreArray)
 {
     ZV_ASSERT(t != 0);
-    ZV_COPY(ResponseCode, ResponseMessage)
+    ZV_COPY_ARRAY(t->Genres, to, Genre);
 }
 
-void ZV1__TitleListing2ZV_WS_TitleListing(const ZV1__TitleListing* t, ZV_WS_TitleListing& to)
+ZV_CONVERT_MEMBERS(GetGenreLabelResponse, GenreLabelResponse, ResponseCode, ResponseMessage, Label, LabelMessage)
+ZV_CONVERT_MEMBERS(BonusAsset, BonusAsset, BonusAssetID, Profile, BonusType)
+ZV_CONVERT_MEMBERS(AudioFile, AudioFile, AssetAudioID, FileLocation, ContainsVideo, AudioAssetProfile)
+
+ZV_CONVERT(ProductListing, ProductListing)
 {
     ZV_ASSERT(t != 0);
-    ZV_COPY(TitleID, TitleName, BoxArtPrefix, TitlePosition, EpisodeNumber, IsTvListing, MPAARating)
-    ZV_COPY_ARRAY(BonusAssets, BonusAsset, BonusAsset);
-    ZV_COPY_ARRAY(AvailableProducts, ProductListing, ProductListing);
+    ZV_COPY(SkuID, PurchaseType, Price)
+    ZV_COPY_ARRAY(t->AvailableAssets, to.AvailableAssets, FileProfile);
+    ZV_COPY(ExpireDate)
+    ZV_COPY_ARRAY(t->AvailableAudioProfiles, to.AvailableAudioProfiles, AudioFile);
+    ZV_COPY(RentalPeriod)
+}
+
+ZV_CONVERT(TitleListing, TitleListing)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(TitleID, TitleName, BoxArtPrefix, TitlePosition, EpisodeNumber)
+    ZV_COPY_ARRAY(t->BonusAssets, to.BonusAssets, BonusAsset);
+    ZV_COPY(IsTvListing, MPAARating)
+    ZV_COPY_ARRAY(t->AvailableProducts, to.AvailableProducts, ProductListing);
     ZV_COPY(IsTHXMediaDirectorEnabled, IsTHXMediaDirectorEnabledForTrailer, CHVRSRating, LoyaltyPointsForBuy,
             LoyaltyPointsForRent)
 }
 
-void ZV1__ArrayOfTitleListing2ZV_WS_TitleListingArray(const ZV1__ArrayOfTitleListing* t, ZV_WS_TitleListingArray& to)
-{
-    ZV_ASSERT(t != 0);
-    CopyElements(t->__sizeTitleListing, t->TitleListing, to.size, to.TitleListing, ZV1__TitleListing2ZV_WS_TitleListing);
-}
+ZV_CONVERT_ARRAY(ArrayOfTitleListing, TitleListingArray, TitleListing)
 
-void ZV1__TitleListingResponse2ZV_WS_TitleListingResponse(const ZV1__TitleListingResponse* t,
-                                                          ZV_WS_TitleListingResponse& to)
+ZV_CONVERT(TitleListingResponse, TitleListingResponse)
 {
     ZV_ASSERT(t != 0);
     ZV1__TitleListing2ZV_WS_TitleListing(t, to);
+    ZV_COPY(ResponseCode, ResponseMessage)
     Copy(t->Synopsys, to.Synopsis);
-    ZV_COPY(ResponseCode, ResponseMessage, UserRating, Directors, Actors, Writers, Producers, Copyright, RunTime,
-            RatingReason)
+    ZV_COPY(UserRating, Directors, Actors, Writers, Producers, Copyright, RunTime, RatingReason)
 }
 
-void ZV1__GetTitlesResponse2ZV_WS_TitlesResponse(const ZV1__GetTitlesResponse* t, ZV_WS_TitlesResponse& to)
+ZV_CONVERT_ARRAY(ArrayOfTitleListingResponse, TitleListingResponseArray, TitleListingResponse)
+
+ZV_CONVERT(GetTitlesResponse, TitlesResponse)
 {
     ZV_ASSERT(t != 0);
     ZV_COPY(ResponseCode, ResponseMessage, GenreID, CurrentPageNumber, ItemsPerPage, TotalPages, TotalItems)
-    if (t->Titles) ZV1__ArrayOfTitleListing2ZV_WS_TitleListingArray(t->Titles, to.Titles);
+    ZV_COPY_ARRAY(t->Titles, to.Titles, TitleListing);
 }
 
-void ZV1__ArrayOfGenre2ZV_WS_GenreArray(const ZV1__ArrayOfGenre* t, ZV_WS_GenreArray& to)
+ZV_CONVERT(ArrayOfGetTitlesResponse, TitlesResponseArray)
 {
     ZV_ASSERT(t != 0);
-    CopyElements(t->__sizeGenre, t->Genre, to.size, to.Genre, Genre);
+    CopyElements(t->__sizeGetTitlesResponse, t->GetTitlesResponse, to.size, to.TitlesResponse);
 }
 
-void ZV1__FileType2ZV_WS_FileType(const ZV1__FileType* t, ZV_WS_FileType& to)
+ZV_CONVERT_MEMBERS(TvEpisode, TvEpisode, EpisodeID, EpisodeName, EpisodeNumber)
+
+ZV_CONVERT(TvEpisodeList, TvEpisodeListResponse)
 {
     ZV_ASSERT(t != 0);
-    to.DRMProvider = static_cast<ZV_WS_DRMProvider>(t->File_USCOREDRMProvider);
-    to.AccessType = static_cast<ZV_WS_AccessType>(t->File_USCOREAccessType);
-    to.FileProfile = static_cast<ZV_WS_FileProfile>(t->File_USCOREFileProfile);
-    to.VideoFormat = static_cast<ZV_WS_VideoFormat>(t->File_USCOREVideoFormat);
-    to.FileExtension = static_cast<ZV_WS_FileExtension>(t->File_USCOREFileExtension);
+    ZV_COPY(ResponseCode, ResponseMessage)
+    ZV_COPY_ARRAY(t->Episodes, to.Episodes, TvEpisode);
 }
+
+ZV_CONVERT(TranslateSkuIdResponse, TranslateSkuIDResponse)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage)
+    to.TitleID = t->TitleId;
+}
+
+ZV_CONVERT(TranslateTivoExternalIDResponse, TranslateTivoExternalIDResponse)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage)
+    Copy(t->TivoExternalId, to.TivoExternalID);
+    to.TitleID = t->TitleId;
+}
+
+ZV_CONVERT(RecommendedTitlesResponse, RecommendedTitlesResponse)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage)
+    ZV_COPY_ARRAY(t->Titles, to.Titles, TitleListing);
+}
+
+// ---- The device
+
+ZV_CONVERT(FileType, FileType)
+{
+    ZV_ASSERT(t != 0);
+    Copy(t->File_USCOREDRMProvider, to.DRMProvider);
+    Copy(t->File_USCOREAccessType, to.AccessType);
+    Copy(t->File_USCOREFileProfile, to.FileProfile);
+    Copy(t->File_USCOREVideoFormat, to.VideoFormat);
+    Copy(t->File_USCOREFileExtension, to.FileExtension);
+}
+
+ZV_CONVERT_MEMBERS(AuthorizeDeviceResponse, AuthorizeDeviceResponse, ResponseCode, ResponseMessage, AuthToken)
+ZV_CONVERT_MEMBERS(ConfigurationItemOfString, ConfigurationItem, Key, Value)
+
+ZV_CONVERT(GetConfigResponse, ConfigResponse)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage)
+    if (const auto* set = t->ConfigurationSet) {
+        CopyElements(set->__sizeConfiguration, set->Configuration, to.size, to.ConfigurationItem);
+    }
+}
+
+ZV_CONVERT_MEMBERS(SettingsPageInfo, SettingsPageInfoResponse, ResponseCode, ResponseMessage, Account, DeviceID,
+                   DeviceName)
+
+// ---- The account
+
+ZV_CONVERT(TitleListingPurchased, TitleListingPurchased)
+{
+    ZV_ASSERT(t != 0);
+    ZV1__TitleListing2ZV_WS_TitleListing(t, to);
+    ZV_COPY(EpisodeID, TvListingTitleID, PurchaseType, Status, RentalPeriod, PassID, PlayStatus, StartTimeSeconds)
+}
+
+ZV_CONVERT_ARRAY(ArrayOfTitleListingPurchased, TitleListingPurchasedArray, TitleListingPurchased)
+
+ZV_CONVERT(ArrayOfTitleListingPurchasedForPass, TitleListingPurchasedArray)
+{
+    ZV_ASSERT(t != 0);
+    CopyElements(t->__sizeTitleListingPurchasedForPass, t->TitleListingPurchasedForPass, to.size,
+                 to.TitleListingPurchased);
+}
+
+// Pages of purchases and of the wish list.
+template <class From>
+static void CopyPage(const From* t, ZV_WS_MyVideosResponse& to)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage, CurrentPageNumber, ItemsPerPage, TotalPages, TotalItems)
+    ZV_COPY_ARRAY(t->Titles, to.Titles, TitleListingPurchased);
+}
+
+ZV_CONVERT(GetMyVideosResponse, MyVideosResponse) { CopyPage(t, to); }
+
+ZV_CONVERT(GetWishlistItemsResponse, WishlistItemsResponse)
+{
+    CopyPage(t, to);
+    to.SortOrder = t->SortOrder;
+}
+
+ZV_CONVERT_MEMBERS(CheckRentalExpirationResponse, RentalExpirationResponse, ResponseCode, ResponseMessage,
+                   ShouldDisplay, HoursRemaining)
+
+ZV_CONVERT(CheckAdultVerificationEnabledResponse, CheckAdultVerificationEnabledResponse)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage)
+    to.IsAdultVerificationEnabled = Str2Bool(t->IsAdultVerificationEnabled);
+}
+
+ZV_CONVERT_MEMBERS(CheckAdultVerificationPinResponse, CheckAdultVerificationPinResponse, ResponseCode, ResponseMessage,
+                   IsPinVerified)
+ZV_CONVERT_MEMBERS(GetEmailAddressResponse, EmailAddressResponse, ResponseCode, ResponseMessage, EmailAddress)
+
+ZV_CONVERT(BillingInfoResponse, BillingInfoResponse)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage, CCLastFour)
+    to.CCTypeID = t->CCTypeId;
+    ZV_COPY(CCType)
+}
+
+ZV_CONVERT_MEMBERS(PPCardBalanceResponse, PPCardBalanceResponse, ResponseCode, ResponseMessage, Balance)
+
+ZV_CONVERT(BillingInfoAndPPCBalanceResponse, BillingInfoAndPPCBalanceResponse)
+{
+    ZV_ASSERT(t != 0);
+    if (t->BillingInfo) Convert(t->BillingInfo, to.BillingInfo);
+    if (t->PPCardBalance) Convert(t->PPCardBalance, to.PPCardBalance);
+}
+
+ZV_CONVERT_MEMBERS(GiftCertificateResponse, GiftCertificateResponse, ResponseCode, ResponseMessage, Balance)
+
+ZV_CONVERT(PurchaseResponse, PurchaseResponse)
+{
+    ZV_ASSERT(t != 0);
+    ZV_COPY(ResponseCode, ResponseMessage, PassID)
+    to.TransactionID = t->TransactionId;
+    ZV_COPY(TransactionAuthNum)
+}
+
+ZV_CONVERT_MEMBERS(CalcOrderTaxResponse, CalcOrderTaxResponse, ResponseCode, ResponseMessage, SubTotal, TotalPrice, Tax)
+
+// ---- Playback
+
+ZV_CONVERT_MEMBERS(GetStreamingAssetLocationResponse, StreamingAssetLocationResponse, ResponseCode, ResponseMessage,
+                   StreamingAssetLocation, AssetID, StreamID, DRMServerURL, DRMACKServerURL, Status, StartTimeSeconds,
+                   HeartbeatURL, HeartbeatPollInSeconds)
+ZV_CONVERT_MEMBERS(THXMediaDirectorResponse, THXMediaDirectorResponse, ResponseCode, ResponseMessage, LongFormat,
+                   ShortFormat)
 
 }  // namespace ZVUtilities
