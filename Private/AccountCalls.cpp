@@ -1,10 +1,150 @@
-// The customer's account: what the device may do, settings, wish list, payment and purchases.
-#include "Conversion.h"
+// The customer's account: purchases, rentals, payment and parental control.
+#include <stdio.h>
+
 #include "ServiceCall.h"
 
-ZV_WS_Status ZV_WS_getFileType(ZV_WS_Session* handle, ZV_WS_FileType* fileType)
+namespace {
+
+// Both services' page of purchases; the operations differ in name only.
+template <class Op>
+ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_Pagination* page,
+                      ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter, int watchStatus,
+                      ZV_WS_MyVideosResponse* videos)
 {
-    ServiceCall<Operation::getFileType> call("ZV_WS_getFileType", handle, fileType);
+    ServiceCall<Op> call(function, handle, videos);
+    if (!call.Accepts(page)) return call.Refusal();
+    SetPage(call, *page);
+    SetEnum(call->PurchaseType, purchaseType);
+    SetEnum(call->TitleType, typeFilter);
+    SetEnum(call->WatchStatusFilter, watchStatus);
+    return call.Into(videos);
+}
+
+template <class Op>
+ZV_WS_Status IsTitlePurchased(const char* function, ZV_WS_Session* handle, int titleID, bool* isPurchased)
+{
+    ServiceCall<Op> call(function, handle, isPurchased);
     if (!call.Accepts()) return call.Refusal();
-    return call.Into(fileType, ZVUtilities::ZV1__FileType2ZV_WS_FileType);
+    call->TitleID = titleID;
+    return LogAnswer(function, call.Into(isPurchased), *isPurchased);
+}
+
+bool Downloads(const ZV_WS_Session* handle)
+{
+    return handle && handle->_pSessionImpl && handle->_pSessionImpl->m_Params.AccessType == ACCESS_TYPE_DOWNLOAD;
+}
+
+}  // namespace
+
+ZV_WS_Status ZV_WS_getMyVideos(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
+                               ZV_WS_TitleTypeFilter typeFilter, int watchStatus, ZV_WS_MyVideosResponse* videos)
+{
+    const auto ask = Downloads(handle) ? MyVideos<Operation::getMyVideos> : MyVideos<Operation::getMyStreamingVideos>;
+    return ask(__func__, handle, page, purchaseType, typeFilter, watchStatus, videos);
+}
+
+ZV_WS_Status ZV_WS_getTitleListingPurchaseds(ZV_WS_Session* handle, const int* passIDs, unsigned int count,
+                                             ZV_WS_TitleListingPurchasedArray* titles)
+{
+    ServiceCall<Operation::getTitleListingsPurchasedForPasses> call(__func__, handle, titles);
+    if (!call.Accepts(passIDs || count == 0)) return call.Refusal();
+    ZV1__ArrayOfInt ids = BorrowedInts(passIDs, count);
+    call->Passes = &ids;
+    return call.Into(titles);
+}
+
+ZV_WS_Status ZV_WS_checkForPurchasedTitle(ZV_WS_Session* handle, int titleID, bool* isPurchased)
+{
+    const auto ask = Downloads(handle) ? IsTitlePurchased<Operation::checkForPurchasedTitle>
+                                       : IsTitlePurchased<Operation::checkForPurchasedStreamByTitleID>;
+    return ask(__func__, handle, titleID, isPurchased);
+}
+
+ZV_WS_Status ZV_WS_checkForPurchasedSku(ZV_WS_Session* handle, int skuID, bool* isPurchased)
+{
+    ServiceCall<Operation::checkForPurchasedStream> call(__func__, handle, isPurchased);
+    if (!call.Accepts()) return call.Refusal();
+    call->SkuID = skuID;
+    return LogAnswer(__func__, call.Into(isPurchased), *isPurchased);
+}
+
+ZV_WS_Status ZV_WS_checkRentalExpiration(ZV_WS_Session* handle, int passID, ZV_WS_RentalExpirationResponse* expiration)
+{
+    ServiceCall<Operation::checkRentalExpiration> call(__func__, handle, expiration);
+    if (!call.Accepts()) return call.Refusal();
+    call->PassId = passID;
+    return call.Into(expiration);
+}
+
+ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* password, ZV_WS_StandardResponse* answer)
+{
+    ServiceCall<Operation::removeAllMyPurchases> call(__func__, handle, answer);
+    if (!call.Accepts(password && *password)) return call.Refusal();
+    call->password = Text(password);
+    return call.Into(answer);
+}
+
+ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
+                                                 ZV_WS_CheckAdultVerificationEnabledResponse* answer)
+{
+    return Ask<Operation::checkAdultVerificationEnabled>(__func__, handle, answer);
+}
+
+ZV_WS_Status ZV_WS_checkAdultVerificationPin(ZV_WS_Session* handle, int pin,
+                                             ZV_WS_CheckAdultVerificationPinResponse* answer)
+{
+    ServiceCall<Operation::checkAdultVerificationPin> call(__func__, handle, answer);
+    if (!call.Accepts()) return call.Refusal();
+    char text[16];
+    snprintf(text, sizeof text, "%04d", pin);
+    call->Pin = text;
+    return call.Into(answer);
+}
+
+ZV_WS_Status ZV_WS_getEmailAddress(ZV_WS_Session* handle, ZV_WS_EmailAddressResponse* address)
+{
+    return Ask<Operation::getEmailAddress>(__func__, handle, address);
+}
+
+ZV_WS_Status ZV_WS_getBillingInfo(ZV_WS_Session* handle, ZV_WS_BillingInfoResponse* billing)
+{
+    return Ask<Operation::getBillingInfo>(__func__, handle, billing);
+}
+
+ZV_WS_Status ZV_WS_getBillingInfoAndPPCBalance(ZV_WS_Session* handle, ZV_WS_BillingInfoAndPPCBalanceResponse* billing)
+{
+    return Ask<Operation::getBillingInfoAndPPCBalance>(__func__, handle, billing);
+}
+
+ZV_WS_Status ZV_WS_getPrePaidCardBalance(ZV_WS_Session* handle, ZV_WS_PPCardBalanceResponse* balance)
+{
+    return Ask<Operation::showPrePaidCardBalance>(__func__, handle, balance);
+}
+
+ZV_WS_Status ZV_WS_assignGiftCertificateToUser(ZV_WS_Session* handle, const char* code,
+                                               ZV_WS_GiftCertificateResponse* answer)
+{
+    ServiceCall<Operation::assignGiftCertificateToUser> call(__func__, handle, answer);
+    if (!call.Accepts()) return call.Refusal();
+    call->GiftCertificateCode = Text(code);
+    return call.Into(answer);
+}
+
+ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, const char* ipAddress, bool usePrepaidFund,
+                                          ZV_WS_PurchaseResponse* purchase)
+{
+    ServiceCall<Operation::doPurchaseSavedbilling> call(__func__, handle, purchase);
+    if (!call.Accepts()) return call.Refusal();
+    call->SkuID = skuID;
+    call->IPAddress = Text(ipAddress);
+    call->UsePrePaidFunds = Text(usePrepaidFund ? "yes" : "no");
+    return call.Into(purchase);
+}
+
+ZV_WS_Status ZV_WS_calcOrderTax(ZV_WS_Session* handle, int skuID, ZV_WS_CalcOrderTaxResponse* tax)
+{
+    ServiceCall<Operation::calcOrderTax> call(__func__, handle, tax);
+    if (!call.Accepts()) return call.Refusal();
+    call->SKUID = skuID;
+    return call.Into(tax);
 }

@@ -1,32 +1,124 @@
 // The catalogue: genres, titles and their details.
-#include "Conversion.h"
 #include "ServiceCall.h"
 
 ZV_WS_Status ZV_WS_getNavigation(ZV_WS_Session* handle, ZV_WS_GenreArray* genres)
 {
-    ServiceCall<Operation::getNavigation> call("ZV_WS_getNavigation", handle, genres);
+    return Ask<Operation::getNavigation>(__func__, handle, genres);
+}
+
+ZV_WS_Status ZV_WS_getGenreLabel(ZV_WS_Session* handle, int genreID, ZV_WS_GenreLabelResponse* label)
+{
+    ServiceCall<Operation::getGenreLabel> call(__func__, handle, label);
     if (!call.Accepts()) return call.Refusal();
-    return call.Into(genres, [](const ZV1__GenreRequest* t, ZV_WS_GenreArray& to) {
-        if (t->Genres) ZVUtilities::ZV1__ArrayOfGenre2ZV_WS_GenreArray(t->Genres, to);
-    });
+    call->GenreID = genreID;
+    return call.Into(label);
 }
 
 ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pagination* page, int purchaseType,
                              ZV_WS_TitlesResponse* titles)
 {
-    ServiceCall<Operation::getTitlesByNavigation> call("ZV_WS_getTitles", handle, titles);
+    ServiceCall<Operation::getTitlesByNavigation> call(__func__, handle, titles);
     if (!call.Accepts(page)) return call.Refusal();
     call->GenreID = genreID;
-    call->CurrentPageNumber = page->CurrentPageNumber;
-    call->ItemsPerPage = page->ItemsPerPage;
-    call->PurchaseType = static_cast<ZV1__StreamAPIPurchaseType>(purchaseType);
-    return call.Into(titles, ZVUtilities::ZV1__GetTitlesResponse2ZV_WS_TitlesResponse);
+    SetPage(call, *page);
+    SetEnum(call->PurchaseType, purchaseType);
+    return call.Into(titles);
+}
+
+ZV_WS_Status ZV_WS_getTitlesByGenreIDs(ZV_WS_Session* handle, const int* genreIDs, unsigned int count,
+                                       const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
+                                       ZV_WS_TitlesResponseArray* titles)
+{
+    ServiceCall<Operation::getTitlesByGenreArray> call(__func__, handle, titles);
+    if (!call.Accepts(page && (genreIDs || count == 0))) return call.Refusal();
+    ZV1__ArrayOfInt ids = BorrowedInts(genreIDs, count);
+    call->GenreIDs = &ids;
+    SetPage(call, *page);
+    SetEnum(call->PurchaseType, purchaseType);
+    return call.Into(titles);
 }
 
 ZV_WS_Status ZV_WS_getTitleListing(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponse* listing)
 {
-    ServiceCall<Operation::getTitleListing> call("ZV_WS_getTitleListing", handle, listing);
+    ServiceCall<Operation::getTitleListing> call(__func__, handle, listing);
     if (!call.Accepts()) return call.Refusal();
     call->TitleID = titleID;
-    return call.Into(listing, ZVUtilities::ZV1__TitleListingResponse2ZV_WS_TitleListingResponse);
+    return call.Into(listing);
+}
+
+ZV_WS_Status ZV_WS_getTvEpisodeListing(ZV_WS_Session* handle, int episodeID, ZV_WS_TitleListingResponse* listing)
+{
+    ServiceCall<Operation::getTvEpisodeListing> call(__func__, handle, listing);
+    if (!call.Accepts()) return call.Refusal();
+    call->EpisodeID = episodeID;
+    return call.Into(listing);
+}
+
+ZV_WS_Status ZV_WS_getTvEpisodeListByTitleID(ZV_WS_Session* handle, int titleID, ZV_WS_TvEpisodeListResponse* episodes)
+{
+    ServiceCall<Operation::getTvEpisodeListByTitleID> call(__func__, handle, episodes);
+    if (!call.Accepts()) return call.Refusal();
+    call->TitleID = titleID;
+    return call.Into(episodes);
+}
+
+ZV_WS_Status ZV_WS_getAllTvEpisodeListings(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponseArray* listings)
+{
+    ServiceCall<Operation::getAllTvEpisodeListings> call(__func__, handle, listings);
+    if (!call.Accepts()) return call.Refusal();
+    call->TitleID = titleID;
+    return call.Into(listings);
+}
+
+ZV_WS_Status ZV_WS_translateSkuID(ZV_WS_Session* handle, int skuID, ZV_WS_TranslateSkuIDResponse* title)
+{
+    ServiceCall<Operation::translateSkuId> call(__func__, handle, title);
+    if (!call.Accepts()) return call.Refusal();
+    call->SkuId = skuID;
+    return call.Into(title);
+}
+
+ZV_WS_Status ZV_WS_translateTivoExternalID(ZV_WS_Session* handle, const char* externalID,
+                                           ZV_WS_TranslateTivoExternalIDResponse* title)
+{
+    ServiceCall<Operation::translateTivoExternalId> call(__func__, handle, title);
+    if (!call.Accepts()) return call.Refusal();
+    call->TivoExternalId = Text(externalID);
+    return call.Into(title);
+}
+
+// The two searches differ only in how much of each title they answer.
+template <class Op>
+static ZV_WS_Status Search(const char* function, ZV_WS_Session* handle, const ZV_WS_Pagination* page,
+                           ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter, const char* query,
+                           ZV_WS_TitlesResponse* titles)
+{
+    ServiceCall<Op> call(function, handle, titles);
+    if (!call.Accepts(page)) return call.Refusal();
+    call->Query = Text(query);
+    SetPage(call, *page);
+    SetEnum(call->PurchaseType, purchaseType);
+    SetEnum(call->TitleType, typeFilter);
+    return call.Into(titles);
+}
+
+ZV_WS_Status ZV_WS_searchForTitle(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
+                                  ZV_WS_TitleTypeFilter typeFilter, const char* query, ZV_WS_TitlesResponse* titles)
+{
+    return Search<Operation::searchForTitle>(__func__, handle, page, purchaseType, typeFilter, query, titles);
+}
+
+ZV_WS_Status ZV_WS_searchForTitleDetail(ZV_WS_Session* handle, const ZV_WS_Pagination* page,
+                                        ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter,
+                                        const char* query, ZV_WS_TitlesResponse* titles)
+{
+    return Search<Operation::searchForTitleDetail>(__func__, handle, page, purchaseType, typeFilter, query, titles);
+}
+
+ZV_WS_Status ZV_WS_getRecommendedTitles(ZV_WS_Session* handle, int titleID, ZV_WS_RecommendedTitlesResponse* titles)
+{
+    ServiceCall<Operation::getRecommendedTitles> call(__func__, handle, titles);
+    if (!call.Accepts()) return call.Refusal();
+    call->TitleId = titleID;
+    return call.Into(titles);
 }

@@ -10,7 +10,7 @@ ServiceCallBase::ServiceCallBase(const char* function, const ZV_WS_Session* hand
 
 void ServiceCallBase::LogProxy(const char* verb, const char* proxy, const char* operation)
 {
-    ZV_LogOutput(GetZV_LogAreaID(), 4, "%s %s::%s\n", verb, proxy, operation);
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s %s::%s\n", verb, proxy, operation);
 }
 
 ZV_WS_Status ServiceCallBase::Finish(soap& context, int result, bool answered, int responseCode)
@@ -18,7 +18,13 @@ ZV_WS_Status ServiceCallBase::Finish(soap& context, int result, bool answered, i
     soap_destroy(&context);
     soap_end(&context);
     context.header = nullptr;
-    ZV_LogOutput(GetZV_LogAreaID(), 4, "%s, ret:%d,responseCode:%d\n", m_Function, result, responseCode);
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, ret:%d,responseCode:%d\n", m_Function, result, responseCode);
     if (result == SOAP_OK && !answered) return ZV_WS_Status_general_error;
-    return ZVUtilities::To_ZV_WS_Status(result, responseCode, m_Function);
+    return ZVUtilities::To_ZV_WS_Status(result, m_UsesResponseCode ? responseCode : 0, m_Function);
+}
+
+ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, bool answer)
+{
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, result:%d\n", function, answer);
+    return status;
 }

@@ -1,32 +1,37 @@
 // The shape of every call of a service, from the emptied output to the status.
 //
-//     ServiceCall<Operation::getTitleListing> call("ZV_WS_getTitleListing", handle, listing);
+//     ServiceCall<Operation::getTitleListing> call(__func__, handle, listing);
 //     if (!call.Accepts()) return call.Refusal();
 //     call->TitleID = titleID;
-//     return call.Into(listing, ZVUtilities::ZV1__TitleListingResponse2ZV_WS_TitleListingResponse);
+//     return call.Into(listing);
 //
-// The first line empties and tags the output, so that it can be released however the call ends. Then the call's own argument
-// checks, the request's children, and the conversion of the answer's result into the output. Into sends the request, once more when a
-// connection kept from an earlier call turns out to be dead and the operation changes nothing, converts, cleans up, writes the log
-// line and maps the status. Nothing is thrown through it.
+// The first line empties and tags the output, so that it can be released however the call ends. Then the call's own
+// argument checks, and the request's children. Into sends the request, once more when a connection kept from an earlier
+// call turns out to be dead and the operation changes nothing, converts the answer's result (Conversion.h), cleans up,
+// writes the log line and maps the status. Nothing is thrown through it.
 #pragma once
 
 #include <utility>
 
+#include "CallGuard.h"
+#include "Conversion.h"
 #include "Operations.h"
 #include "Records.h"
 #include "ZVUtilities.h"
 
 namespace CallDetail {
 
-template <class Record, class = void>
-struct ResponseCode {
-    static int Of(const Record&) { return 0; }
-};
-template <class Record>
-struct ResponseCode<Record, std::void_t<decltype(Record::ResponseCode)>> {
-    static int Of(const Record& record) { return record.ResponseCode; }
-};
+// The response code of answers that have one; the other answers are no refusals.
+template <class Answer>
+auto ResponseCodeOf(const Answer& answer, int) -> decltype(answer.ResponseCode)
+{
+    return answer.ResponseCode;
+}
+template <class Answer>
+int ResponseCodeOf(const Answer&, long)
+{
+    return 0;
+}
 
 }  // namespace CallDetail
 
@@ -39,15 +44,22 @@ public:
     /// The status of a call that cannot be made.
     ZV_WS_Status Refusal() const { return m_Tagged ? ZV_WS_Status_invalid_param : ZV_WS_Status_general_error; }
 
+    /// The status shall tell of the transport only: the service's response code stays in the record.
+    void IgnoreResponseCode() { m_UsesResponseCode = false; }
+
+    /// Only when the call can be made.
+    SessionImpl& session() { return *m_Session; }
+
 protected:
     ServiceCallBase(const char* function, const ZV_WS_Session* handle);
 
-    /// Runs `send` between Setup and the rules for kept connections, a second time where that is safe. `send` returns the SOAP
-    /// runtime's result.
+    /// Runs `send` between Setup and the rules for kept connections, a second time where that is safe. `send` returns
+    /// the SOAP runtime's result.
     template <class Service, class Send>
     int Exchange(Service& service, const char* operation, bool changes, Send&& send);
 
-    /// Frees the context's temporary data, logs, and maps the status. `answered` tells whether an answer came with a result.
+    /// Frees the context's temporary data, logs, and maps the status. `answered` tells whether an answer came with a
+    /// result.
     ZV_WS_Status Finish(soap& context, int result, bool answered, int responseCode);
 
     static void LogProxy(const char* verb, const char* proxy, const char* operation);
@@ -55,22 +67,24 @@ protected:
     const char* m_Function;
     SessionImpl* m_Session;
     bool m_Tagged = true;
+    bool m_UsesResponseCode = true;
 };
 
 template <class Op>
 class ServiceCall : public ServiceCallBase {
 public:
+    using Answer = std::remove_pointer_t<decltype(Op::Result(std::declval<typename Op::Response>()))>;
+
     /// `function` is the ZV_WS_ function's name; `out` a record, or a plain value, which becomes zero.
     template <class Output>
     ServiceCall(const char* function, const ZV_WS_Session* handle, Output* out) : ServiceCallBase(function, handle)
     {
         ZV_ASSERT(out != 0);
         if constexpr (Records::kIsRecord<Output>) {
-            try {
-                Records::Tag(*out);
-            } catch (const std::bad_alloc&) {
-                m_Tagged = false;
-            }
+            m_Tagged = GuardCall([&] {
+                           Records::Tag(*out);
+                           return ZV_WS_Status_ok;
+                       }) == ZV_WS_Status_ok;
         } else {
             *out = Output();
         }
@@ -79,27 +93,70 @@ public:
     /// The request.
     typename Op::Request* operator->() { return &m_Request; }
 
-    /// Makes the call. `convert(result, output)` gets the answer's result, never null.
-    template <class Output, class Convert>
-    ZV_WS_Status Into(Output* out, Convert&& convert)
+    /// Makes the call.
+    template <class Output>
+    ZV_WS_Status Into(Output* out)
+    {
+        return Into([out](const Answer* answer) { ZVUtilities::Convert(answer, *out); });
+    }
+
+    /// Makes the call and hands the answer's result, never null, to `convert(result)`.
+    template <class Convert, class = std::enable_if_t<!std::is_pointer_v<Convert>>>
+    ZV_WS_Status Into(Convert convert)
     {
         auto& service = Op::Service(*m_Session);
-        const int result = Exchange(service, Op::kName, Op::kChanges,
-                                    [&] { return Op::Send(*m_Session, m_Request, m_Response); });
-        const auto* answer = result == SOAP_OK ? Op::Result(m_Response) : nullptr;
-        bool converted = answer != nullptr;
-        try {
-            if (answer) convert(answer, *out);
-        } catch (const std::bad_alloc&) {
-            converted = false;
-        }
-        return Finish(service, result, converted, CallDetail::ResponseCode<Output>::Of(*out));
+        const int result =
+            Exchange(service, Op::kName, Op::kChanges, [&] { return Op::Send(*m_Session, m_Request, m_Response); });
+        Answer* answer = result == SOAP_OK ? Op::Result(m_Response) : nullptr;
+        const bool converted = answer && GuardCall([&] {
+                                             convert(answer);
+                                             return ZV_WS_Status_ok;
+                                         }) == ZV_WS_Status_ok;
+        return Finish(service, result, converted, answer ? CallDetail::ResponseCodeOf(*answer, 0) : 0);
     }
 
 private:
     typename Op::Request m_Request;
     typename Op::Response m_Response;
 };
+
+/// A whole call of an operation without arguments.
+template <class Op, class Output>
+ZV_WS_Status Ask(const char* function, const ZV_WS_Session* handle, Output* out)
+{
+    ServiceCall<Op> call(function, handle, out);
+    return call.Accepts() ? call.Into(out) : call.Refusal();
+}
+
+/// Fills the children by which all requests for a page name it.
+template <class Call>
+void SetPage(Call& call, const ZV_WS_Pagination& page)
+{
+    call->CurrentPageNumber = static_cast<int>(page.CurrentPageNumber);
+    call->ItemsPerPage = static_cast<int>(page.ItemsPerPage);
+}
+
+/// A wire enumeration of the same number as the library's (or as a plain int).
+template <class Wire, class Value>
+void SetEnum(Wire& to, Value value)
+{
+    to = static_cast<Wire>(value);
+}
+
+/// Borrows a text for a request, which never writes to it.
+inline char* Text(const char* text) { return const_cast<char*>(text); }
+
+/// An array of numbers for a request, as long as `numbers` lives.
+inline ZV1__ArrayOfInt BorrowedInts(const int* numbers, unsigned int count)
+{
+    ZV1__ArrayOfInt array;
+    array.__sizeint_ = static_cast<int>(count);
+    array.int_ = const_cast<int*>(numbers);
+    return array;
+}
+
+/// Logs the answer of a yes-or-no call; returns its status.
+ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, bool answer);
 
 template <class Service, class Send>
 int ServiceCallBase::Exchange(Service& service, const char* operation, bool changes, Send&& send)

@@ -1,0 +1,93 @@
+// The wish list.
+#include <algorithm>
+#include <set>
+
+#include "ServiceCall.h"
+
+namespace {
+
+constexpr unsigned int kItemsPerPage = 50;
+// A bound for services that keep announcing one page more.
+constexpr unsigned int kMostPages = 1000;
+
+template <class Op>
+ZV_WS_Status ChangeItem(const char* function, ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer)
+{
+    ServiceCall<Op> call(function, handle, answer);
+    if (!call.Accepts()) return call.Refusal();
+    call->TitleID = titleID;
+    return call.Into(answer);
+}
+
+// The titles of the whole list.
+ZV_WS_Status ReadList(ZV_WS_Session* handle, ZV_WS_TitleTypeFilter typeFilter, std::set<int>& titles)
+{
+    ZV_WS_Pagination page;
+    page.ItemsPerPage = kItemsPerPage;
+    for (bool more = true; more && page.CurrentPageNumber <= kMostPages; ++page.CurrentPageNumber) {
+        ZV_WS_WishlistItemsResponse items;
+        const ZV_WS_Status status = ZV_WS_getWishlistItems(handle, SORT_ORDER_DATEADDED, &page, typeFilter, &items);
+        for (unsigned int i = 0; i < items.Titles.size; ++i) {
+            titles.insert(items.Titles.TitleListingPurchased[i].TitleID);
+        }
+        more = items.Titles.size != 0 && static_cast<int>(page.CurrentPageNumber) < items.TotalPages;
+        ZV_WS_release(&items);
+        if (status != ZV_WS_Status_ok) return status;
+    }
+    return ZV_WS_Status_ok;
+}
+
+}  // namespace
+
+ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortOrder, const ZV_WS_Pagination* page,
+                                    ZV_WS_TitleTypeFilter typeFilter, ZV_WS_WishlistItemsResponse* items)
+{
+    ServiceCall<Operation::getWishlistItems> call(__func__, handle, items);
+    if (!call.Accepts(page)) return call.Refusal();
+    call->sortOrder = ZVUtilities::SortOrder2Int(sortOrder);
+    SetPage(call, *page);
+    SetEnum(call->TitleType, typeFilter);
+    return call.Into(items);
+}
+
+ZV_WS_Status ZV_WS_addItemToWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer)
+{
+    return ChangeItem<Operation::addItemToWishlist>(__func__, handle, titleID, answer);
+}
+
+ZV_WS_Status ZV_WS_removeItemFromWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer)
+{
+    return ChangeItem<Operation::removeItemFromWishList>(__func__, handle, titleID, answer);
+}
+
+ZV_WS_Status ZV_WS_removeAllItemsFromWishlist(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer)
+{
+    return Ask<Operation::removeAllItemsFromWishList>(__func__, handle, answer);
+}
+
+ZV_WS_Status ZV_WS_checkTitleInWishlist(ZV_WS_Session* handle, int titleID, bool* isInWishlist)
+{
+    ServiceCall<Operation::getTitleListing> call(__func__, handle, isInWishlist);
+    if (!call.Accepts()) return call.Refusal();
+    call->TitleID = titleID;
+    const ZV_WS_Status status =
+        call.Into([&](const ZV1__TitleListingResponse* listing) { *isInWishlist = listing->IsAvailInUserWishList; });
+    return LogAnswer(__func__, status, *isInWishlist);
+}
+
+ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* titleIDs, unsigned int count,
+                                         ZV_WS_TitleTypeFilter typeFilter, ZV_WS_TitlesInWishlist* answers)
+{
+    ZV_ASSERT(answers != 0);
+    return GuardCall([&] {
+        Records::Tag(*answers);
+        if (!handle || !handle->_pSessionImpl || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
+        std::set<int> wished;
+        const ZV_WS_Status status = ReadList(handle, typeFilter, wished);
+        if (status != ZV_WS_Status_ok) return status;
+        Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
+        std::transform(titleIDs, titleIDs + count, answers->IsAvailInUserWishlist,
+                       [&](int titleID) { return wished.count(titleID) != 0; });
+        return ZV_WS_Status_ok;
+    });
+}
