@@ -62,7 +62,8 @@ ZV_WS_Status ZV_WS_getTvEpisodeListByTitleID(ZV_WS_Session* handle, int titleID,
     return call.Into(episodes);
 }
 
-ZV_WS_Status ZV_WS_getAllTvEpisodeListings(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponseArray* listings)
+ZV_WS_Status ZV_WS_getAllTvEpisodeListings(ZV_WS_Session* handle, int titleID,
+                                           ZV_WS_TitleListingResponseArray* listings)
 {
     ServiceCall<Operation::getAllTvEpisodeListings> call(__func__, handle, listings);
     if (!call.Accepts()) return call.Refusal();

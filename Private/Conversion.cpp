@@ -211,7 +211,10 @@ static void CopyPage(const From* t, ZV_WS_MyVideosResponse& to)
     ZV_COPY_ARRAY(t->Titles, to.Titles, TitleListingPurchased);
 }
 
-ZV_CONVERT(GetMyVideosResponse, MyVideosResponse) { CopyPage(t, to); }
+ZV_CONVERT(GetMyVideosResponse, MyVideosResponse)
+{
+    CopyPage(t, to);
+}
 
 ZV_CONVERT(GetWishlistItemsResponse, WishlistItemsResponse)
 {

@@ -1,8 +1,8 @@
 // From the services' records to the library's, each function named after both.
 //
 // The first argument is borrowed and must not be null, the second is a tagged, empty record. What the service left out
-// becomes 0, false, null or an empty array. Memory exhaustion is thrown (std::bad_alloc) and leaves a record that can be
-// released.
+// becomes 0, false, null or an empty array. Memory exhaustion is thrown (std::bad_alloc) and leaves a record that can
+// be released.
 #pragma once
 
 #include "ZVWSLib.h"
@@ -13,7 +13,10 @@ namespace ZVUtilities {
 // Declares ZV1__From2ZV_WS_To, and Convert, which is all of them under one name.
 #define ZV_CONVERSION(From, To)                                          \
     void ZV1__##From##2ZV_WS_##To(const ZV1__##From* t, ZV_WS_##To& to); \
-    inline void Convert(const ZV1__##From* t, ZV_WS_##To& to) { ZV1__##From##2ZV_WS_##To(t, to); }
+    inline void Convert(const ZV1__##From* t, ZV_WS_##To& to)            \
+    {                                                                    \
+        ZV1__##From##2ZV_WS_##To(t, to);                                 \
+    }
 
 ZV_CONVERSION(StandardResponse, StandardResponse)
 ZV_CONVERSION(WishListActionResponse, StandardResponse)
@@ -65,8 +68,17 @@ ZV_CONVERSION(THXMediaDirectorResponse, THXMediaDirectorResponse)
 #undef ZV_CONVERSION
 
 /// Answers that are a bare number, flag or enumeration.
-inline void Convert(const bool* t, bool& to) { to = *t; }
-inline void Convert(const int* t, int& to) { to = *t; }
-inline void Convert(const ZV1__AudioProfile* t, ZV_WS_AudioProfile& to) { to = static_cast<ZV_WS_AudioProfile>(*t); }
+inline void Convert(const bool* t, bool& to)
+{
+    to = *t;
+}
+inline void Convert(const int* t, int& to)
+{
+    to = *t;
+}
+inline void Convert(const ZV1__AudioProfile* t, ZV_WS_AudioProfile& to)
+{
+    to = static_cast<ZV_WS_AudioProfile>(*t);
+}
 
 }  // namespace ZVUtilities

@@ -37,7 +37,8 @@ const Key kKeys[] = {
 Deployment Defaults()
 {
     Deployment values;
-    for (const Key& key : kKeys) values.*key.value = key.standard;
+    for (const Key& key : kKeys)
+        values.*key.value = key.standard;
     return values;
 }
 
@@ -135,14 +136,14 @@ void Deployment::MakeBaseUrls()
         ZVString Deployment::*host;
         const char* path;
     } table[2 * kEnvironments] = {
-        {&Deployment::api_staging_host, "/api/"},      // general catalogue: staging for the interface,
-        {&Deployment::internal_staging_host, "/api/"}, // internal staging,
-        {&Deployment::production_host, "/api/"},       // production
-        {&Deployment::api_staging_host, "/kac/api/"},  // adult catalogue: the same three
-        {&Deployment::adult_staging_host, "/api/"},
-        {&Deployment::adult_production_host, "/api/"},
+        {&Deployment::api_staging_host, "/api/"},       // general catalogue: staging for the interface,
+        {&Deployment::internal_staging_host, "/api/"},  // internal staging,
+        {&Deployment::production_host, "/api/"},        // production
+        {&Deployment::api_staging_host, "/kac/api/"},   // adult catalogue: the same three
+        {&Deployment::adult_staging_host, "/api/"},    {&Deployment::adult_production_host, "/api/"},
     };
-    for (int i = 0; i < 2 * kEnvironments; ++i) m_BaseUrls[i] = ZVString("https://") + this->*table[i].host + table[i].path;
+    for (int i = 0; i < 2 * kEnvironments; ++i)
+        m_BaseUrls[i] = ZVString("https://") + this->*table[i].host + table[i].path;
 }
 
 const char* Deployment::BaseUrl(ContentType type, int environment) const
@@ -183,7 +184,8 @@ bool SplitHostPort(const ZVString& hostPort, int defaultPort, ZVString& host, in
     }
     if (colon == std::string::npos) return true;
     const std::string digits = text.substr(colon + 1);
-    if (digits.empty() || digits.size() > 5 || digits.find_first_not_of("0123456789") != std::string::npos) return false;
+    if (digits.empty() || digits.size() > 5 || digits.find_first_not_of("0123456789") != std::string::npos)
+        return false;
     port = atoi(digits.c_str());
     return port >= 1 && port <= 65535;
 }

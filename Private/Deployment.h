@@ -20,8 +20,8 @@ struct Deployment {
     /// The services' base URL for a content type and an environment; production for any other environment.
     const char* BaseUrl(ContentType type, int environment) const;
 
-    /// Reads the values anew and makes them the current ones. Null after one line on the error stream when the file cannot be
-    /// read or holds a mistake; the current ones stay. The object lives as long as the process. Any thread.
+    /// Reads the values anew and makes them the current ones. Null after one line on the error stream when the file
+    /// cannot be read or holds a mistake; the current ones stay. The object lives as long as the process. Any thread.
     static const Deployment* Load();
 
     /// The values of the last successful Load; those of a first Load, or the defaults if that fails, before any.
@@ -35,6 +35,6 @@ private:
     ZVString m_BaseUrls[2 * kEnvironments];
 };
 
-/// Splits "host:port"; `defaultPort` when there is no port. False for a host that is empty or holds characters that no host
-/// name has, and for a port outside of 1 to 65535.
+/// Splits "host:port"; `defaultPort` when there is no port. False for a host that is empty or holds characters that no
+/// host name has, and for a port outside of 1 to 65535.
 bool SplitHostPort(const ZVString& hostPort, int defaultPort, ZVString& host, int& port);

@@ -14,8 +14,8 @@ int EnvironmentIn(const RawHttp& http)
     const char* body = nullptr;
     size_t length = 0;
     ZVString bodyLength;
-    const bool usable = http.StatusIs("HTTP/1.1 200 OK") && http.Header("Content-Length", bodyLength) && bodyLength == "1" &&
-                        http.BodyStart(body, length) && length > 0;
+    const bool usable = http.StatusIs("HTTP/1.1 200 OK") && http.Header("Content-Length", bodyLength) &&
+                        bodyLength == "1" && http.BodyStart(body, length) && length > 0;
     return usable ? body[0] - '0' : int(ENVID_PRODUCTION);
 }
 

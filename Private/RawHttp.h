@@ -1,7 +1,8 @@
 // One hand-built HTTP/1.1 GET over a SOAP context's socket, for the few answers that are not SOAP.
 //
-// The exchange takes the context's connection: a kept one is closed before, its own afterwards, so that the context's next SOAP
-// call starts from a defined state. What is read is bounded by the caller's pieces and, in time, by one deadline for all of it.
+// The exchange takes the context's connection: a kept one is closed before, its own afterwards, so that the context's
+// next SOAP call starts from a defined state. What is read is bounded by the caller's pieces and, in time, by one
+// deadline for all of it.
 #pragma once
 
 #include "Transport.h"
@@ -16,12 +17,14 @@ public:
     RawHttp(const RawHttp&) = delete;
     RawHttp& operator=(const RawHttp&) = delete;
 
-    /// Opens a connection to the URL's host and port (443 for "https:", else 80, when it names none), with TLS for "https:".
+    /// Opens a connection to the URL's host and port (443 for "https:", else 80, when it names none), with TLS for
+    /// "https:".
     bool Connect(const ZVString& url);
 
     bool Send(const ZVString& text);
 
-    /// Receives once, at most 2047 bytes: the answer's head, perhaps with the start of its body. False when nothing came.
+    /// Receives once, at most 2047 bytes: the answer's head, perhaps with the start of its body. False when nothing
+    /// came.
     bool ReceiveHead();
 
     /// True when the head holds the status line, given without its line end ("HTTP/1.1 200 OK").
@@ -41,6 +44,9 @@ public:
 
     /// Receives once, at most `size` bytes. 0 at the end, on failure and past the deadline.
     size_t Receive(char* buffer, size_t size);
+
+    /// The dotted-quad address of this end of the connection.
+    bool LocalAddress(ZVString& address) const;
 
 private:
     Transport& m_Transport;

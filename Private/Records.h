@@ -48,7 +48,8 @@ struct Freer {
     void Elements(const char*, unsigned int& size, T*& elements)
     {
         if constexpr (kIsRecord<T>) {
-            for (unsigned int i = 0; i < size; ++i) ZV_WS_release(&elements[i]);
+            for (unsigned int i = 0; i < size; ++i)
+                ZV_WS_release(&elements[i]);
         }
         delete[] elements;
         size = 0;
@@ -85,7 +86,8 @@ void FreeMembers(R& record)
     detail::VisitAll(record, freer);
 }
 
-/// Gives an array record `count` zeroed elements; records among them get their tags. The record can be released at any moment.
+/// Gives an array record `count` zeroed elements; records among them get their tags. The record can be released at any
+/// moment.
 template <class T>
 void Allocate(unsigned int& size, T*& elements, unsigned int count)
 {
@@ -93,7 +95,8 @@ void Allocate(unsigned int& size, T*& elements, unsigned int count)
     elements = new T[count]();
     size = count;
     if constexpr (kIsRecord<T>) {
-        for (unsigned int i = 0; i < count; ++i) Tag(elements[i]);
+        for (unsigned int i = 0; i < count; ++i)
+            Tag(elements[i]);
     }
 }
 

@@ -37,7 +37,8 @@ constexpr auto kFree = MakeTable(static_cast<ZV_WS_AllRecords*>(nullptr));
 constexpr unsigned int CountUsed()
 {
     unsigned int used = 0;
-    for (auto free : kFree) used += free != nullptr;
+    for (auto free : kFree)
+        used += free != nullptr;
     return used;
 }
 static_assert(CountUsed() == std::tuple_size_v<ZV_WS_AllRecords> + 1, "two records share a tag");

@@ -38,7 +38,8 @@ int ResponseCodeOf(const Answer&, long)
 /// The part that does not depend on the operation.
 class ServiceCallBase {
 public:
-    /// Whether the call can be made: there is a session, the output is tagged, and the call's own `arguments` are right.
+    /// Whether the call can be made: there is a session, the output is tagged, and the call's own `arguments` are
+    /// right.
     bool Accepts(bool arguments = true) const { return arguments && m_Session && m_Tagged; }
 
     /// The status of a call that cannot be made.
@@ -144,7 +145,10 @@ void SetEnum(Wire& to, Value value)
 }
 
 /// Borrows a text for a request, which never writes to it.
-inline char* Text(const char* text) { return const_cast<char*>(text); }
+inline char* Text(const char* text)
+{
+    return const_cast<char*>(text);
+}
 
 /// An array of numbers for a request, as long as `numbers` lives.
 inline ZV1__ArrayOfInt BorrowedInts(const int* numbers, unsigned int count)

@@ -9,7 +9,10 @@ namespace {
 const char kActionNamespace[] = "http://api.zorvane.example/api/";
 const char kAnonymous[] = "http://schemas.xmlsoap.org/ws/2004/08/addressing/role/anonymous";
 
-const char* OrNull(const ZVString& text) { return text.empty() ? nullptr : text.c_str(); }
+const char* OrNull(const ZVString& text)
+{
+    return text.empty() ? nullptr : text.c_str();
+}
 
 }  // namespace
 

@@ -1,6 +1,7 @@
 // What the three service wrappers share: taking their settings and preparing the headers of a request.
 //
-// A wrapper is a generated proxy and so one complete SOAP context: it serves one request at a time, on one thread at a time.
+// A wrapper is a generated proxy and so one complete SOAP context: it serves one request at a time, on one thread at a
+// time.
 #pragma once
 
 #include "SetupParams2.h"
@@ -13,8 +14,8 @@ namespace ServiceHeaders {
 /// Connection settings, user agent and plug-ins of a wrapper's context.
 void Configure(Transport& transport, const ZV_WS_SetupParams2& params);
 
-/// Clears the header and starts the one of the next request: addressing and the user's token with a fresh digest. Returns the
-/// SOAP runtime's error number.
+/// Clears the header and starts the one of the next request: addressing and the user's token with a fresh digest.
+/// Returns the SOAP runtime's error number.
 int Start(soap& context, const ZVString& endpoint, const ZVString& operation, const ZV_WS_SetupParams2& params);
 
 /// The device's settings block: one shape under the name each service gives it. Its texts are borrowed from `params`.

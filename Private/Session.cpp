@@ -23,7 +23,10 @@ const ZV_WS_Environment kEnvironments[] = {
     {ENVNUM_DEFAULT, "default"},
 };
 
-bool IsGiven(const char* text) { return text && *text; }
+bool IsGiven(const char* text)
+{
+    return text && *text;
+}
 
 // Everything that ends up in a header or a request line; a control character there would let one value write others.
 bool HoldsNoControls(const char* text)
@@ -73,7 +76,10 @@ void CopyProxy(ZV_WS_SetupParams2& to, const ZV_WS_ProxyParam& from)
     CopyGiven(to.ProxyPassword, from.Password);
 }
 
-uint32_t HashOf(const ZVString& text) { return ZVUtilities::Hash(text.c_str(), text.length(), 0); }
+uint32_t HashOf(const ZVString& text)
+{
+    return ZVUtilities::Hash(text.c_str(), text.length(), 0);
+}
 
 // The folder with its separator; an empty one is the current folder.
 ZVString CacheFolder(const char* path)
@@ -89,8 +95,8 @@ ZVString CacheFileName(const ZV_WS_SetupParams2& params)
     char text[100];
     // The base URL is not known yet when the name is made, so its hash is always that of the empty text.
     snprintf(text, sizeof text, "%u_%u_%d_%u_%u_%u_%u_%u_%u", HashOf(params.ServiceBaseURL),
-             HashOf(params.DestinationUniqueID), params.DestinationTypeID, HashOf(params.APIKey), HashOf(params.UserName),
-             HashOf(params.Password), params.CacheData, params.CacheLimit, 1u);
+             HashOf(params.DestinationUniqueID), params.DestinationTypeID, HashOf(params.APIKey),
+             HashOf(params.UserName), HashOf(params.Password), params.CacheData, params.CacheLimit, 1u);
     return ZVString(text) + ".zv";
 }
 
@@ -195,8 +201,7 @@ ZV_WS_Status WithSession(const ZV_WS_Session* handle, Output* out, Use use)
 
 ZV_WS_Status SetText(ZV_WS_String& to, const ZVString& text)
 {
-    to.data = ZVUtilities::StrDup(text.c_str());
-    to.size = static_cast<unsigned int>(text.length());
+    ZVUtilities::SetText(to, text);
     return ZV_WS_Status_ok;
 }
 
@@ -255,9 +260,9 @@ ZV_WS_Status ZV_WS_getDefaultEnvID(ZV_WS_Session* handle, ZV_WS_EnvID* env)
 {
     return WithSession(handle, env, [&](SessionImpl& session) {
         const ZV_WS_SetupParams2& own = session.m_Params;
-        const char* url = ZVUtilities::QueryServiceBaseURL(ContentType_ZV, &session.m_Stream,
-                                                           own.DestinationUniqueID.c_str(), own.DestinationTypeID,
-                                                           ENVNUM_DEFAULT, *env);
+        const char* url =
+            ZVUtilities::QueryServiceBaseURL(ContentType_ZV, &session.m_Stream, own.DestinationUniqueID.c_str(),
+                                             own.DestinationTypeID, ENVNUM_DEFAULT, *env);
         return *url ? ZV_WS_Status_ok : ZV_WS_Status_net_error;
     });
 }

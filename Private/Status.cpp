@@ -45,10 +45,10 @@ const ResponseCodes kResponseCodes[] = {
 // clang-format on
 
 // The SOAP runtime's errors that are about the message itself.
-const int kSoapFamily[] = {SOAP_CLI_FAULT,      SOAP_SVR_FAULT,    SOAP_TAG_MISMATCH, SOAP_SYNTAX_ERROR, SOAP_NO_TAG,
-                           SOAP_MUSTUNDERSTAND, SOAP_NAMESPACE,    SOAP_FAULT,        SOAP_NO_METHOD,    SOAP_NULL,
-                           SOAP_DUPLICATE_ID,   SOAP_MISSING_ID,   SOAP_HREF,         SOAP_VERSIONMISMATCH,
-                           SOAP_REQUIRED,       SOAP_PROHIBITED,   SOAP_OCCURS,       SOAP_LENGTH};
+const int kSoapFamily[] = {SOAP_CLI_FAULT,      SOAP_SVR_FAULT,  SOAP_TAG_MISMATCH, SOAP_SYNTAX_ERROR,    SOAP_NO_TAG,
+                           SOAP_MUSTUNDERSTAND, SOAP_NAMESPACE,  SOAP_FAULT,        SOAP_NO_METHOD,       SOAP_NULL,
+                           SOAP_DUPLICATE_ID,   SOAP_MISSING_ID, SOAP_HREF,         SOAP_VERSIONMISMATCH, SOAP_REQUIRED,
+                           SOAP_PROHIBITED,     SOAP_OCCURS,     SOAP_LENGTH};
 
 constexpr bool IsHttpFamily(int e)
 {

@@ -15,8 +15,8 @@ class StreamDownloadAPI {
     }
 
 public:
-    /// Both wrappers are borrowed. Devices that download use the download service, all others (also of unknown kind) the stream
-    /// service.
+    /// Both wrappers are borrowed. Devices that download use the download service, all others (also of unknown kind)
+    /// the stream service.
     void Init(StreamAPI* stream, DownloadAPI* download, ZV_WS_AccessType accessType)
     {
         ZV_ASSERT(stream != 0);
@@ -46,9 +46,9 @@ public:
         return Chosen([](auto& service) { return service.ProxyName(); });
     }
 
-#define ZV_FORWARD(operation)                                                        \
-    int operation(_ZV1__##operation* request, _ZV1__##operation##Response* response) \
-    {                                                                                \
+#define ZV_FORWARD(operation)                                                               \
+    int operation(_ZV1__##operation* request, _ZV1__##operation##Response* response)        \
+    {                                                                                       \
         return Chosen([&](auto& service) { return service.operation(request, response); }); \
     }
     ZV_FORWARD(authorizeDevice)

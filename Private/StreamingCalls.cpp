@@ -25,7 +25,8 @@ ZV_WS_Status ZV_WS_getStreamingAssetLocation(ZV_WS_Session* handle, int passID, 
 ZV_WS_Status ZV_WS_loadLastStreamingAssetLocation(ZV_WS_Session* handle, int passID, ZV_WS_FileProfile fileProfile,
                                                   ZV_WS_StreamingAssetLocationResponse* location)
 {
-    return LocatePass<Operation::loadLastStreamingAssetLocationForPass>(__func__, handle, passID, fileProfile, location);
+    return LocatePass<Operation::loadLastStreamingAssetLocationForPass>(__func__, handle, passID, fileProfile,
+                                                                        location);
 }
 
 ZV_WS_Status ZV_WS_getStreamingBonusAssetLocation(ZV_WS_Session* handle, int bonusAssetID,

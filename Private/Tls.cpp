@@ -47,7 +47,7 @@ private:
         const auto known = m_Authorities.find(caFile);
         if (known != m_Authorities.end()) return known->second;
         X509_STORE* store = X509_STORE_new();
-        const int loaded = !store          ? 0
+        const int loaded = !store           ? 0
                            : caFile.empty() ? X509_STORE_set_default_paths(store)
                                             : X509_STORE_load_file(store, caFile.c_str());
         ERR_clear_error();
@@ -71,7 +71,8 @@ private:
         SSL_CTX_set1_cert_store(context, authorities);
         SSL_CTX_set_verify(context, SSL_VERIFY_PEER, nullptr);
         X509_VERIFY_PARAM* verify = SSL_CTX_get0_param(context);
-        X509_VERIFY_PARAM_set_hostflags(verify, X509_CHECK_FLAG_NO_PARTIAL_WILDCARDS | X509_CHECK_FLAG_NEVER_CHECK_SUBJECT);
+        X509_VERIFY_PARAM_set_hostflags(verify,
+                                        X509_CHECK_FLAG_NO_PARTIAL_WILDCARDS | X509_CHECK_FLAG_NEVER_CHECK_SUBJECT);
         const int named = IsAddress(host) ? X509_VERIFY_PARAM_set1_ip_asc(verify, host.c_str())
                                           : X509_VERIFY_PARAM_set1_host(verify, host.c_str(), host.size());
         if (named == 1) return context;
@@ -91,13 +92,19 @@ Contexts& TheContexts()
     return *contexts;
 }
 
-std::string Text(const ZVString& text) { return std::string(text.c_str(), text.length()); }
+std::string Text(const ZVString& text)
+{
+    return std::string(text.c_str(), text.length());
+}
 
 }  // namespace
 
 namespace Tls {
 
-bool LoadAuthorities(const ZVString& caFile) { return TheContexts().Authorities(Text(caFile)) != nullptr; }
+bool LoadAuthorities(const ZVString& caFile)
+{
+    return TheContexts().Authorities(Text(caFile)) != nullptr;
+}
 
 SSL_CTX* ContextFor(const ZVString& caFile, const ZVString& host)
 {

@@ -1,7 +1,7 @@
 // TLS of the service connections: which authorities are trusted, and one SSL_CTX for each host.
 //
-// The authorities are read once per process and file, and contexts share them: reading them costs more than fifty calls. A host has
-// a context of its own because the name that its certificate must carry is part of it. Any thread.
+// The authorities are read once per process and file, and contexts share them: reading them costs more than fifty
+// calls. A host has a context of its own because the name that its certificate must carry is part of it. Any thread.
 #pragma once
 
 #include <openssl/ssl.h>

@@ -36,7 +36,8 @@ void soap_init_zv_log()
 {
     static std::once_flag once;
     std::call_once(once, [] {
-        for (Area* area : {&s_Received, &s_Sent, &s_Test}) ZV_LogRegisterArea(area->name, &area->id);
+        for (Area* area : {&s_Received, &s_Sent, &s_Test})
+            ZV_LogRegisterArea(area->name, &area->id);
     });
 }
 
@@ -75,11 +76,15 @@ void SecretFilter::Step(char c, ZVString& out)
 ZVString SecretFilter::Filter(const char* data, size_t length)
 {
     ZVString out;
-    for (size_t i = 0; i < length; ++i) Step(data[i], out);
+    for (size_t i = 0; i < length; ++i)
+        Step(data[i], out);
     return out;
 }
 
-void TrafficLog::Sent(SecretFilter& filter, const char* data, size_t length) { Write(s_Sent, filter, data, length); }
+void TrafficLog::Sent(SecretFilter& filter, const char* data, size_t length)
+{
+    Write(s_Sent, filter, data, length);
+}
 
 void TrafficLog::Received(SecretFilter& filter, const char* data, size_t length)
 {

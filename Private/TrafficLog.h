@@ -5,7 +5,8 @@
 
 #include "ZVString.h"
 
-/// Registers the areas of sent, received and test messages. Called before the first session's first exchange; any thread.
+/// Registers the areas of sent, received and test messages. Called before the first session's first exchange; any
+/// thread.
 void soap_init_zv_log();
 
 /// Takes the texts of elements that hold secrets out of a stream of XML that comes in pieces of any size.

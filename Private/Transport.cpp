@@ -9,7 +9,8 @@
 
 namespace {
 
-// The largest page of titles is below 100 KiB; what is larger than this is an attack or a fault. Counts inflated bytes too.
+// The largest page of titles is below 100 KiB; what is larger than this is an attack or a fault. Counts inflated bytes
+// too.
 constexpr size_t kLongestMessage = 4u << 20;
 constexpr long kLongestString = 1l << 20;
 constexpr long kMostElements = 4096;
@@ -22,7 +23,10 @@ constexpr int kReceiveSeconds = 88;
 // The toolkit's own text, sent by a session without a user agent.
 const char kToolkitAgent[] = "gSOAP/2.7";
 
-bool IsTls(const char* url) { return strncasecmp(url, "https:", 6) == 0; }
+bool IsTls(const char* url)
+{
+    return strncasecmp(url, "https:", 6) == 0;
+}
 
 // The host of "scheme://host[:port]/...".
 ZVString HostOf(const char* url)

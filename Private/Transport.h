@@ -1,4 +1,5 @@
-// What the library adds to a SOAP context: trust, limits, the user agent, the traffic log, and the rules for kept connections.
+// What the library adds to a SOAP context: trust, limits, the user agent, the traffic log, and the rules for kept
+// connections.
 //
 // One Transport belongs to one context and, like it, to one thread at a time.
 #pragma once
@@ -10,8 +11,8 @@
 #include "TrafficLog.h"
 #include "ZVString.h"
 
-/// While one exists, a connection that the peer has reset does not kill the process: SIGPIPE is blocked in the calling thread and
-/// taken off it afterwards. The process's own handling of the signal stays as it is.
+/// While one exists, a connection that the peer has reset does not kill the process: SIGPIPE is blocked in the calling
+/// thread and taken off it afterwards. The process's own handling of the signal stays as it is.
 class SigpipeGuard {
 public:
     SigpipeGuard();
@@ -37,7 +38,8 @@ public:
     /// Loads the certificate authorities of the current deployment. False when they cannot be loaded.
     bool LoadAuthorities();
 
-    /// Gets the context ready for connections to the URL's host: its TLS context for "https:". False when there is none.
+    /// Gets the context ready for connections to the URL's host: its TLS context for "https:". False when there is
+    /// none.
     bool UseHost(const char* url);
 
     void SetTimeouts(int sendSeconds, int receiveSeconds);
@@ -46,12 +48,12 @@ public:
     /// Before an exchange: what KeptConnectionDied tells is about bytes from here on.
     void BeginExchange();
 
-    /// True when the exchange went over a connection kept from an earlier one and no byte of an answer came: the peer may
-    /// have closed it before it saw the request.
+    /// True when the exchange went over a connection kept from an earlier one and no byte of an answer came: the peer
+    /// may have closed it before it saw the request.
     bool KeptConnectionDied() const { return !m_Connected && m_Received == 0; }
 
-    /// After an exchange with the SOAP runtime's result: keeps the connection only when the answer was whole and nothing is left
-    /// over.
+    /// After an exchange with the SOAP runtime's result: keeps the connection only when the answer was whole and
+    /// nothing is left over.
     void EndExchange(int result);
 
     /// Closes the connection at once, without waiting for the peer.

@@ -83,7 +83,10 @@ zv_int64 ZVFile::Write(const void* buffer, zv_int64 size)
     });
 }
 
-bool ZVFile::Flush() { return m_File && fflush(m_File) == 0; }
+bool ZVFile::Flush()
+{
+    return m_File && fflush(m_File) == 0;
+}
 
 zv_int64 ZVFile::GetSize()
 {
@@ -95,9 +98,15 @@ zv_int64 ZVFile::GetSize()
     return size;
 }
 
-bool ZVFile::Seek(zv_int64 offset, int whence) { return m_File && fseek(m_File, static_cast<long>(offset), whence) == 0; }
+bool ZVFile::Seek(zv_int64 offset, int whence)
+{
+    return m_File && fseek(m_File, static_cast<long>(offset), whence) == 0;
+}
 
-zv_int64 ZVFile::Position() { return m_File ? ftell(m_File) : -1; }
+zv_int64 ZVFile::Position()
+{
+    return m_File ? ftell(m_File) : -1;
+}
 
 zv_int64 ZVFile::GetSize(const char* filename)
 {
@@ -194,6 +203,7 @@ bool ZVFile::CopyFile(const char* oldname, const char* newname)
     ZVFile source, target;
     if (!source.Open(oldname, "rb") || !target.Open(newname, "wb")) return false;
     char block[kCopyBlock];
-    for (zv_int64 count; (count = source.Read(block, sizeof block)) >= 1;) target.Write(block, count);
+    for (zv_int64 count; (count = source.Read(block, sizeof block)) >= 1;)
+        target.Write(block, count);
     return true;
 }

@@ -1,5 +1,5 @@
-// A stdio file, and the folder operations that caches and settings need. Null texts and buffers are assertion failures; what
-// fails at run time is false, 0 or -1, and is not logged. The static operations may be called from any thread.
+// A stdio file, and the folder operations that caches and settings need. Null texts and buffers are assertion failures;
+// what fails at run time is false, 0 or -1, and is not logged. The static operations may be called from any thread.
 #pragma once
 
 #include <stdint.h>
@@ -49,11 +49,12 @@ public:
     /// What follows the last "/", or all of it.
     static ZVString GetFileName(const char* path);
 
-    /// Removes the files of one folder whose names match "?" and "*"; stops at the first that cannot be removed. The path must
-    /// hold a wildcard.
+    /// Removes the files of one folder whose names match "?" and "*"; stops at the first that cannot be removed. The
+    /// path must hold a wildcard.
     static bool RemoveWithWildcard(const char* filename);
 
-    /// Makes an empty file "zvws......" in the path's folder and returns its name; "" when it cannot. The caller removes it.
+    /// Makes an empty file "zvws......" in the path's folder and returns its name; "" when it cannot. The caller
+    /// removes it.
     static ZVString CreateTempFileName(const char* path);
 
     /// True when both files could be opened: write errors go unreported.

@@ -1,5 +1,6 @@
-// The library's byte string: bytes with an explicit length, NUL bytes allowed, always NUL-terminated. A plain value without
-// locking. Null pointers and indexes outside of the length are assertion failures; memory exhaustion throws std::bad_alloc.
+// The library's byte string: bytes with an explicit length, NUL bytes allowed, always NUL-terminated. A plain value
+// without locking. Null pointers and indexes outside of the length are assertion failures; memory exhaustion throws
+// std::bad_alloc.
 #pragma once
 
 #include <stddef.h>
@@ -84,10 +85,19 @@ ZVString operator+(ZVString left, const Right& right)
     return left;
 }
 
-#define ZV_STRING_COMPARISON(op)                                                                                       \
-    inline bool operator op(const ZVString& a, const ZVString& b) { return a.compare(b) op 0; }                        \
-    inline bool operator op(const ZVString& a, const char* b) { return a.compare(b) op 0; }                            \
-    inline bool operator op(const char* a, const ZVString& b) { return 0 op b.compare(a); }
+#define ZV_STRING_COMPARISON(op)                                  \
+    inline bool operator op(const ZVString& a, const ZVString& b) \
+    {                                                             \
+        return a.compare(b) op 0;                                 \
+    }                                                             \
+    inline bool operator op(const ZVString& a, const char* b)     \
+    {                                                             \
+        return a.compare(b) op 0;                                 \
+    }                                                             \
+    inline bool operator op(const char* a, const ZVString& b)     \
+    {                                                             \
+        return 0 op b.compare(a);                                 \
+    }
 ZV_STRING_COMPARISON(==)
 ZV_STRING_COMPARISON(!=)
 ZV_STRING_COMPARISON(<)

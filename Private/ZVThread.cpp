@@ -47,9 +47,15 @@ struct ZVThread::Impl {
 
 ZVThread::ZVThread() : m_Impl(new Impl) {}
 
-ZVThread::~ZVThread() { delete m_Impl; }
+ZVThread::~ZVThread()
+{
+    delete m_Impl;
+}
 
-ZVThread* ZVThread::CreateThread() { return new ZVThread; }
+ZVThread* ZVThread::CreateThread()
+{
+    return new ZVThread;
+}
 
 void ZVThread::DestroyThread(ZVThread* thread)
 {
@@ -64,7 +70,8 @@ void ZVThread::SafeDestroyThread(ZVThread* thread)
     if (thread->m_Impl->m_Thread != 0) {
         Shared& shared = *thread->m_Impl->m_Shared;
         ZVMutexLock lock(shared.mutex);
-        while (!shared.finished) shared.changed.Wait(shared.mutex);
+        while (!shared.finished)
+            shared.changed.Wait(shared.mutex);
     }
     DestroyThread(thread);
 }
@@ -95,9 +102,13 @@ bool ZVThread::Run(const char* /*name*/, void (*function)(void*), void* argument
     return true;
 }
 
-bool ZVThread::IsRunning() const { return m_Impl->m_Thread != 0 && m_Impl->m_Shared->running; }
+bool ZVThread::IsRunning() const
+{
+    return m_Impl->m_Thread != 0 && m_Impl->m_Shared->running;
+}
 
 void ZVThread::WaitUntilCompletion() const
 {
-    while (IsRunning()) Sleep(kPollingPeriod);
+    while (IsRunning())
+        Sleep(kPollingPeriod);
 }

@@ -9,15 +9,15 @@ public:
     /// Ends the object, not the thread: one that still runs goes on by itself. Null is ignored.
     static void DestroyThread(ZVThread* thread);
 
-    /// Waits until the function has returned, whether or not it has begun yet, and ends the object. Null is ignored. Must not be
-    /// called by the thread itself.
+    /// Waits until the function has returned, whether or not it has begun yet, and ends the object. Null is ignored.
+    /// Must not be called by the thread itself.
     static void SafeDestroyThread(ZVThread* thread);
 
     /// Sleeps the whole time, signals or not.
     static void Sleep(unsigned long milliseconds);
 
-    /// Starts function(argument) on a thread of its own; false when no thread could be made. At most once for an object. The
-    /// name serves the caller's log only.
+    /// Starts function(argument) on a thread of its own; false when no thread could be made. At most once for an
+    /// object. The name serves the caller's log only.
     virtual bool Run(const char* name, void (*function)(void*), void* argument);
 
     /// Whether the function runs. The new thread sets this itself, so that it can still be false right after Run.

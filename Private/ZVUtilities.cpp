@@ -15,9 +15,21 @@ char* StrDup(const char* text)
     return copy;
 }
 
-bool Str2Bool(const char* text) { return text && strcmp(text, "true") == 0; }
+void SetText(ZV_WS_String& to, const ZVString& text)
+{
+    to.data = StrDup(text.c_str());
+    to.size = static_cast<unsigned int>(text.length());
+}
 
-int SortOrder2Int(ZV_WS_SortOrder order) { return order; }
+bool Str2Bool(const char* text)
+{
+    return text && strcmp(text, "true") == 0;
+}
+
+int SortOrder2Int(ZV_WS_SortOrder order)
+{
+    return order;
+}
 
 ZVString TM2Str(const struct tm& time)
 {
@@ -35,7 +47,8 @@ uint64_t MillisecondTime()
 uint32_t Hash(const char* text, size_t length, uint32_t seed)
 {
     uint32_t hash = seed;
-    for (size_t i = 0; i < length; ++i) hash = (hash * 16777619u) ^ static_cast<unsigned char>(text[i]);
+    for (size_t i = 0; i < length; ++i)
+        hash = (hash * 16777619u) ^ static_cast<unsigned char>(text[i]);
     return hash;
 }
 

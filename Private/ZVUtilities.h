@@ -16,6 +16,9 @@ namespace ZVUtilities {
 /// Heap copy for a record (new char[]); null stays null.
 char* StrDup(const char* text);
 
+/// Fills an empty text record.
+void SetText(ZV_WS_String& to, const ZVString& text);
+
 /// True only for the text "true".
 bool Str2Bool(const char* text);
 
@@ -39,8 +42,9 @@ ZVString UrlEncode(const ZVString& text);
 /// The status of a transport result (the SOAP runtime's error number, or an HTTP status).
 ZV_WS_Status To_ZV_WS_Status(int soapError);
 
-/// The status of a call: of its transport result when that is not 0, else of the service's response code as the function's
-/// row reads it. `functionName` is the ZV_WS_ function; null, empty or without a row: every code but 0 is a general error.
+/// The status of a call: of its transport result when that is not 0, else of the service's response code as the
+/// function's row reads it. `functionName` is the ZV_WS_ function; null, empty or without a row: every code but 0 is a
+/// general error.
 ZV_WS_Status To_ZV_WS_Status(int soapError, int responseCode, const char* functionName);
 
 /// Does nothing: a place to look at a context's error while debugging.
@@ -48,10 +52,10 @@ void print_soap_error(struct soap* context);
 
 // ---- Discovery.cpp
 
-/// The base URL of all three services: from the table for an environment named by `envNum`, else the environment is asked
-/// from the production host over `context`, whose kept connection is closed before and after. "" when the service cannot
-/// be reached; every unusable answer is production. `envID` gets the environment, the service's raw digit included.
-/// The text lives as long as the process. `context` may be null when `envNum` names the environment.
+/// The base URL of all three services: from the table for an environment named by `envNum`, else the environment is
+/// asked from the production host over `context`, whose kept connection is closed before and after. "" when the service
+/// cannot be reached; every unusable answer is production. `envID` gets the environment, the service's raw digit
+/// included. The text lives as long as the process. `context` may be null when `envNum` names the environment.
 const char* QueryServiceBaseURL(ContentType type, struct soap* context, const char* destinationUniqueID,
                                 int destinationTypeID, ZV_WS_EnvNum envNum, ZV_WS_EnvID& envID);
 

@@ -165,13 +165,25 @@ void ZV_LogReleaseFileTarget(ZV_LogTarget, void* user)
 
 // ---- Functions
 
-int ZV_LogRegisterArea(const char* name, int* id) { return ZV_Log::GetInstance().RegisterArea(name, *id); }
+int ZV_LogRegisterArea(const char* name, int* id)
+{
+    return ZV_Log::GetInstance().RegisterArea(name, *id);
+}
 
-void ZV_LogActivateArea(int id, bool on) { ZV_Log::GetInstance().ActivateArea(id, on); }
+void ZV_LogActivateArea(int id, bool on)
+{
+    ZV_Log::GetInstance().ActivateArea(id, on);
+}
 
-void ZV_LogSetAreaSeverityMask(int id, int mask) { ZV_Log::GetInstance().SetAreaSeverityMask(id, mask); }
+void ZV_LogSetAreaSeverityMask(int id, int mask)
+{
+    ZV_Log::GetInstance().SetAreaSeverityMask(id, mask);
+}
 
-bool ZV_LogWouldOutput(int id, int severity) { return ZV_Log::GetInstance().WouldOutput(id, severity); }
+bool ZV_LogWouldOutput(int id, int severity)
+{
+    return ZV_Log::GetInstance().WouldOutput(id, severity);
+}
 
 void ZV_LogOutput(int id, int severity, const char* format, ...)
 {
@@ -190,4 +202,7 @@ void ZV_LogOutputwithLen(int id, int severity, const char* text, unsigned int le
     ZV_Log::GetInstance().Output(id, severity, text, length);
 }
 
-void ZV_LogSetTarget(ZV_LogTarget target, void* user) { ZV_Log::GetInstance().SetTarget(target, user); }
+void ZV_LogSetTarget(ZV_LogTarget target, void* user)
+{
+    ZV_Log::GetInstance().SetTarget(target, user);
+}
