@@ -186,61 +186,61 @@ public:
 //gsoap ZV4 service encoding: literal
 
 //gsoap ZV4 service method-action: checkRentalExpiration http://api.zorvane.example/api/checkRentalExpiration
-int __ZV4__checkRentalExpiration(_ZV1__checkRentalExpiration* request, _ZV1__checkRentalExpirationResponse* response);
+int __ZV4__checkRentalExpiration(_ZV1__checkRentalExpiration* ZV1__checkRentalExpiration, _ZV1__checkRentalExpirationResponse* response);
 
 //gsoap ZV4 service method-action: GetCountryID http://api.zorvane.example/api/GetCountryID
-int __ZV4__GetCountryID(_ZV1__GetCountryID* request, _ZV1__GetCountryIDResponse* response);
+int __ZV4__GetCountryID(_ZV1__GetCountryID* ZV1__GetCountryID, _ZV1__GetCountryIDResponse* response);
 
 //gsoap ZV4 service method-action: getConfig http://api.zorvane.example/api/getConfig
-int __ZV4__getConfig(_ZV1__getConfig* request, _ZV1__getConfigResponse* response);
+int __ZV4__getConfig(_ZV1__getConfig* ZV1__getConfig, _ZV1__getConfigResponse* response);
 
 //gsoap ZV4 service method-action: checkAdultVerificationPin http://api.zorvane.example/api/checkAdultVerificationPin
-int __ZV4__checkAdultVerificationPin(_ZV1__checkAdultVerificationPin* request, _ZV1__checkAdultVerificationPinResponse* response);
+int __ZV4__checkAdultVerificationPin(_ZV1__checkAdultVerificationPin* ZV1__checkAdultVerificationPin, _ZV1__checkAdultVerificationPinResponse* response);
 
 //gsoap ZV4 service method-action: checkAdultVerificationEnabled http://api.zorvane.example/api/checkAdultVerificationEnabled
-int __ZV4__checkAdultVerificationEnabled(_ZV1__checkAdultVerificationEnabled* request, _ZV1__checkAdultVerificationEnabledResponse* response);
+int __ZV4__checkAdultVerificationEnabled(_ZV1__checkAdultVerificationEnabled* ZV1__checkAdultVerificationEnabled, _ZV1__checkAdultVerificationEnabledResponse* response);
 
 //gsoap ZV4 service method-action: addItemToWishlist http://api.zorvane.example/api/addItemToWishlist
-int __ZV4__addItemToWishlist(_ZV1__addItemToWishlist* request, _ZV1__addItemToWishlistResponse* response);
+int __ZV4__addItemToWishlist(_ZV1__addItemToWishlist* ZV1__addItemToWishlist, _ZV1__addItemToWishlistResponse* response);
 
 //gsoap ZV4 service method-action: removeAllItemsFromWishList http://api.zorvane.example/api/removeAllItemsFromWishList
-int __ZV4__removeAllItemsFromWishList(_ZV1__removeAllItemsFromWishList* request, _ZV1__removeAllItemsFromWishListResponse* response);
+int __ZV4__removeAllItemsFromWishList(_ZV1__removeAllItemsFromWishList* ZV1__removeAllItemsFromWishList, _ZV1__removeAllItemsFromWishListResponse* response);
 
 //gsoap ZV4 service method-action: removeItemFromWishList http://api.zorvane.example/api/removeItemFromWishList
-int __ZV4__removeItemFromWishList(_ZV1__removeItemFromWishList* request, _ZV1__removeItemFromWishListResponse* response);
+int __ZV4__removeItemFromWishList(_ZV1__removeItemFromWishList* ZV1__removeItemFromWishList, _ZV1__removeItemFromWishListResponse* response);
 
 //gsoap ZV4 service method-action: getWishlistItems http://api.zorvane.example/api/getWishlistItems
-int __ZV4__getWishlistItems(_ZV1__getWishlistItems* request, _ZV1__getWishlistItemsResponse* response);
+int __ZV4__getWishlistItems(_ZV1__getWishlistItems* ZV1__getWishlistItems, _ZV1__getWishlistItemsResponse* response);
 
 //gsoap ZV4 service method-action: assignGiftCertificateToUser http://api.zorvane.example/api/assignGiftCertificateToUser
-int __ZV4__assignGiftCertificateToUser(_ZV1__assignGiftCertificateToUser* request, _ZV1__assignGiftCertificateToUserResponse* response);
+int __ZV4__assignGiftCertificateToUser(_ZV1__assignGiftCertificateToUser* ZV1__assignGiftCertificateToUser, _ZV1__assignGiftCertificateToUserResponse* response);
 
 //gsoap ZV4 service method-action: getSettingsPageInfo http://api.zorvane.example/api/getSettingsPageInfo
-int __ZV4__getSettingsPageInfo(_ZV1__getSettingsPageInfo* request, _ZV1__getSettingsPageInfoResponse* response);
+int __ZV4__getSettingsPageInfo(_ZV1__getSettingsPageInfo* ZV1__getSettingsPageInfo, _ZV1__getSettingsPageInfoResponse* response);
 
 //gsoap ZV4 service method-action: getEmailAddress http://api.zorvane.example/api/getEmailAddress
-int __ZV4__getEmailAddress(_ZV1__getEmailAddress* request, _ZV1__getEmailAddressResponse* response);
+int __ZV4__getEmailAddress(_ZV1__getEmailAddress* ZV1__getEmailAddress, _ZV1__getEmailAddressResponse* response);
 
 //gsoap ZV4 service method-action: showPrePaidCardBalance http://api.zorvane.example/api/showPrePaidCardBalance
-int __ZV4__showPrePaidCardBalance(_ZV1__showPrePaidCardBalance* request, _ZV1__showPrePaidCardBalanceResponse* response);
+int __ZV4__showPrePaidCardBalance(_ZV1__showPrePaidCardBalance* ZV1__showPrePaidCardBalance, _ZV1__showPrePaidCardBalanceResponse* response);
 
 //gsoap ZV4 service method-action: getBillingInfo http://api.zorvane.example/api/getBillingInfo
-int __ZV4__getBillingInfo(_ZV1__getBillingInfo* request, _ZV1__getBillingInfoResponse* response);
+int __ZV4__getBillingInfo(_ZV1__getBillingInfo* ZV1__getBillingInfo, _ZV1__getBillingInfoResponse* response);
 
 //gsoap ZV4 service method-action: checkForPurchasedTitle http://api.zorvane.example/api/checkForPurchasedTitle
-int __ZV4__checkForPurchasedTitle(_ZV1__checkForPurchasedTitle* request, _ZV1__checkForPurchasedTitleResponse* response);
+int __ZV4__checkForPurchasedTitle(_ZV1__checkForPurchasedTitle* ZV1__checkForPurchasedTitle, _ZV1__checkForPurchasedTitleResponse* response);
 
 //gsoap ZV4 service method-action: getMyVideos http://api.zorvane.example/api/getMyVideos
-int __ZV4__getMyVideos(_ZV1__getMyVideos* request, _ZV1__getMyVideosResponse* response);
+int __ZV4__getMyVideos(_ZV1__getMyVideos* ZV1__getMyVideos, _ZV1__getMyVideosResponse* response);
 
 //gsoap ZV4 service method-action: doPurchaseSavedbilling http://api.zorvane.example/api/doPurchaseSavedbilling
-int __ZV4__doPurchaseSavedbilling(_ZV1__doPurchaseSavedbilling* request, _ZV1__doPurchaseSavedbillingResponse* response);
+int __ZV4__doPurchaseSavedbilling(_ZV1__doPurchaseSavedbilling* ZV1__doPurchaseSavedbilling, _ZV1__doPurchaseSavedbillingResponse* response);
 
 //gsoap ZV4 service method-action: authorizeDevice http://api.zorvane.example/api/authorizeDevice
-int __ZV4__authorizeDevice(_ZV1__authorizeDevice* request, _ZV1__authorizeDeviceResponse* response);
+int __ZV4__authorizeDevice(_ZV1__authorizeDevice* ZV1__authorizeDevice, _ZV1__authorizeDeviceResponse* response);
 
 //gsoap ZV4 service method-action: deactivateDevice http://api.zorvane.example/api/deactivateDevice
-int __ZV4__deactivateDevice(_ZV1__deactivateDevice* request, _ZV1__deactivateDeviceResponse* response);
+int __ZV4__deactivateDevice(_ZV1__deactivateDevice* ZV1__deactivateDevice, _ZV1__deactivateDeviceResponse* response);
 
 //gsoap ZV4 service method-action: checkAuthToken http://api.zorvane.example/api/checkAuthToken
-int __ZV4__checkAuthToken(_ZV1__checkAuthToken* request, _ZV1__checkAuthTokenResponse* response);
+int __ZV4__checkAuthToken(_ZV1__checkAuthToken* ZV1__checkAuthToken, _ZV1__checkAuthTokenResponse* response);

@@ -160,49 +160,49 @@ public:
 //gsoap ZV3 service encoding: literal
 
 //gsoap ZV3 service method-action: getFileType http://api.zorvane.example/api/getFileType
-int __ZV3__getFileType(_ZV1__getFileType* request, _ZV1__getFileTypeResponse* response);
+int __ZV3__getFileType(_ZV1__getFileType* ZV1__getFileType, _ZV1__getFileTypeResponse* response);
 
 //gsoap ZV3 service method-action: shouldUpdateCache http://api.zorvane.example/api/shouldUpdateCache
-int __ZV3__shouldUpdateCache(_ZV1__shouldUpdateCache* request, _ZV1__shouldUpdateCacheResponse* response);
+int __ZV3__shouldUpdateCache(_ZV1__shouldUpdateCache* ZV1__shouldUpdateCache, _ZV1__shouldUpdateCacheResponse* response);
 
 //gsoap ZV3 service method-action: getRecommendedTitles http://api.zorvane.example/api/getRecommendedTitles
-int __ZV3__getRecommendedTitles(_ZV1__getRecommendedTitles* request, _ZV1__getRecommendedTitlesResponse* response);
+int __ZV3__getRecommendedTitles(_ZV1__getRecommendedTitles* ZV1__getRecommendedTitles, _ZV1__getRecommendedTitlesResponse* response);
 
 //gsoap ZV3 service method-action: getLastCacheLoadTimeUTC http://api.zorvane.example/api/getLastCacheLoadTimeUTC
-int __ZV3__getLastCacheLoadTimeUTC(_ZV1__getLastCacheLoadTimeUTC* request, _ZV1__getLastCacheLoadTimeUTCResponse* response);
+int __ZV3__getLastCacheLoadTimeUTC(_ZV1__getLastCacheLoadTimeUTC* ZV1__getLastCacheLoadTimeUTC, _ZV1__getLastCacheLoadTimeUTCResponse* response);
 
 //gsoap ZV3 service method-action: translateSkuId http://api.zorvane.example/api/translateSkuId
-int __ZV3__translateSkuId(_ZV1__translateSkuId* request, _ZV1__translateSkuIdResponse* response);
+int __ZV3__translateSkuId(_ZV1__translateSkuId* ZV1__translateSkuId, _ZV1__translateSkuIdResponse* response);
 
 //gsoap ZV3 service method-action: translateTivoExternalId http://api.zorvane.example/api/translateTivoExternalId
-int __ZV3__translateTivoExternalId(_ZV1__translateTivoExternalId* request, _ZV1__translateTivoExternalIdResponse* response);
+int __ZV3__translateTivoExternalId(_ZV1__translateTivoExternalId* ZV1__translateTivoExternalId, _ZV1__translateTivoExternalIdResponse* response);
 
 //gsoap ZV3 service method-action: getAllTvEpisodeListings http://api.zorvane.example/api/getAllTvEpisodeListings
-int __ZV3__getAllTvEpisodeListings(_ZV1__getAllTvEpisodeListings* request, _ZV1__getAllTvEpisodeListingsResponse* response);
+int __ZV3__getAllTvEpisodeListings(_ZV1__getAllTvEpisodeListings* ZV1__getAllTvEpisodeListings, _ZV1__getAllTvEpisodeListingsResponse* response);
 
 //gsoap ZV3 service method-action: getTvEpisodeListing http://api.zorvane.example/api/getTvEpisodeListing
-int __ZV3__getTvEpisodeListing(_ZV1__getTvEpisodeListing* request, _ZV1__getTvEpisodeListingResponse* response);
+int __ZV3__getTvEpisodeListing(_ZV1__getTvEpisodeListing* ZV1__getTvEpisodeListing, _ZV1__getTvEpisodeListingResponse* response);
 
 //gsoap ZV3 service method-action: getTvEpisodeListByTitleID http://api.zorvane.example/api/getTvEpisodeListByTitleID
-int __ZV3__getTvEpisodeListByTitleID(_ZV1__getTvEpisodeListByTitleID* request, _ZV1__getTvEpisodeListByTitleIDResponse* response);
+int __ZV3__getTvEpisodeListByTitleID(_ZV1__getTvEpisodeListByTitleID* ZV1__getTvEpisodeListByTitleID, _ZV1__getTvEpisodeListByTitleIDResponse* response);
 
 //gsoap ZV3 service method-action: getTitleListing http://api.zorvane.example/api/getTitleListing
-int __ZV3__getTitleListing(_ZV1__getTitleListing* request, _ZV1__getTitleListingResponse* response);
+int __ZV3__getTitleListing(_ZV1__getTitleListing* ZV1__getTitleListing, _ZV1__getTitleListingResponse* response);
 
 //gsoap ZV3 service method-action: getTitlesByGenreArray http://api.zorvane.example/api/getTitlesByGenreArray
-int __ZV3__getTitlesByGenreArray(_ZV1__getTitlesByGenreArray* request, _ZV1__getTitlesByGenreArrayResponse* response);
+int __ZV3__getTitlesByGenreArray(_ZV1__getTitlesByGenreArray* ZV1__getTitlesByGenreArray, _ZV1__getTitlesByGenreArrayResponse* response);
 
 //gsoap ZV3 service method-action: getTitlesByNavigation http://api.zorvane.example/api/getTitlesByNavigation
-int __ZV3__getTitlesByNavigation(_ZV1__getTitlesByNavigation* request, _ZV1__getTitlesByNavigationResponse* response);
+int __ZV3__getTitlesByNavigation(_ZV1__getTitlesByNavigation* ZV1__getTitlesByNavigation, _ZV1__getTitlesByNavigationResponse* response);
 
 //gsoap ZV3 service method-action: getGenreLabel http://api.zorvane.example/api/getGenreLabel
-int __ZV3__getGenreLabel(_ZV1__getGenreLabel* request, _ZV1__getGenreLabelResponse* response);
+int __ZV3__getGenreLabel(_ZV1__getGenreLabel* ZV1__getGenreLabel, _ZV1__getGenreLabelResponse* response);
 
 //gsoap ZV3 service method-action: searchForTitleDetail http://api.zorvane.example/api/searchForTitleDetail
-int __ZV3__searchForTitleDetail(_ZV1__searchForTitleDetail* request, _ZV1__searchForTitleDetailResponse* response);
+int __ZV3__searchForTitleDetail(_ZV1__searchForTitleDetail* ZV1__searchForTitleDetail, _ZV1__searchForTitleDetailResponse* response);
 
 //gsoap ZV3 service method-action: searchForTitle http://api.zorvane.example/api/searchForTitle
-int __ZV3__searchForTitle(_ZV1__searchForTitle* request, _ZV1__searchForTitleResponse* response);
+int __ZV3__searchForTitle(_ZV1__searchForTitle* ZV1__searchForTitle, _ZV1__searchForTitleResponse* response);
 
 //gsoap ZV3 service method-action: getNavigation http://api.zorvane.example/api/getNavigation
-int __ZV3__getNavigation(_ZV1__getNavigation* request, _ZV1__getNavigationResponse* response);
+int __ZV3__getNavigation(_ZV1__getNavigation* ZV1__getNavigation, _ZV1__getNavigationResponse* response);

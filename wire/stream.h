@@ -165,106 +165,106 @@ public:
 //gsoap ZV2 service encoding: literal
 
 //gsoap ZV2 service method-action: getTHXMediaDirectorBonusAsset http://api.zorvane.example/api/getTHXMediaDirectorBonusAsset
-int __ZV2__getTHXMediaDirectorBonusAsset(_ZV1__getTHXMediaDirectorBonusAsset* request, _ZV1__getTHXMediaDirectorBonusAssetResponse* response);
+int __ZV2__getTHXMediaDirectorBonusAsset(_ZV1__getTHXMediaDirectorBonusAsset* ZV1__getTHXMediaDirectorBonusAsset, _ZV1__getTHXMediaDirectorBonusAssetResponse* response);
 
 //gsoap ZV2 service method-action: getTHXMediaDirector http://api.zorvane.example/api/getTHXMediaDirector
-int __ZV2__getTHXMediaDirector(_ZV1__getTHXMediaDirector* request, _ZV1__getTHXMediaDirectorResponse* response);
+int __ZV2__getTHXMediaDirector(_ZV1__getTHXMediaDirector* ZV1__getTHXMediaDirector, _ZV1__getTHXMediaDirectorResponse* response);
 
 //gsoap ZV2 service method-action: setAudioDefaultProperty http://api.zorvane.example/api/setAudioDefaultProperty
-int __ZV2__setAudioDefaultProperty(_ZV1__setAudioDefaultProperty* request, _ZV1__setAudioDefaultPropertyResponse* response);
+int __ZV2__setAudioDefaultProperty(_ZV1__setAudioDefaultProperty* ZV1__setAudioDefaultProperty, _ZV1__setAudioDefaultPropertyResponse* response);
 
 //gsoap ZV2 service method-action: getAudioDefaultProperty http://api.zorvane.example/api/getAudioDefaultProperty
-int __ZV2__getAudioDefaultProperty(_ZV1__getAudioDefaultProperty* request, _ZV1__getAudioDefaultPropertyResponse* response);
+int __ZV2__getAudioDefaultProperty(_ZV1__getAudioDefaultProperty* ZV1__getAudioDefaultProperty, _ZV1__getAudioDefaultPropertyResponse* response);
 
 //gsoap ZV2 service method-action: calcOrderTax http://api.zorvane.example/api/calcOrderTax
-int __ZV2__calcOrderTax(_ZV1__calcOrderTax* request, _ZV1__calcOrderTaxResponse* response);
+int __ZV2__calcOrderTax(_ZV1__calcOrderTax* ZV1__calcOrderTax, _ZV1__calcOrderTaxResponse* response);
 
 //gsoap ZV2 service method-action: ReturnTimeout http://api.zorvane.example/api/ReturnTimeout
-int __ZV2__ReturnTimeout(_ZV1__ReturnTimeout* request, _ZV1__ReturnTimeoutResponse* response);
+int __ZV2__ReturnTimeout(_ZV1__ReturnTimeout* ZV1__ReturnTimeout, _ZV1__ReturnTimeoutResponse* response);
 
 //gsoap ZV2 service method-action: ReturnError http://api.zorvane.example/api/ReturnError
-int __ZV2__ReturnError(_ZV1__ReturnError* request, _ZV1__ReturnErrorResponse* response);
+int __ZV2__ReturnError(_ZV1__ReturnError* ZV1__ReturnError, _ZV1__ReturnErrorResponse* response);
 
 //gsoap ZV2 service method-action: removeAllMyPurchases http://api.zorvane.example/api/removeAllMyPurchases
-int __ZV2__removeAllMyPurchases(_ZV1__removeAllMyPurchases* request, _ZV1__removeAllMyPurchasesResponse* response);
+int __ZV2__removeAllMyPurchases(_ZV1__removeAllMyPurchases* ZV1__removeAllMyPurchases, _ZV1__removeAllMyPurchasesResponse* response);
 
 //gsoap ZV2 service method-action: loadLastStreamingAssetLocationForPass http://api.zorvane.example/api/loadLastStreamingAssetLocationForPass
-int __ZV2__loadLastStreamingAssetLocationForPass(_ZV1__loadLastStreamingAssetLocationForPass* request, _ZV1__loadLastStreamingAssetLocationForPassResponse* response);
+int __ZV2__loadLastStreamingAssetLocationForPass(_ZV1__loadLastStreamingAssetLocationForPass* ZV1__loadLastStreamingAssetLocationForPass, _ZV1__loadLastStreamingAssetLocationForPassResponse* response);
 
 //gsoap ZV2 service method-action: getBonusAssetLocation http://api.zorvane.example/api/getBonusAssetLocation
-int __ZV2__getBonusAssetLocation(_ZV1__getBonusAssetLocation* request, _ZV1__getBonusAssetLocationResponse* response);
+int __ZV2__getBonusAssetLocation(_ZV1__getBonusAssetLocation* ZV1__getBonusAssetLocation, _ZV1__getBonusAssetLocationResponse* response);
 
 //gsoap ZV2 service method-action: getStreamingAssetLocation http://api.zorvane.example/api/getStreamingAssetLocation
-int __ZV2__getStreamingAssetLocation(_ZV1__getStreamingAssetLocation* request, _ZV1__getStreamingAssetLocationResponse* response);
+int __ZV2__getStreamingAssetLocation(_ZV1__getStreamingAssetLocation* ZV1__getStreamingAssetLocation, _ZV1__getStreamingAssetLocationResponse* response);
 
 //gsoap ZV2 service method-action: manageStreamInstanceStatus http://api.zorvane.example/api/manageStreamInstanceStatus
-int __ZV2__manageStreamInstanceStatus(_ZV1__manageStreamInstanceStatus* request, _ZV1__manageStreamInstanceStatusResponse* response);
+int __ZV2__manageStreamInstanceStatus(_ZV1__manageStreamInstanceStatus* ZV1__manageStreamInstanceStatus, _ZV1__manageStreamInstanceStatusResponse* response);
 
 //gsoap ZV2 service method-action: getBillingInfoAndPPCBalance http://api.zorvane.example/api/getBillingInfoAndPPCBalance
-int __ZV2__getBillingInfoAndPPCBalance(_ZV1__getBillingInfoAndPPCBalance* request, _ZV1__getBillingInfoAndPPCBalanceResponse* response);
+int __ZV2__getBillingInfoAndPPCBalance(_ZV1__getBillingInfoAndPPCBalance* ZV1__getBillingInfoAndPPCBalance, _ZV1__getBillingInfoAndPPCBalanceResponse* response);
 
 //gsoap ZV2 service method-action: checkForPurchasedStream http://api.zorvane.example/api/checkForPurchasedStream
-int __ZV2__checkForPurchasedStream(_ZV1__checkForPurchasedStream* request, _ZV1__checkForPurchasedStreamResponse* response);
+int __ZV2__checkForPurchasedStream(_ZV1__checkForPurchasedStream* ZV1__checkForPurchasedStream, _ZV1__checkForPurchasedStreamResponse* response);
 
 //gsoap ZV2 service method-action: checkForPurchasedStreamByTitleID http://api.zorvane.example/api/checkForPurchasedStreamByTitleID
-int __ZV2__checkForPurchasedStreamByTitleID(_ZV1__checkForPurchasedStreamByTitleID* request, _ZV1__checkForPurchasedStreamByTitleIDResponse* response);
+int __ZV2__checkForPurchasedStreamByTitleID(_ZV1__checkForPurchasedStreamByTitleID* ZV1__checkForPurchasedStreamByTitleID, _ZV1__checkForPurchasedStreamByTitleIDResponse* response);
 
 //gsoap ZV2 service method-action: getTitleListingsPurchasedForPasses http://api.zorvane.example/api/getTitleListingsPurchasedForPasses
-int __ZV2__getTitleListingsPurchasedForPasses(_ZV1__getTitleListingsPurchasedForPasses* request, _ZV1__getTitleListingsPurchasedForPassesResponse* response);
+int __ZV2__getTitleListingsPurchasedForPasses(_ZV1__getTitleListingsPurchasedForPasses* ZV1__getTitleListingsPurchasedForPasses, _ZV1__getTitleListingsPurchasedForPassesResponse* response);
 
 //gsoap ZV2 service method-action: getMyStreamingVideos http://api.zorvane.example/api/getMyStreamingVideos
-int __ZV2__getMyStreamingVideos(_ZV1__getMyStreamingVideos* request, _ZV1__getMyStreamingVideosResponse* response);
+int __ZV2__getMyStreamingVideos(_ZV1__getMyStreamingVideos* ZV1__getMyStreamingVideos, _ZV1__getMyStreamingVideosResponse* response);
 
 //gsoap ZV2 service method-action: checkRentalExpiration http://api.zorvane.example/api/checkRentalExpiration
-int __ZV2__checkRentalExpiration(_ZV1__checkRentalExpiration* request, _ZV1__checkRentalExpirationResponse* response);
+int __ZV2__checkRentalExpiration(_ZV1__checkRentalExpiration* ZV1__checkRentalExpiration, _ZV1__checkRentalExpirationResponse* response);
 
 //gsoap ZV2 service method-action: GetCountryID http://api.zorvane.example/api/GetCountryID
-int __ZV2__GetCountryID(_ZV1__GetCountryID* request, _ZV1__GetCountryIDResponse* response);
+int __ZV2__GetCountryID(_ZV1__GetCountryID* ZV1__GetCountryID, _ZV1__GetCountryIDResponse* response);
 
 //gsoap ZV2 service method-action: getConfig http://api.zorvane.example/api/getConfig
-int __ZV2__getConfig(_ZV1__getConfig* request, _ZV1__getConfigResponse* response);
+int __ZV2__getConfig(_ZV1__getConfig* ZV1__getConfig, _ZV1__getConfigResponse* response);
 
 //gsoap ZV2 service method-action: checkAdultVerificationPin http://api.zorvane.example/api/checkAdultVerificationPin
-int __ZV2__checkAdultVerificationPin(_ZV1__checkAdultVerificationPin* request, _ZV1__checkAdultVerificationPinResponse* response);
+int __ZV2__checkAdultVerificationPin(_ZV1__checkAdultVerificationPin* ZV1__checkAdultVerificationPin, _ZV1__checkAdultVerificationPinResponse* response);
 
 //gsoap ZV2 service method-action: checkAdultVerificationEnabled http://api.zorvane.example/api/checkAdultVerificationEnabled
-int __ZV2__checkAdultVerificationEnabled(_ZV1__checkAdultVerificationEnabled* request, _ZV1__checkAdultVerificationEnabledResponse* response);
+int __ZV2__checkAdultVerificationEnabled(_ZV1__checkAdultVerificationEnabled* ZV1__checkAdultVerificationEnabled, _ZV1__checkAdultVerificationEnabledResponse* response);
 
 //gsoap ZV2 service method-action: addItemToWishlist http://api.zorvane.example/api/addItemToWishlist
-int __ZV2__addItemToWishlist(_ZV1__addItemToWishlist* request, _ZV1__addItemToWishlistResponse* response);
+int __ZV2__addItemToWishlist(_ZV1__addItemToWishlist* ZV1__addItemToWishlist, _ZV1__addItemToWishlistResponse* response);
 
 //gsoap ZV2 service method-action: removeAllItemsFromWishList http://api.zorvane.example/api/removeAllItemsFromWishList
-int __ZV2__removeAllItemsFromWishList(_ZV1__removeAllItemsFromWishList* request, _ZV1__removeAllItemsFromWishListResponse* response);
+int __ZV2__removeAllItemsFromWishList(_ZV1__removeAllItemsFromWishList* ZV1__removeAllItemsFromWishList, _ZV1__removeAllItemsFromWishListResponse* response);
 
 //gsoap ZV2 service method-action: removeItemFromWishList http://api.zorvane.example/api/removeItemFromWishList
-int __ZV2__removeItemFromWishList(_ZV1__removeItemFromWishList* request, _ZV1__removeItemFromWishListResponse* response);
+int __ZV2__removeItemFromWishList(_ZV1__removeItemFromWishList* ZV1__removeItemFromWishList, _ZV1__removeItemFromWishListResponse* response);
 
 //gsoap ZV2 service method-action: getWishlistItems http://api.zorvane.example/api/getWishlistItems
-int __ZV2__getWishlistItems(_ZV1__getWishlistItems* request, _ZV1__getWishlistItemsResponse* response);
+int __ZV2__getWishlistItems(_ZV1__getWishlistItems* ZV1__getWishlistItems, _ZV1__getWishlistItemsResponse* response);
 
 //gsoap ZV2 service method-action: assignGiftCertificateToUser http://api.zorvane.example/api/assignGiftCertificateToUser
-int __ZV2__assignGiftCertificateToUser(_ZV1__assignGiftCertificateToUser* request, _ZV1__assignGiftCertificateToUserResponse* response);
+int __ZV2__assignGiftCertificateToUser(_ZV1__assignGiftCertificateToUser* ZV1__assignGiftCertificateToUser, _ZV1__assignGiftCertificateToUserResponse* response);
 
 //gsoap ZV2 service method-action: getSettingsPageInfo http://api.zorvane.example/api/getSettingsPageInfo
-int __ZV2__getSettingsPageInfo(_ZV1__getSettingsPageInfo* request, _ZV1__getSettingsPageInfoResponse* response);
+int __ZV2__getSettingsPageInfo(_ZV1__getSettingsPageInfo* ZV1__getSettingsPageInfo, _ZV1__getSettingsPageInfoResponse* response);
 
 //gsoap ZV2 service method-action: getEmailAddress http://api.zorvane.example/api/getEmailAddress
-int __ZV2__getEmailAddress(_ZV1__getEmailAddress* request, _ZV1__getEmailAddressResponse* response);
+int __ZV2__getEmailAddress(_ZV1__getEmailAddress* ZV1__getEmailAddress, _ZV1__getEmailAddressResponse* response);
 
 //gsoap ZV2 service method-action: showPrePaidCardBalance http://api.zorvane.example/api/showPrePaidCardBalance
-int __ZV2__showPrePaidCardBalance(_ZV1__showPrePaidCardBalance* request, _ZV1__showPrePaidCardBalanceResponse* response);
+int __ZV2__showPrePaidCardBalance(_ZV1__showPrePaidCardBalance* ZV1__showPrePaidCardBalance, _ZV1__showPrePaidCardBalanceResponse* response);
 
 //gsoap ZV2 service method-action: getBillingInfo http://api.zorvane.example/api/getBillingInfo
-int __ZV2__getBillingInfo(_ZV1__getBillingInfo* request, _ZV1__getBillingInfoResponse* response);
+int __ZV2__getBillingInfo(_ZV1__getBillingInfo* ZV1__getBillingInfo, _ZV1__getBillingInfoResponse* response);
 
 //gsoap ZV2 service method-action: doPurchaseSavedbilling http://api.zorvane.example/api/doPurchaseSavedbilling
-int __ZV2__doPurchaseSavedbilling(_ZV1__doPurchaseSavedbilling* request, _ZV1__doPurchaseSavedbillingResponse* response);
+int __ZV2__doPurchaseSavedbilling(_ZV1__doPurchaseSavedbilling* ZV1__doPurchaseSavedbilling, _ZV1__doPurchaseSavedbillingResponse* response);
 
 //gsoap ZV2 service method-action: authorizeDevice http://api.zorvane.example/api/authorizeDevice
-int __ZV2__authorizeDevice(_ZV1__authorizeDevice* request, _ZV1__authorizeDeviceResponse* response);
+int __ZV2__authorizeDevice(_ZV1__authorizeDevice* ZV1__authorizeDevice, _ZV1__authorizeDeviceResponse* response);
 
 //gsoap ZV2 service method-action: deactivateDevice http://api.zorvane.example/api/deactivateDevice
-int __ZV2__deactivateDevice(_ZV1__deactivateDevice* request, _ZV1__deactivateDeviceResponse* response);
+int __ZV2__deactivateDevice(_ZV1__deactivateDevice* ZV1__deactivateDevice, _ZV1__deactivateDeviceResponse* response);
 
 //gsoap ZV2 service method-action: checkAuthToken http://api.zorvane.example/api/checkAuthToken
-int __ZV2__checkAuthToken(_ZV1__checkAuthToken* request, _ZV1__checkAuthTokenResponse* response);
+int __ZV2__checkAuthToken(_ZV1__checkAuthToken* ZV1__checkAuthToken, _ZV1__checkAuthTokenResponse* response);
