@@ -12,8 +12,10 @@
 //
 // Script errors: an operation that runs script code (a called function, a getter, a toString) can fail. The runtime
 // must report the error on the error stream ("script error: ", message, file, line, and the native method that was
-// running) and return false; it must not unwind native code. After the movie ended, Call and Construct do nothing and
-// return false; after its stage-window set was destroyed, so does every operation but AddRef and Release.
+// running) and return false; it must not unwind native code. After RunStageWindowSet has returned, Call does nothing
+// and returns false. After a stop request had to break off the script, and after the stage-window set was destroyed,
+// every operation but AddRef, Release and GetExtensionInstance does: native code must expect false, and no object, at
+// any time.
 #pragma once
 
 #include <cmath>
