@@ -1,0 +1,131 @@
+#include "ScriptObject.h"
+
+#include <cmath>
+
+#include "ScriptEngine.h"
+
+using namespace ae::stagecraft;
+
+void ScriptObject::Release()
+{
+    if (--m_references > 0) return;
+    if (m_pEngine) m_pEngine->Forget(*this);
+    delete this;
+}
+
+template <class Body>
+bool ScriptObject::Evaluate(Body&& body, ASValue& result)
+{
+    if (!m_pEngine) {
+        result = ASValue();
+        return false;
+    }
+    void* const pSelf = m_pHeapObject;
+    return m_pEngine->Evaluate(
+        [&](duk_context* pContext) {
+            duk_push_heapptr(pContext, pSelf);
+            body(pContext);
+        },
+        result);
+}
+
+bool ScriptObject::IsInstanceOf(const char* pClassName)
+{
+    ASValue result;
+    Evaluate(
+        [&](duk_context* pContext) {
+            ScriptEngine::PushGlobal(pContext, pClassName);
+            duk_push_boolean(pContext, duk_is_function(pContext, -1) && duk_instanceof(pContext, -2, -1));
+        },
+        result);
+    return result.GetBoolean();
+}
+
+ASExtensionClass* ScriptObject::GetExtensionInstance()
+{
+    return m_pEngine && m_pEngine->Extensions() ? m_pEngine->Extensions()->InstanceOf(m_pHeapObject) : nullptr;
+}
+
+bool ScriptObject::GetProperty(const char* pName, ASValue& value)
+{
+    return Evaluate(
+        [&](duk_context* pContext) {
+            ScriptEngine::PushText(pContext, pName);
+            duk_get_prop(pContext, -2);
+        },
+        value);
+}
+
+bool ScriptObject::SetProperty(const char* pName, const ASValue& value)
+{
+    ASValue unused;
+    return Evaluate(
+        [&](duk_context* pContext) {
+            ScriptEngine::PushText(pContext, pName);
+            ScriptEngine::PushValue(pContext, value);
+            duk_put_prop(pContext, -3);
+            duk_push_undefined(pContext);
+        },
+        unused);
+}
+
+uint32_t ScriptObject::GetLength()
+{
+    ASValue length;
+    GetProperty("length", length);
+    return ASToUint32(length.GetNumber());
+}
+
+bool ScriptObject::GetElement(uint32_t index, ASValue& value)
+{
+    return Evaluate([&](duk_context* pContext) { duk_get_prop_index(pContext, -1, index); }, value);
+}
+
+bool ScriptObject::Call(const char* pFunctionName, const ASValueArray& arguments, ASValue& result)
+{
+    if (m_pEngine && !m_pEngine->Running()) {
+        result = ASValue();
+        return false;
+    }
+    return Evaluate(
+        [&](duk_context* pContext) {
+            const duk_idx_t self = duk_get_top_index(pContext);
+            ScriptEngine::PushText(pContext, pFunctionName);
+            ScriptEngine::PushArguments(pContext, arguments);
+            duk_call_prop(pContext, self, static_cast<duk_idx_t>(arguments.size()));
+        },
+        result);
+}
+
+bool ScriptObject::Construct(const char* pClassName, const ASValueArray& arguments, ASValue& result)
+{
+    return Evaluate(
+        [&](duk_context* pContext) {
+            ScriptEngine::PushGlobal(pContext, pClassName);
+            ScriptEngine::PushArguments(pContext, arguments);
+            duk_new(pContext, static_cast<duk_idx_t>(arguments.size()));
+        },
+        result);
+}
+
+void ScriptObject::StartUpdates()
+{
+    if (m_pEngine && m_pEngine->Extensions()) m_pEngine->Extensions()->StartUpdates(*this);
+}
+
+void ScriptObject::StopUpdates()
+{
+    if (m_pEngine && m_pEngine->Extensions()) m_pEngine->Extensions()->StopUpdates(*this);
+}
+
+double ScriptObject::ToNumber(const ASValue& value)
+{
+    return m_pEngine ? m_pEngine->ToNumber(value) : NAN;
+}
+
+bool ScriptObject::ToText(const ASValue& value, AEString& text)
+{
+    if (m_pEngine) return m_pEngine->ToText(value, text);
+    text = AEString();
+    return false;
+}
