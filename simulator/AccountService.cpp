@@ -1,0 +1,254 @@
+// The operations of the customer's account, which the account and the stream service share, and those of the account
+// service alone.
+#include <ctime>
+
+#include "PurchaseList.h"
+#include "Storefront.h"
+
+namespace {
+
+int AccountInt(Call& call, const char* column)
+{
+    return call.database.Int(std::string("SELECT ") + column + " FROM account");
+}
+std::string AccountText(Call& call, const char* column)
+{
+    return call.database.Text(std::string("SELECT ") + column + " FROM account");
+}
+
+// ---- The device
+
+void authorizeDevice(Call& call)
+{
+    const std::string pin = call.Text("PIN");
+    if (pin == "000000") return call.Standard(2, "device locked out");
+    if (pin != StorefrontAccount::kActivationPin) return call.Standard(1, "invalid PIN");
+    const std::string token = "token-" + std::to_string(AccountInt(call, "active") + 1);
+    call.database.Run("UPDATE account SET token = ?, active = active + 1", {token});
+    call.Standard();
+    call.xml.Element("AuthToken", token);
+}
+
+void deactivateDevice(Call& call)
+{
+    call.database.Run("UPDATE account SET token = ''");
+    call.Standard();
+}
+
+void checkAuthToken(Call& call)
+{
+    const std::string token = call.Text("AuthToken");
+    call.xml.Raw(!token.empty() && token == AccountText(call, "token") ? "true" : "false");
+}
+
+void getConfig(Call& call)
+{
+    call.Standard();
+    call.xml.Group("ConfigurationSet", [&] {
+        const std::pair<std::string, std::string> standard[] = {
+            {"BandwithCheckURL", "http://" + call.address + "/bandwidth/test.bin"}, {"Region", "00"}};
+        const auto write = [&](const std::string& key, const std::string& value) {
+            call.xml.Raw("<Configuration Key=\"" + XmlEscape(key) + "\">");
+            call.xml.Optional("Value", value).Raw("</Configuration>");
+        };
+        for (const auto& item : standard) {
+            if (call.database.Int("SELECT COUNT(*) FROM config WHERE key = ?", {item.first}) == 0)
+                write(item.first, item.second);
+        }
+        call.database.Each("SELECT key, value FROM config", {},
+                           [&](const Database::Row& row) { write(row.Text(0), row.Text(1)); });
+        call.xml.Raw("<Configuration Key=\"Unset\"/>");
+    });
+}
+
+void getSettingsPageInfo(Call& call)
+{
+    call.Standard();
+    call.xml.Element("Account", AccountText(call, "name"))
+        .Element("DeviceID", "1")
+        .Element("DeviceName", "Living room");
+}
+
+void GetCountryID(Call& call)
+{
+    call.xml.Raw(AccountText(call, "country"));
+}
+
+// ---- Wish list
+
+void addItemToWishlist(Call& call)
+{
+    const int title = call.Int("TitleID");
+    if (call.database.Int("SELECT COUNT(*) FROM title WHERE id = ?", {title}) == 0)
+        return call.Standard(1, "no such title");
+    call.database.Run("INSERT OR IGNORE INTO wish SELECT ?, COALESCE(MAX(added), 0) + 1 FROM wish", {title});
+    call.Standard();
+}
+
+void removeItemFromWishList(Call& call)
+{
+    const bool removed = call.database.Run("DELETE FROM wish WHERE title = ?", {call.Int("TitleID")}) == 1;
+    call.Standard(removed ? 0 : 1, removed ? "OK" : "not in the wish list");
+}
+
+void removeAllItemsFromWishList(Call& call)
+{
+    call.database.Run("DELETE FROM wish");
+    call.Standard();
+}
+
+void getWishlistItems(Call& call)
+{
+    static const char* const kOrders[] = {"added", "name", "rating", "stars DESC"};
+    static const char* const kByType[] = {"", " WHERE is_tv = 1", " WHERE is_tv = 0"};
+    const int order = call.Int("sortOrder");
+    if (order < 0 || order > 3) return call.Standard(2, "no such order");
+    WritePurchaseList(call, "wish JOIN title ON title.id = wish.title" + std::string(kByType[call.Int("TitleType")]),
+                      "wish.title", "0", std::string(kOrders[order]) + ", wish.title");
+    call.xml.Element("SortOrder", order);
+}
+
+// ---- Money
+
+void getEmailAddress(Call& call)
+{
+    call.Standard();
+    call.xml.Element("EmailAddress", AccountText(call, "email"));
+}
+
+void getBillingInfo(Call& call)
+{
+    if (AccountText(call, "card").empty()) return call.Standard(2, "no card on file");
+    call.Standard();
+    call.xml.Element("CCLastFour", AccountText(call, "card")).Element("CCTypeId", AccountInt(call, "card_type"));
+    call.xml.Element("CCType", AccountText(call, "card_name"));
+}
+
+void showPrePaidCardBalance(Call& call)
+{
+    call.Standard();
+    call.xml.Element("Balance", AccountInt(call, "prepaid"));
+}
+
+void assignGiftCertificateToUser(Call& call)
+{
+    const std::string code = call.Text("GiftCertificateCode");
+    if (code.empty()) return call.Standard(2, "no code");
+    const int amount = call.database.Int("SELECT amount FROM gift WHERE code = ? AND used = 0", {code});
+    if (amount == 0) return call.Standard(1, "unknown or used code");
+    call.database.Run("UPDATE gift SET used = 1 WHERE code = ?", {code});
+    call.database.Run("UPDATE account SET prepaid = prepaid + ?", {amount});
+    call.Standard();
+    call.xml.Element("Balance", AccountInt(call, "prepaid"));
+}
+
+int Cents(const std::string& price)
+{
+    const size_t point = price.find('.');
+    return atoi(price.substr(0, point).c_str()) * 100 + atoi(price.substr(point + 1).c_str());
+}
+
+void doPurchaseSavedbilling(Call& call)
+{
+    const int sku = call.Int("SkuID");
+    // The first refusals can be asked for by product: 9001 answers 1, 9002 answers 2 ... 9022 answers 22.
+    if (sku > 9000 && sku <= 9022) return call.Standard(sku - 9000, "refused as asked");
+    const std::string funds = call.Text("UsePrePaidFunds");
+    const std::string price = call.database.Text("SELECT price FROM product WHERE sku = ?", {sku});
+    if (price.empty()) return call.Standard(1, "no such product");
+    if (funds != "yes" && funds != "no") return call.Standard(7, "neither yes nor no");
+    if (funds == "yes") {
+        if (AccountInt(call, "prepaid") < Cents(price)) return call.Standard(12, "not enough prepaid money");
+        call.database.Run("UPDATE account SET prepaid = prepaid - ?", {Cents(price)});
+    } else if (AccountText(call, "card").empty()) {
+        return call.Standard(11, "no card on file");
+    }
+    call.database.Run(
+        "INSERT INTO pass (title, sku, type, watch, status, position, hours, stream) SELECT title, sku, type, 0, 1, 0, "
+        "period, '' "
+        "FROM product WHERE sku = ?",
+        {sku});
+    const int pass = call.database.LastId();
+    call.Standard();
+    call.xml.Element("PassID", pass)
+        .Element("TransactionId", pass + 5000)
+        .Element("TransactionAuthNum", "A" + std::to_string(pass));
+}
+
+void checkRentalExpiration(Call& call)
+{
+    const int pass = call.Int("PassId");
+    if (call.database.Int("SELECT COUNT(*) FROM pass WHERE id = ?", {pass}) == 0)
+        return call.Standard(1, "no such pass");
+    const int hours = call.database.Int("SELECT hours FROM pass WHERE id = ?", {pass});
+    call.Standard();
+    call.xml.Flag("ShouldDisplay", hours > 0 && hours < 48).Element("HoursRemaining", hours);
+}
+
+// ---- Parental control
+
+void checkAdultVerificationEnabled(Call& call)
+{
+    call.Standard();
+    call.xml.Flag("IsAdultVerificationEnabled", AccountInt(call, "adult_enabled"));
+}
+
+void checkAdultVerificationPin(Call& call)
+{
+    call.Standard();
+    call.xml.Flag("IsPinVerified", call.Text("Pin") == AccountText(call, "adult_pin"));
+}
+
+// ---- The account service alone
+
+void checkForPurchasedTitle(Call& call)
+{
+    call.xml.Raw(call.database.Int("SELECT COUNT(*) FROM pass WHERE title = ?", {call.Int("TitleID")}) ? "true"
+                                                                                                       : "false");
+}
+
+void getMyVideos(Call& call)
+{
+    WriteMyVideos(call);
+}
+
+}  // namespace
+
+const Operations& SharedOperations()
+{
+    using T = ChildType;
+    static const Operations operations = {
+        {"checkRentalExpiration", {{"PassId", T::Int}}, checkRentalExpiration},
+        {"GetCountryID", {}, GetCountryID, true},
+        {"getConfig", {}, getConfig},
+        {"checkAdultVerificationPin", {{"Pin", T::Text}}, checkAdultVerificationPin},
+        {"checkAdultVerificationEnabled", {}, checkAdultVerificationEnabled},
+        {"addItemToWishlist", {{"TitleID", T::Int}}, addItemToWishlist},
+        {"removeAllItemsFromWishList", {}, removeAllItemsFromWishList},
+        {"removeItemFromWishList", {{"TitleID", T::Int}}, removeItemFromWishList},
+        {"getWishlistItems",
+         {{"sortOrder", T::Int}, {"CurrentPageNumber", T::Int}, {"ItemsPerPage", T::Int}, {"TitleType", T::TitleType}},
+         getWishlistItems},
+        {"assignGiftCertificateToUser", {{"GiftCertificateCode", T::Text}}, assignGiftCertificateToUser},
+        {"getSettingsPageInfo", {}, getSettingsPageInfo},
+        {"getEmailAddress", {}, getEmailAddress},
+        {"showPrePaidCardBalance", {}, showPrePaidCardBalance},
+        {"getBillingInfo", {}, getBillingInfo},
+        {"doPurchaseSavedbilling",
+         {{"SkuID", T::Int}, {"IPAddress", T::Text}, {"UsePrePaidFunds", T::Text}},
+         doPurchaseSavedbilling},
+        {"authorizeDevice", {{"PIN", T::Text}}, authorizeDevice},
+        {"deactivateDevice", {}, deactivateDevice},
+        {"checkAuthToken", {{"AuthToken", T::Text}}, checkAuthToken, true},
+    };
+    return operations;
+}
+
+const Operations& AccountOperations()
+{
+    static const Operations operations = {
+        {"checkForPurchasedTitle", {{"TitleID", ChildType::Int}}, checkForPurchasedTitle, true},
+        {"getMyVideos", MyVideosChildren(), getMyVideos},
+    };
+    return operations;
+}

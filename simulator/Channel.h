@@ -1,0 +1,40 @@
+// One accepted connection, plain or TLS, as bytes in and out.
+#pragma once
+
+#include <openssl/ssl.h>
+
+#include <memory>
+#include <string>
+
+class Channel {
+public:
+    /// Owns the descriptor.
+    explicit Channel(int descriptor) : m_Descriptor(descriptor) {}
+    ~Channel();
+    Channel(const Channel&) = delete;
+    Channel& operator=(const Channel&) = delete;
+
+    /// The server's side of a TLS handshake; false when it fails.
+    bool Handshake(SSL_CTX* context);
+    bool IsTls() const { return m_Tls != nullptr; }
+    bool IsResumed() const { return m_Tls && SSL_session_reused(m_Tls.get()); }
+
+    /// At most `size` bytes; 0 at the end and on failure.
+    size_t Read(char* buffer, size_t size);
+    /// False when the peer is gone.
+    bool Write(const std::string& bytes);
+
+    /// Ends the connection in order, with TLS's own goodbye.
+    void Close();
+    /// Ends it by a reset, which the peer sees as a broken connection.
+    void Reset();
+
+    int Descriptor() const { return m_Descriptor; }
+
+private:
+    struct TlsFree {
+        void operator()(SSL* tls) const { SSL_free(tls); }
+    };
+    int m_Descriptor;
+    std::unique_ptr<SSL, TlsFree> m_Tls;
+};

@@ -1,0 +1,120 @@
+#include "PlainService.h"
+
+#include <cctype>
+#include <ctime>
+#include <sstream>
+
+namespace {
+
+constexpr size_t kBandwidthFile = 1000000;
+const char kLastModified[] = "Mon, 02 Nov 2026 06:00:00 GMT";
+const char kLaterModified[] = "Tue, 03 Nov 2026 06:00:00 GMT";
+
+// "11/21/2026 6:30:05 AM"; the service's clock is UTC.
+std::string Clock()
+{
+    const time_t now = time(nullptr);
+    tm parts;
+    gmtime_r(&now, &parts);
+    // 13 to 23 hours become 1 to 11 PM; 12 stays, as "12 PM" would be read as midnight.
+    const bool afternoon = parts.tm_hour > 12;
+    char text[80];
+    snprintf(text, sizeof text, "%d/%d/%d %d:%02d:%02d %s", parts.tm_mon + 1, parts.tm_mday, parts.tm_year + 1900,
+             afternoon ? parts.tm_hour - 12 : parts.tm_hour, parts.tm_min, parts.tm_sec, afternoon ? "PM" : "AM");
+    return text;
+}
+
+HttpResponse NotFound()
+{
+    HttpResponse response;
+    response.status = 404;
+    response.body = "not found";
+    return response;
+}
+
+// "/images/boxart/SIZE/PREFIXSIZE.jpg".
+HttpResponse BoxArt(const HttpRequest& request, const Fault& fault, LoggedRequest& log)
+{
+    const std::string path = UrlDecode(request.Path());
+    const size_t folder = path.find('/', 15);
+    const std::string size = folder == std::string::npos ? "" : path.substr(15, folder - 15);
+    std::string name = folder == std::string::npos ? "" : path.substr(folder + 1);
+    const std::string end = std::to_string(atoi(size.c_str())) + ".jpg";
+    if (name.size() <= end.size() || name.compare(name.size() - end.size(), end.size(), end) != 0) return NotFound();
+    name.resize(name.size() - end.size());
+    log.operation = name;
+    HttpResponse response;
+    response.headers = {{"Last-Modified", fault.Is("modified") ? kLaterModified : kLastModified}};
+    const bool known = request.Header("if-modified-since") == kLastModified && !fault.Is("modified");
+    if (known || fault.Is("not-modified")) {
+        response.status = 304;
+        return response;
+    }
+    // Prefixes of the catalogue: "ZV" and digits.
+    if (name.compare(0, 2, "ZV") != 0) return NotFound();
+    response.contentType = "image/jpeg";
+    response.body = MakeBoxArt(name, atoi(size.c_str()));
+    return response;
+}
+
+HttpResponse Discovery(const HttpRequest& request, int environment, LoggedRequest& log)
+{
+    for (const char* name : {"d", "dt"})
+        log.children.emplace_back(name, request.Parameter(name));
+    HttpResponse response;
+    response.body = std::to_string(environment);
+    if (request.Parameter("d").empty() || request.Parameter("dt").empty()) return NotFound();
+    return response;
+}
+
+}  // namespace
+
+std::string PlainServiceName(const std::string& path)
+{
+    if (path == "/device/env/") return "discovery";
+    if (path == "/device/time/") return "clock";
+    if (path == "/bandwidth/test.bin") return "bandwidth";
+    if (path.rfind("/images/boxart/", 0) == 0) return "boxart";
+    return "";
+}
+
+HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, const Fault& fault,
+                         LoggedRequest& log)
+{
+    log.service = service;
+    log.operation = service;
+    if (service == "discovery") return Discovery(request, environment, log);
+    if (service == "boxart") return BoxArt(request, fault, log);
+    HttpResponse response;
+    if (service == "clock") {
+        response.body = fault.Is("body") ? fault.value : Clock();
+    } else {
+        response.contentType = "application/octet-stream";
+        response.body.assign(kBandwidthFile, 'b');
+    }
+    return response;
+}
+
+HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log)
+{
+    HttpResponse response;
+    const std::string what = request.method + " " + request.Path();
+    if (what == "POST /control/faults") {
+        std::istringstream lines(request.body);
+        for (std::string line, error; std::getline(lines, line);) {
+            if (line.empty() || faults.Add(line, error)) continue;
+            response.status = 400;
+            response.body += error + "\n";
+        }
+    } else if (what == "DELETE /control/faults") {
+        faults.Clear();
+    } else if (what == "GET /control/log") {
+        response.contentType = "application/x-ndjson";
+        response.body = log.Json();
+    } else if (what == "DELETE /control/log") {
+        log.Clear();
+    } else {
+        return NotFound();
+    }
+    return response;
+}

@@ -1,0 +1,87 @@
+#include "RequestLog.h"
+
+#include <cstdio>
+
+namespace {
+
+std::string Quoted(const std::string& text)
+{
+    std::string quoted = "\"";
+    for (const unsigned char c : text) {
+        if (c == '"' || c == '\\') {
+            quoted += '\\';
+            quoted += static_cast<char>(c);
+        } else if (c < 0x20) {
+            char escape[8];
+            snprintf(escape, sizeof escape, "\\u%04x", c);
+            quoted += escape;
+        } else {
+            quoted += static_cast<char>(c);
+        }
+    }
+    return quoted + "\"";
+}
+
+std::string Pairs(const std::vector<std::pair<std::string, std::string>>& pairs)
+{
+    std::string text = "[";
+    for (const auto& pair : pairs) {
+        text += (text.size() > 1 ? ", [" : "[") + Quoted(pair.first) + ", " + Quoted(pair.second) + "]";
+    }
+    return text + "]";
+}
+
+std::string Line(const LoggedRequest& request)
+{
+    char numbers[160];
+    snprintf(numbers, sizeof numbers, "\"connection\": %lu, \"tls\": %s, \"resumed\": %s, \"time\": %.3f",
+             request.connection, request.tls ? "true" : "false", request.resumed ? "true" : "false", request.time);
+    return "{\"number\": " + std::to_string(request.number) + ", \"service\": " + Quoted(request.service) +
+           ", \"operation\": " + Quoted(request.operation) + ", " + numbers +
+           ", \"headers\": " + Pairs(request.headers) + ", \"children\": " + Pairs(request.children) +
+           ", \"fault\": " + Quoted(request.fault) + ", \"violation\": " + Quoted(request.violation) + "}\n";
+}
+
+}  // namespace
+
+void RequestLog::Add(LoggedRequest request)
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    request.number = ++m_Count;
+    m_Requests.push_back(std::move(request));
+    m_Changed.notify_all();
+}
+
+std::vector<LoggedRequest> RequestLog::All() const
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    return m_Requests;
+}
+
+void RequestLog::Clear()
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    m_Requests.clear();
+}
+
+bool RequestLog::WaitFor(size_t count) const
+{
+    std::unique_lock<std::mutex> lock(m_Mutex);
+    m_Changed.wait(lock, [&] { return m_Ended || m_Requests.size() >= count; });
+    return m_Requests.size() >= count;
+}
+
+void RequestLog::End()
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    m_Ended = true;
+    m_Changed.notify_all();
+}
+
+std::string RequestLog::Json() const
+{
+    std::string text;
+    for (const LoggedRequest& request : All())
+        text += Line(request);
+    return text;
+}

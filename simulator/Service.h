@@ -1,0 +1,79 @@
+// What the three SOAP services have in common: operations as rows, and what a row's handler gets.
+#pragma once
+
+#include <map>
+#include <string>
+#include <vector>
+
+#include "Database.h"
+#include "Xml.h"
+
+/// How a child of a request is checked.
+enum class ChildType {
+    Int,
+    Text,  ///< May be left out.
+    IntArray,
+    PurchaseType,
+    TitleType,
+    FileProfile,
+    AudioProfile,
+    BonusAssetType,
+    StreamStatus,
+    WatchStatus,
+};
+
+/// The texts of an enumeration in the order of its numbers; empty for the other types.
+const std::vector<std::string>& EnumTexts(ChildType type);
+
+struct Child {
+    const char* name;
+    ChildType type;
+};
+
+/// One request, checked: its children as texts and numbers.
+struct Arguments {
+    std::map<std::string, std::string> texts;
+    std::map<std::string, std::vector<int>> arrays;
+    std::map<std::string, int> numbers;  ///< Also the number behind each enumeration text.
+    bool Has(const char* name) const { return texts.count(name) != 0; }
+    int Int(const char* name) const { return numbers.at(name); }
+    std::string Text(const char* name) const { return Has(name) ? texts.at(name) : std::string(); }
+};
+
+/// What a handler works with. It writes the content of the result element.
+struct Call {
+    Database& database;
+    const Arguments& arguments;
+    XmlWriter& xml;
+    std::string address;  ///< "host:port" of the plain HTTP side, for addresses in answers.
+
+    int Int(const char* name) const { return arguments.Int(name); }
+    std::string Text(const char* name) const { return arguments.Text(name); }
+    /// The head of most results.
+    void Standard(int code = 0, const std::string& message = "OK") const
+    {
+        xml.Element("ResponseCode", code).Optional("ResponseMessage", message);
+    }
+};
+
+struct OperationRow {
+    const char* name;
+    std::vector<Child> children;
+    void (*handle)(Call& call);
+    bool bare = false;  ///< The result is no record: it has no response code.
+};
+using Operations = std::vector<OperationRow>;
+
+const Operations& BrowseOperations();
+/// On both the account and the stream service.
+const Operations& SharedOperations();
+const Operations& AccountOperations();
+const Operations& StreamOperations();
+
+struct ServiceRow {
+    const char* name;           ///< In the log.
+    const char* path;           ///< Of its endpoint, below "/api/".
+    const char* settingsBlock;  ///< The device-settings header it wants.
+    std::vector<const Operations*> operations;
+};
+const std::vector<ServiceRow>& Services();

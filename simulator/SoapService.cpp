@@ -1,0 +1,134 @@
+#include "SoapService.h"
+
+#include <array>
+
+namespace {
+
+const char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
+const char kSoap12[] = "http://www.w3.org/2003/05/soap-envelope";
+const char kXmlType[] = "text/xml; charset=utf-8";
+
+std::string Envelope(const std::string& header, const std::string& body, bool soap12)
+{
+    return std::string("<?xml version=\"1.0\" encoding=\"utf-8\"?><soap:Envelope xmlns:soap=\"") +
+           (soap12 ? kSoap12 : kSoap11) + "\">" + header + "<soap:Body>" + body + "</soap:Body></soap:Envelope>";
+}
+
+// Damages the first enumeration text of an answer.
+std::string WithUnknownEnum(std::string xml)
+{
+    for (const char* element : {"<PurchaseType>", "<AudioAssetProfile>", "<Status>", "<File_AccessType>"}) {
+        const size_t at = xml.find(element);
+        if (at != std::string::npos) return xml.insert(at + std::string(element).size(), "New_");
+    }
+    return xml;
+}
+
+// Whether the fault says that the request was not carried out.
+bool ClaimsFailure(const Fault& fault)
+{
+    static const std::array<const char*, 9> kHarmless = {
+        "", "soap12", "drip", "split", "long", "must-understand", "extra-header", "unknown-enum", "stall-body"};
+    for (const char* kind : kHarmless) {
+        if (fault.Is(kind)) return false;
+    }
+    return !fault.afterEffect;
+}
+
+}  // namespace
+
+const std::vector<std::string>& EnumTexts(ChildType type)
+{
+    static const std::map<ChildType, std::vector<std::string>> texts = {
+        {ChildType::PurchaseType, {"rent", "buy", "any"}},
+        {ChildType::TitleType, {"any", "tv", "movies"}},
+        {ChildType::FileProfile,
+         {"UNKNOWN", "STANDARD", "HIGH_DEFINITION", "PORTABLE", "PORTABLE_STANDARD", "TEMP5", "PORTABLE_WIDE",
+          "STANDARD_DEFINITION_3D", "HIGH_DEFINITION_3D", "STANDARD_DEFINITION_REALD_3D", "HIGH_DEFINITION_REALD_3D"}},
+        {ChildType::AudioProfile,
+         {"Stereo_Standard", "Dolby_Stereo_AC3", "Dolby_Digital_Plus_Stereo", "Dolby_Digital_Plus_51",
+          "DTS_Express_Stereo", "DTS_Express_51"}},
+        {ChildType::BonusAssetType, {"Trailer"}},
+        {ChildType::StreamStatus, {"play", "stopped", "paused", "resumeplay", "errorinplayback"}},
+        {ChildType::WatchStatus, {"WatchNow", "RentAgain", "NotAvailable", "Undefined"}},
+    };
+    static const std::vector<std::string> none;
+    const auto found = texts.find(type);
+    return found == texts.end() ? none : found->second;
+}
+
+const std::vector<ServiceRow>& Services()
+{
+    static const std::vector<ServiceRow> services = {
+        {"browse", "RealTimeBrowse.asmx", "DeviceSettings", {&BrowseOperations()}},
+        {"account", "DownloadAPI.asmx", "DownloadDeviceRequestSettings", {&SharedOperations(), &AccountOperations()}},
+        {"stream", "StreamAPI.asmx", "StreamDeviceRequestSettings", {&SharedOperations(), &StreamOperations()}},
+    };
+    return services;
+}
+
+const ServiceRow* SoapService::Find(const std::string& path)
+{
+    for (const ServiceRow& service : Services()) {
+        for (const char* base : {"/api/", "/kac/api/"}) {
+            if (path == std::string(base) + service.path) return &service;
+        }
+    }
+    return nullptr;
+}
+
+std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& fault)
+{
+    XmlWriter xml;
+    Call call{m_Database, checked.arguments, xml, m_PlainAddress};
+    const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
+    if (ClaimsFailure(fault)) {
+        m_Database.Run("SAVEPOINT request");
+        checked.operation->handle(call);
+        m_Database.Run("ROLLBACK TO request");
+        m_Database.Run("RELEASE request");
+    } else {
+        checked.operation->handle(call);
+    }
+    if (!fault.Is("code")) return xml.Text();
+    XmlWriter refusal;
+    Call refused{m_Database, checked.arguments, refusal, m_PlainAddress};
+    refused.Standard(fault.Number(1), "refused as asked");
+    return refusal.Text();
+}
+
+HttpResponse SoapService::Respond(const CheckedRequest& checked, const Fault& fault)
+{
+    const std::string name = checked.operation->name;
+    std::string result = RunHandler(checked, fault);
+    if (fault.Is("fault11") || fault.Is("fault12")) return Refuse("Server", "the shop is closed", fault.Is("fault12"));
+    if (fault.Is("unknown-enum")) result = WithUnknownEnum(result);
+
+    std::string body = "<" + name + "Response xmlns=\"http://api.zorvane.example/api/\">";
+    if (!fault.Is("missing-result")) body += "<" + name + "Result>" + result + "</" + name + "Result>";
+    body += "</" + name + "Response>";
+    std::string header;
+    if (fault.Is("must-understand") || fault.Is("extra-header")) {
+        header = std::string("<soap:Header><x:Trace xmlns:x=\"urn:trace\"") +
+                 (fault.Is("must-understand") ? " soap:mustUnderstand=\"1\"" : "") + ">1</x:Trace></soap:Header>";
+    }
+    HttpResponse response;
+    response.contentType = fault.Is("soap12") ? "application/soap+xml; charset=utf-8" : kXmlType;
+    response.body = Envelope(header, body, fault.Is("soap12"));
+    return response;
+}
+
+HttpResponse SoapService::Refuse(const std::string& code, const std::string& text, bool soap12)
+{
+    HttpResponse response;
+    response.status = 500;
+    response.contentType = soap12 ? "application/soap+xml; charset=utf-8" : kXmlType;
+    const std::string fault =
+        soap12 ? "<soap:Fault><soap:Code><soap:Value>soap:" + std::string(code == "Client" ? "Sender" : "Receiver") +
+                     "</soap:Value></soap:Code><soap:Reason><soap:Text xml:lang=\"en\">" + XmlEscape(text) +
+                     "</soap:Text></soap:Reason></soap:Fault>"
+               : "<soap:Fault><faultcode>soap:" + code + "</faultcode><faultstring>" + XmlEscape(text) +
+                     "</faultstring></soap:Fault>";
+    response.body = Envelope("", fault, soap12);
+    return response;
+}

@@ -1,0 +1,36 @@
+// Answers SOAP requests: checks, handler, envelope, and the faults that are about the message.
+#pragma once
+
+#include "Faults.h"
+#include "RequestCheck.h"
+
+class SoapService {
+public:
+    SoapService(Database& database, std::string plainAddress)
+        : m_Database(database), m_Check(database), m_PlainAddress(std::move(plainAddress))
+    {}
+
+    /// The service behind a path, or null.
+    static const ServiceRow* Find(const std::string& path);
+
+    /// `takeFault(operation)` gives the fault to apply.
+    template <class TakeFault>
+    HttpResponse Answer(const HttpRequest& request, const ServiceRow& service, const std::string& endpoint,
+                        LoggedRequest& log, TakeFault takeFault)
+    {
+        CheckedRequest checked;
+        log.service = service.name;
+        log.violation = m_Check.Check(request, service, endpoint, checked, log);
+        const Fault fault = takeFault(log.operation);
+        return log.violation.empty() ? Respond(checked, fault) : Refuse("Client", log.violation, false);
+    }
+
+private:
+    HttpResponse Respond(const CheckedRequest& checked, const Fault& fault);
+    std::string RunHandler(const CheckedRequest& checked, const Fault& fault);
+    static HttpResponse Refuse(const std::string& code, const std::string& text, bool soap12);
+
+    Database& m_Database;
+    RequestCheck m_Check;
+    std::string m_PlainAddress;
+};

@@ -1,0 +1,81 @@
+// The storefront of one machine: SOAP services and discovery over HTTPS; box art, clock, bandwidth file and control
+// over plain HTTP.
+//
+// It runs on threads of its own from Start to destruction. Every member may be called from any thread.
+#pragma once
+
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+/// What the server certificate is like. All but Good must make a careful client refuse.
+enum class CertificateKind { Good, Untrusted, Expired, WrongName, WideWildcard, NameOnly };
+
+/// What the simulator accepts and knows without being told; also written to "account.txt" beside the deployment file.
+struct StorefrontAccount {
+    static constexpr char kUser[] = "customer";
+    static constexpr char kPassword[] = "secret";
+    static constexpr char kApiKey[] = "desktop";
+    static constexpr char kAdultPin[] = "0042";
+    static constexpr char kActivationPin[] = "123456";  ///< "000000" locks the device out.
+};
+
+struct StorefrontOptions {
+    std::string dataFolder;  ///< Database, certificates and deployment file; made when absent. Empty: a temporary one.
+    int httpsPort = 0;       ///< 0: a free one.
+    int httpPort = 0;
+    int latency = 0;  ///< Milliseconds before every answer.
+    CertificateKind certificate = CertificateKind::Good;
+    bool oldTls = false;  ///< At most TLS 1.1.
+    bool gzip = true;     ///< Compress answers for clients that accept it.
+    int environment = 2;  ///< What discovery answers.
+    std::vector<std::string> faults;
+};
+
+struct LoggedRequest {
+    unsigned long number = 0;
+    std::string service;  ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart" or "connect".
+    std::string operation;  ///< SOAP operation; the service's name for the others; the prefix for box art.
+    std::vector<std::pair<std::string, std::string>> headers;  ///< HTTP headers, names in lower case.
+    std::vector<std::pair<std::string, std::string>>
+        children;  ///< The request's, in order; passwords and PINs as "***".
+    unsigned long connection = 0;
+    bool tls = false;
+    bool resumed = false;   ///< TLS session resumed.
+    double time = 0;        ///< Seconds since the start.
+    std::string fault;      ///< The fault that was applied.
+    std::string violation;  ///< Why the request was refused.
+};
+
+class Storefront {
+public:
+    /// Starts to serve. Null after `error` got one line that names the port, file or folder and what to do.
+    static std::unique_ptr<Storefront> Start(const StorefrontOptions& options, std::string& error);
+    virtual ~Storefront() = default;
+
+    virtual int HttpsPort() const = 0;
+    virtual int HttpPort() const = 0;
+    virtual std::string DataFolder() const = 0;
+    virtual std::string DeploymentFile() const = 0;
+
+    /// Adds a fault in the form that HelpOnFaults tells. False, with the reason, when it is not one.
+    virtual bool AddFault(const std::string& text, std::string& error) = 0;
+    virtual void ClearFaults() = 0;
+
+    virtual std::vector<LoggedRequest> Log() const = 0;
+    virtual void ClearLog() = 0;
+    /// Waits until the log holds that many requests; false when the simulator ends first.
+    virtual bool WaitForRequests(size_t count) const = 0;
+
+    virtual void SetLatency(int milliseconds) = 0;
+    /// Changes what the next connections see.
+    virtual void SetCertificate(CertificateKind kind) = 0;
+
+    /// The one value of a query on the database, as text: what tests compare results with.
+    virtual std::string Query(const std::string& sql) const = 0;
+    /// All rows of a query.
+    virtual std::vector<std::vector<std::string>> Rows(const std::string& sql) const = 0;
+
+    static std::string HelpOnFaults();
+};

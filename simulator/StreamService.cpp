@@ -1,0 +1,247 @@
+// The stream service: playback, and the operations that streaming devices have to themselves.
+#include "PurchaseList.h"
+
+namespace {
+
+std::string EnumText(ChildType type, int number)
+{
+    return EnumTexts(type).at(static_cast<size_t>(number));
+}
+
+// ---- Lists of purchases
+
+void getMyStreamingVideos(Call& call)
+{
+    WriteMyVideos(call);
+}
+
+void getTitleListingsPurchasedForPasses(Call& call)
+{
+    for (const int pass : call.arguments.arrays.at("Passes")) {
+        const int title = call.database.Int("SELECT title FROM pass WHERE id = ?", {pass});
+        if (title == 0) continue;
+        call.xml.Group("TitleListingPurchasedForPass", [&] {
+            WritePurchased(call, title, pass, 1);
+            call.Standard();
+        });
+    }
+}
+
+void WriteFlag(Call& call, const char* where, int value)
+{
+    call.xml.Raw(call.database.Int(std::string("SELECT COUNT(*) FROM pass WHERE ") + where, {value}) ? "true"
+                                                                                                     : "false");
+}
+
+void checkForPurchasedStream(Call& call)
+{
+    WriteFlag(call, "sku = ?", call.Int("SkuID"));
+}
+void checkForPurchasedStreamByTitleID(Call& call)
+{
+    WriteFlag(call, "title = ?", call.Int("TitleID"));
+}
+
+void removeAllMyPurchases(Call& call)
+{
+    if (call.Text("password") != call.database.Text("SELECT password FROM account"))
+        return call.Standard(1, "wrong password");
+    call.database.Run("DELETE FROM pass");
+    call.Standard();
+}
+
+// ---- Playback
+
+void WriteLocation(Call& call, const std::string& file, int asset, const std::string& stream, int status, int position)
+{
+    const std::string base = "http://" + call.address;
+    call.Standard();
+    call.xml.Element("StreamingAssetLocation", base + "/media/" + file)
+        .Element("AssetID", asset)
+        .Element("StreamID", stream);
+    call.xml.Element("DRMServerURL", base + "/drm/licence").Element("DRMACKServerURL", base + "/drm/ack");
+    call.xml.Element("Status", EnumText(ChildType::StreamStatus, status)).Element("StartTimeSeconds", position);
+    call.xml.Element("HeartbeatURL", base + "/heartbeat?stream=" + stream).Element("HeartbeatPollInSeconds", 60);
+}
+
+void LocatePass(Call& call, bool resume)
+{
+    const int pass = call.Int("PassID");
+    bool found = false;
+    call.database.Each("SELECT title, status, position FROM pass WHERE id = ?", {pass}, [&](const Database::Row& row) {
+        found = true;
+        const std::string stream = "stream-" + std::to_string(pass);
+        const std::string profile = call.Text("FileProfile");
+        WriteLocation(call, row.Text(0) + "-" + profile + ".mp4", pass * 100 + call.Int("FileProfile"), stream,
+                      row.Int(1), resume ? row.Int(2) : 0);
+    });
+    if (!found) return call.Standard(2, "no such pass");
+    call.database.Run("UPDATE pass SET stream = 'stream-' || id WHERE id = ?", {pass});
+}
+
+void getStreamingAssetLocation(Call& call)
+{
+    LocatePass(call, false);
+}
+void loadLastStreamingAssetLocationForPass(Call& call)
+{
+    LocatePass(call, true);
+}
+
+void getBonusAssetLocation(Call& call)
+{
+    const int bonus = call.Int("BonusAssetID");
+    if (call.database.Int("SELECT COUNT(*) FROM bonus WHERE id = ?", {bonus}) == 0)
+        return call.Standard(2, "no such trailer");
+    WriteLocation(call, "trailer-" + std::to_string(bonus) + ".mp4", bonus, "trailer-" + std::to_string(bonus), 0, 0);
+}
+
+void manageStreamInstanceStatus(Call& call)
+{
+    const std::string stream = call.Text("StreamID");
+    const bool known = stream.rfind("trailer-", 0) == 0 ||
+                       call.database.Run("UPDATE pass SET status = ?, position = ? WHERE stream = ?",
+                                         {call.Int("Status"), call.Int("StopTimeSeconds"), stream}) == 1;
+    call.Standard(known ? 0 : 1, known ? "OK" : "no such stream");
+}
+
+void getTHXMediaDirector(Call& call)
+{
+    if (call.database.Int("SELECT COUNT(*) FROM pass WHERE id = ?", {call.Int("PassID")}) == 0) {
+        return call.Standard(2, "no such pass");
+    }
+    call.Standard();
+    call.xml.Element("LongFormat", "THX-LONG-" + call.Text("AudioSetting")).Element("ShortFormat", "THX-S");
+}
+
+void getTHXMediaDirectorBonusAsset(Call& call)
+{
+    if (call.database.Int("SELECT COUNT(*) FROM bonus WHERE id = ?", {call.Int("BonusAssetID")}) == 0) {
+        return call.Standard(2, "no such trailer");
+    }
+    call.Standard();
+    call.xml.Element("LongFormat", "THX-LONG-" + call.Text("BonusAssetType")).Element("ShortFormat", "THX-S");
+}
+
+// ---- Settings, tax, reports
+
+void setAudioDefaultProperty(Call& call)
+{
+    call.database.Run("UPDATE account SET audio = ?", {call.Int("AudioSetting")});
+    call.Standard();
+}
+
+void getAudioDefaultProperty(Call& call)
+{
+    call.xml.Raw(EnumText(ChildType::AudioProfile, call.database.Int("SELECT audio FROM account")));
+}
+
+void calcOrderTax(Call& call)
+{
+    const std::string price = call.database.Text("SELECT price FROM product WHERE sku = ?", {call.Int("SKUID")});
+    if (price.empty()) return call.Standard(1, "no such product");
+    call.Standard();
+    call.xml.Element("SubTotal", price).Element("TotalPrice", price).Element("Tax", "0.00");
+}
+
+void getBillingInfoAndPPCBalance(Call& call)
+{
+    call.xml.Group("BillingInfo", [&] {
+        call.Standard();
+        call.xml.Element("CCLastFour", call.database.Text("SELECT card FROM account"));
+        call.xml.Element("CCTypeId", call.database.Int("SELECT card_type FROM account"));
+        call.xml.Element("CCType", call.database.Text("SELECT card_name FROM account"));
+    });
+    call.xml.Group("PPCardBalance", [&] {
+        call.Standard();
+        call.xml.Element("Balance", call.database.Int("SELECT prepaid FROM account"));
+    });
+}
+
+void Report(Call& call, const char* kind)
+{
+    call.database.Run("INSERT INTO report VALUES (?)", {kind});
+    call.Standard();
+}
+
+void ReturnTimeout(Call& call)
+{
+    Report(call, "timeout");
+}
+void ReturnError(Call& call)
+{
+    Report(call, "error");
+}
+
+}  // namespace
+
+void WritePurchaseList(Call& call, const std::string& from, const std::string& titleColumn,
+                       const std::string& passColumn, const std::string& order)
+{
+    const int page = call.Int("CurrentPageNumber");
+    const int perPage = call.Int("ItemsPerPage");
+    if (page < 1 || perPage < 1) return call.Standard(2, "pages start at 1 and hold an item");
+    int position = (page - 1) * perPage;
+    call.Standard();
+    call.xml.Group("Titles", [&] {
+        call.database.Each("SELECT " + titleColumn + ", " + passColumn + " FROM " + from + " ORDER BY " + order +
+                               " LIMIT " + std::to_string(perPage) + " OFFSET " + std::to_string(position),
+                           {}, [&](const Database::Row& row) {
+                               call.xml.Group("TitleListingPurchased",
+                                              [&] { WritePurchased(call, row.Int(0), row.Int(1), ++position); });
+                           });
+    });
+    WritePage(call, page, perPage, call.database.Int("SELECT COUNT(*) FROM " + from));
+}
+
+void WriteMyVideos(Call& call)
+{
+    static const char* const kByType[] = {"", " AND is_tv = 1", " AND is_tv = 0"};
+    std::string from = "pass JOIN title ON title.id = pass.title WHERE 1" + std::string(kByType[call.Int("TitleType")]);
+    if (call.Int("PurchaseType") != 2) from += " AND type = " + std::to_string(call.Int("PurchaseType"));
+    if (call.Int("WatchStatusFilter") != 3) from += " AND watch = " + std::to_string(call.Int("WatchStatusFilter"));
+    WritePurchaseList(call, from, "pass.title", "pass.id", "pass.id");
+}
+
+const std::vector<Child>& MyVideosChildren()
+{
+    using T = ChildType;
+    static const std::vector<Child> children = {{"CurrentPageNumber", T::Int},
+                                                {"ItemsPerPage", T::Int},
+                                                {"PurchaseType", T::PurchaseType},
+                                                {"TitleType", T::TitleType},
+                                                {"WatchStatusFilter", T::WatchStatus}};
+    return children;
+}
+
+const Operations& StreamOperations()
+{
+    using T = ChildType;
+    static const std::vector<Child> passAndProfile = {{"PassID", T::Int}, {"FileProfile", T::FileProfile}};
+    static const Operations operations = {
+        {"getTHXMediaDirectorBonusAsset",
+         {{"BonusAssetID", T::Int}, {"FileProfile", T::FileProfile}, {"BonusAssetType", T::BonusAssetType}},
+         getTHXMediaDirectorBonusAsset},
+        {"getTHXMediaDirector",
+         {passAndProfile[0], passAndProfile[1], {"AudioSetting", T::AudioProfile}},
+         getTHXMediaDirector},
+        {"setAudioDefaultProperty", {{"AudioSetting", T::AudioProfile}}, setAudioDefaultProperty},
+        {"getAudioDefaultProperty", {}, getAudioDefaultProperty, true},
+        {"calcOrderTax", {{"SKUID", T::Int}}, calcOrderTax},
+        {"ReturnTimeout", {}, ReturnTimeout},
+        {"ReturnError", {}, ReturnError},
+        {"removeAllMyPurchases", {{"password", T::Text}}, removeAllMyPurchases},
+        {"loadLastStreamingAssetLocationForPass", passAndProfile, loadLastStreamingAssetLocationForPass},
+        {"getBonusAssetLocation", {{"BonusAssetID", T::Int}}, getBonusAssetLocation},
+        {"getStreamingAssetLocation", passAndProfile, getStreamingAssetLocation},
+        {"manageStreamInstanceStatus",
+         {{"StreamID", T::Text}, {"Status", T::StreamStatus}, {"StopTimeSeconds", T::Int}},
+         manageStreamInstanceStatus},
+        {"getBillingInfoAndPPCBalance", {}, getBillingInfoAndPPCBalance, true},
+        {"checkForPurchasedStream", {{"SkuID", T::Int}}, checkForPurchasedStream, true},
+        {"checkForPurchasedStreamByTitleID", {{"TitleID", T::Int}}, checkForPurchasedStreamByTitleID, true},
+        {"getTitleListingsPurchasedForPasses", {{"Passes", T::IntArray}}, getTitleListingsPurchasedForPasses, true},
+        {"getMyStreamingVideos", MyVideosChildren(), getMyStreamingVideos},
+    };
+    return operations;
+}

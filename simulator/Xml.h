@@ -1,0 +1,29 @@
+// Writes XML: elements of the service's namespace, which is the default one of every answer's body.
+#pragma once
+
+#include <functional>
+#include <string>
+
+std::string XmlEscape(const std::string& text);
+
+class XmlWriter {
+public:
+    const std::string& Text() const { return m_Text; }
+
+    XmlWriter& Element(const char* name, const std::string& text);
+    XmlWriter& Element(const char* name, const char* text) { return Element(name, std::string(text)); }
+    XmlWriter& Element(const char* name, int number) { return Element(name, std::to_string(number)); }
+    XmlWriter& Flag(const char* name, bool value) { return Element(name, value ? "true" : "false"); }
+    /// Left out when the text is empty, as the service does with what it does not know.
+    XmlWriter& Optional(const char* name, const std::string& text)
+    {
+        return text.empty() ? *this : Element(name, text);
+    }
+    XmlWriter& Group(const char* name, const std::function<void()>& content);
+    /// An element without content; `attributes` as they stand in the tag.
+    XmlWriter& Empty(const char* name, const std::string& attributes);
+    XmlWriter& Raw(const std::string& xml);
+
+private:
+    std::string m_Text;
+};

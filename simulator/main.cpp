@@ -1,0 +1,139 @@
+// zv_storefront: the storefront simulator as a program.
+#include <signal.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+
+#include "Storefront.h"
+
+namespace {
+
+const struct {
+    const char* name;
+    CertificateKind kind;
+} kCertificates[] = {{"good", CertificateKind::Good},
+                     {"untrusted", CertificateKind::Untrusted},
+                     {"expired", CertificateKind::Expired},
+                     {"wrong-name", CertificateKind::WrongName},
+                     {"wide-wildcard", CertificateKind::WideWildcard},
+                     {"name-only", CertificateKind::NameOnly}};
+
+bool ReadNumber(const char* text, int most, int& number)
+{
+    char* end = nullptr;
+    const long value = strtol(text, &end, 10);
+    number = static_cast<int>(value);
+    return *text && !*end && value >= 0 && value <= most;
+}
+
+bool ReadCertificate(const char* text, StorefrontOptions& options)
+{
+    for (const auto& row : kCertificates) {
+        if (strcmp(row.name, text) != 0) continue;
+        options.certificate = row.kind;
+        return true;
+    }
+    return false;
+}
+
+struct Option {
+    const char* name;
+    const char* argument;  // null: a switch
+    const char* help;
+    bool (*read)(const char* text, StorefrontOptions& options);
+};
+
+const Option kOptions[] = {
+    {"--data", "DIR", "database, certificates, deployment file; kept (default: a temporary folder, removed at the end)",
+     [](const char* text, StorefrontOptions& o) { return !(o.dataFolder = text).empty(); }},
+    {"--https-port", "N", "port of the SOAP services and discovery (default 0: a free one)",
+     [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.httpsPort); }},
+    {"--http-port", "N", "port of box art, clock, bandwidth file and control (default 0: a free one)",
+     [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.httpPort); }},
+    {"--latency", "MS", "wait before every answer",
+     [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 600000, o.latency); }},
+    {"--environment", "N", "what discovery answers, 0 to 9 (default 2: production)",
+     [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 9, o.environment); }},
+    {"--certificate", "KIND", "good, untrusted, expired, wrong-name, wide-wildcard or name-only", ReadCertificate},
+    {"--old-tls", nullptr, "TLS 1.1 at most", [](const char*, StorefrontOptions& o) { return o.oldTls = true; }},
+    {"--no-gzip", nullptr, "never compress answers",
+     [](const char*, StorefrontOptions& o) { return !(o.gzip = false); }},
+    {"--fault", "SPEC", "a fault, see below; may be given again",
+     [](const char* text, StorefrontOptions& o) { return o.faults.emplace_back(text), true; }},
+};
+
+void PrintHelp()
+{
+    printf("zv_storefront: the storefront's services on this machine.\n\nOptions:\n");
+    for (const Option& option : kOptions) {
+        printf("  %-13s %-5s %s\n", option.name, option.argument ? option.argument : "", option.help);
+    }
+    printf("  %-13s %-5s %s\n\n", "--help", "", "this text");
+    printf(
+        "Account: user \"%s\", password \"%s\", API key \"%s\", adult PIN %s, activation PIN %s (000000 locks out), "
+        "gift\n"
+        "codes GIFT1 to GIFT5. Products 9001 to 9022 refuse to be bought with response code 1 to 22.\n\n",
+        StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey,
+        StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin);
+    printf("%s\n", Storefront::HelpOnFaults().c_str());
+    printf(
+        "Control, on the plain HTTP port: POST /control/faults (a fault a line), DELETE /control/faults,\n"
+        "GET /control/log (a JSON object a line), DELETE /control/log.\n\n"
+        "Not checked: whether a device is activated before it buys, the value of AuthToken in the device settings, the "
+        "user\n"
+        "agent's text, unused namespace declarations, and anything behind the addresses of streams and licences.\n");
+}
+
+// 0 to go on, else the exit code (-1: help was printed).
+int ReadArguments(int argc, char** argv, StorefrontOptions& options)
+{
+    for (int i = 1; i < argc; ++i) {
+        if (strcmp(argv[i], "--help") == 0) {
+            PrintHelp();
+            return -1;
+        }
+        const Option* option = nullptr;
+        for (const Option& row : kOptions) {
+            if (strcmp(row.name, argv[i]) == 0) option = &row;
+        }
+        if (!option) {
+            fprintf(stderr, "zv_storefront: unknown option %s; --help lists them\n", argv[i]);
+            return 2;
+        }
+        const char* text = option->argument ? argv[++i] : "";
+        if (!text || !option->read(text, options)) {
+            fprintf(stderr, "zv_storefront: %s needs %s: %s\n", option->name, option->argument, option->help);
+            return 2;
+        }
+    }
+    return 0;
+}
+
+}  // namespace
+
+int main(int argc, char** argv)
+{
+    StorefrontOptions options;
+    if (const int code = ReadArguments(argc, argv, options)) return code < 0 ? 0 : code;
+    // Blocked before any thread starts, so that every thread leaves them to sigwait below.
+    sigset_t ends;
+    sigemptyset(&ends);
+    sigaddset(&ends, SIGTERM);
+    sigaddset(&ends, SIGINT);
+    pthread_sigmask(SIG_BLOCK, &ends, nullptr);
+
+    std::string error;
+    const std::unique_ptr<Storefront> storefront = Storefront::Start(options, error);
+    if (!storefront) {
+        fprintf(stderr, "zv_storefront: %s\n", error.c_str());
+        return 1;
+    }
+    printf("https port %d\nhttp port %d\ndeployment file %s\nready\n", storefront->HttpsPort(), storefront->HttpPort(),
+           storefront->DeploymentFile().c_str());
+    fflush(stdout);
+    int received;
+    sigwait(&ends, &received);
+    return 0;
+}
