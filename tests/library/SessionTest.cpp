@@ -1,0 +1,214 @@
+#include <openssl/rand.h>
+
+#include <fstream>
+
+#include "Store.h"
+
+namespace {
+
+using Session = Store;
+
+TEST_F(Session, SetupIsValidatedBeforeAnythingIsSent)
+{
+    const std::string id350(350, 'd'), id351(351, 'd');
+    const struct {
+        const char* what;
+        void (*change)(ZV_WS_SetupParams&, const std::string&, const std::string&);
+        ZV_WS_Status status;
+    } rows[] = {
+        {"no key", [](auto& s, auto&, auto&) { s.APIKey = nullptr; }, ZV_WS_Status_invalid_param},
+        {"empty key", [](auto& s, auto&, auto&) { s.APIKey = ""; }, ZV_WS_Status_invalid_param},
+        {"no id", [](auto& s, auto&, auto&) { s.DestinationUniqueID = ""; }, ZV_WS_Status_invalid_param},
+        {"no user", [](auto& s, auto&, auto&) { s.UserName = nullptr; }, ZV_WS_Status_invalid_param},
+        {"no password", [](auto& s, auto&, auto&) { s.Password = ""; }, ZV_WS_Status_invalid_param},
+        {"longest id", [](auto& s, auto& id, auto&) { s.DestinationUniqueID = id.c_str(); }, ZV_WS_Status_ok},
+        {"too long id", [](auto& s, auto&, auto& id) { s.DestinationUniqueID = id.c_str(); }, ZV_WS_Status_invalid_param},
+        {"file cache without path", [](auto& s, auto&, auto&) { s.CacheParam.Type = CacheType_File; }, ZV_WS_Status_invalid_param},
+        {"small cache", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_Memory, 1, 358399, nullptr}; },
+         ZV_WS_Status_invalid_param},
+        {"smallest cache", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_Memory, 1, 358400, nullptr}; }, ZV_WS_Status_ok},
+        {"unlimited cache", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_Memory, 1, 0, nullptr}; }, ZV_WS_Status_ok},
+        {"no cache, any limit", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_None, 1, 5, nullptr}; }, ZV_WS_Status_ok},
+        {"folder below a file",
+         [](auto& s, auto&, auto&) {
+             s.CacheParam = {CacheType_File, 1, 0, "/dev/null/cache"};
+         },
+         ZV_WS_Status_failed_to_create_cache_folder},
+        {"line end in a header value", [](auto& s, auto&, auto&) { s.ModelCode = "X\r\nEvil: 1"; }, ZV_WS_Status_invalid_param},
+    };
+    for (const auto& row : rows) {
+        store->ClearLog();
+        ZV_WS_SetupParams setup = Setup();
+        row.change(setup, id350, id351);
+        EXPECT_EQ(row.status, Initialize(setup)) << row.what;
+        EXPECT_EQ(row.status == ZV_WS_Status_ok, session._pImpl != nullptr) << row.what;
+        EXPECT_EQ(row.status == ZV_WS_Status_ok, !store->Log().empty()) << row.what;
+        ZV_WS_release(&session);
+    }
+}
+
+TEST_F(Session, DiscoveryAsksTheDeviceEnvironment)
+{
+    ZV_WS_SetupParams setup = Setup();
+    setup.FirmwareRevision = "F";
+    setup.ApplicationRevision = "A";
+    setup.ModelCode = "X1";
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+    const std::vector<LoggedRequest> log = store->Log();
+    ASSERT_EQ(1u, log.size());
+    const std::vector<std::pair<std::string, std::string>> parameters = {{"d", "test/device 1"}, {"dt", "48"}};
+    EXPECT_EQ(parameters, log[0].children);
+    // This order, and nothing else.
+    ASSERT_EQ(2u, log[0].headers.size());
+    EXPECT_EQ(std::make_pair(std::string("user-agent"), std::string("ZVWSLib")), log[0].headers[0]);
+    EXPECT_EQ("host", log[0].headers[1].first);
+
+    ZV_WS_EnvID env = ENVID_APISTG;
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getDeviceEnv(&session, &env));
+    EXPECT_EQ(ENVID_PRODUCTION, env);
+    Owned<ZV_WS_String> text;
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getUserAgent(&session, &text));
+    EXPECT_STREQ("ZVSDK: F|A ZVMODEL:X1", text.data);
+    Owned<ZV_WS_FileType> type;
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getFileType(&session, &type));
+    const auto headers = store->Log().back().headers;
+    EXPECT_NE(headers.end(), std::find(headers.begin(), headers.end(),
+                                       std::make_pair(std::string("user-agent"), std::string("ZVSDK: F|A ZVMODEL:X1"))));
+}
+
+// Every answer that is not exactly one digit is production; no answer at all is a failure.
+TEST_F(Session, DiscoveryAnswers)
+{
+    const struct {
+        const char* fault;
+        ZV_WS_Status status;
+        int env;
+    } rows[] = {{"discovery=ok", ZV_WS_Status_ok, 7},           {"discovery=http:404", ZV_WS_Status_ok, 2},
+                {"discovery=garbage", ZV_WS_Status_ok, 2},      {"discovery=no-length", ZV_WS_Status_ok, 2},
+                {"discovery=split:200", ZV_WS_Status_ok, 2},    {"discovery=cut", ZV_WS_Status_ok, 2},
+                {"connect=close", ZV_WS_Status_connection_error, 0}, {"connect=reset", ZV_WS_Status_connection_error, 0}};
+    StorefrontOptions options;
+    options.environment = 7;
+    options.gzip = false;
+    Open(options);
+    for (const auto& row : rows) {
+        Fault(row.fault);
+        ASSERT_EQ(row.status, Initialize()) << row.fault;
+        ZV_WS_EnvID env = ENVID_APISTG;
+        ZV_WS_getDeviceEnv(&session, &env);
+        EXPECT_EQ(row.env, env) << row.fault;
+        ZV_WS_release(&session);
+    }
+}
+
+TEST_F(Session, NamedEnvironmentsNeedNoDiscovery)
+{
+    for (const ZV_WS_EnvNum env : {ENVNUM_APISTG, ENVNUM_INTERNALSTG, ENVNUM_PRODUCTION}) {
+        ZV_WS_SetupParams setup = Setup();
+        setup.EnvNum = env;
+        ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+        Owned<ZV_WS_GenreArray> genres;
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getNavigation(&session, &genres));
+        ZV_WS_release(&session);
+    }
+    for (const LoggedRequest& request : store->Log()) EXPECT_EQ("browse", request.service);
+}
+
+TEST_F(Session, UnknownAccessTypeIsAsked)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize(Setup(ACCESS_TYPE_UNKNOWN)));
+    EXPECT_EQ(std::vector<std::string>{"getFileType"}, Asked());
+    ZV_WS_release(&session);
+    Fault("getFileType=http:503");
+    EXPECT_EQ(ZV_WS_Status_ok, Initialize(Setup(ACCESS_TYPE_UNKNOWN)));
+}
+
+TEST_F(Session, OnlyATrustedCertificateOfTheRightNameIsSpokenTo)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize());
+    for (const CertificateKind kind : {CertificateKind::Untrusted, CertificateKind::Expired, CertificateKind::WrongName,
+                                       CertificateKind::WideWildcard, CertificateKind::NameOnly}) {
+        store->SetCertificate(kind);
+        ZV_WS_Session strict;
+        ZV_WS_SetupParams setup = Setup();
+        EXPECT_EQ(ZV_WS_Status_connection_error, ZV_WS_initialize(&strict, &setup)) << static_cast<int>(kind);
+        setup.EnvNum = ENVNUM_PRODUCTION;
+        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_initialize(&strict, &setup));
+        store->ClearLog();
+        Owned<ZV_WS_GenreArray> genres;
+        EXPECT_EQ(-5030, ZV_WS_getNavigation(&strict, &genres)) << static_cast<int>(kind);
+        EXPECT_EQ(0u, genres.size);
+        EXPECT_TRUE(store->Log().empty()) << static_cast<int>(kind);
+        // The same session works as soon as the service does.
+        store->SetCertificate(CertificateKind::Good);
+        Owned<ZV_WS_GenreArray> again;
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getNavigation(&strict, &again));
+        ZV_WS_release(&strict);
+    }
+}
+
+TEST_F(Session, OldTlsIsRefused)
+{
+    StorefrontOptions options;
+    options.oldTls = true;
+    Open(options);
+    EXPECT_EQ(ZV_WS_Status_connection_error, Initialize());
+}
+
+TEST_F(Session, DuplicatesWorkOnTheirOwn)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize());
+    ZV_WS_Session copy;
+    store->ClearLog();
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
+    EXPECT_TRUE(store->Log().empty());
+    ZV_WS_release(&session);
+    Owned<ZV_WS_GenreArray> genres;
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getNavigation(&copy, &genres));
+    EXPECT_EQ(Number("SELECT COUNT(*) FROM genre"), static_cast<int>(genres.size));
+    ZV_WS_release(&copy);
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_duplicate(&copy, &session));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_release(&copy));
+}
+
+TEST_F(Session, DeploymentFileMistakesAreRefused)
+{
+    const std::string file = store->DataFolder() + "/broken.conf";
+    for (const char* text : {"production_host localhost\n", "no_such_key = 1\n", "production_host = a b\n",
+                             "production_host = localhost:99999\n"}) {
+        std::ofstream(file) << "# comment\n\n" << text;
+        setenv("ZV_DEPLOYMENT", file.c_str(), 1);
+        testing::internal::CaptureStderr();
+        EXPECT_EQ(ZV_WS_Status_file_operation_error, Initialize()) << text;
+        EXPECT_EQ(0u, testing::internal::GetCapturedStderr().find(file + ":3: ")) << text;
+        EXPECT_EQ(nullptr, session._pImpl);
+    }
+    setenv("ZV_DEPLOYMENT", "/nowhere/deployment.conf", 1);
+    testing::internal::CaptureStderr();
+    EXPECT_EQ(ZV_WS_Status_file_operation_error, Initialize());
+    EXPECT_EQ(0u, testing::internal::GetCapturedStderr().find("/nowhere/deployment.conf: "));
+    std::ofstream(file) << "ca_file = /nowhere/ca.pem\n";
+    setenv("ZV_DEPLOYMENT", file.c_str(), 1);
+    EXPECT_EQ(ZV_WS_Status_ssl_error, Initialize());
+    EXPECT_NE(nullptr, session._pImpl);
+}
+
+TEST_F(Session, CallsWithoutASessionTagTheirOutput)
+{
+    const ZV_WS_Pagination page = Page(1, 5);
+    Owned<ZV_WS_TitlesResponse> titles;
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getTitles(&session, 1, &page, 2, &titles));
+    ASSERT_NE(nullptr, titles._pImpl);
+    EXPECT_EQ(18u, *titles._pImpl);
+    EXPECT_EQ(15u, *titles.Titles._pImpl);
+    bool flag = true;
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_checkForPurchasedSku(&session, 1, &flag));
+    EXPECT_FALSE(flag);
+    ZV_WS_EnvironmentLists list;
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getAvailableEnvLists(&list));
+    ASSERT_EQ(4u, list.size);
+    EXPECT_STREQ("stg", list.env[1].endpoint);
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_release(nullptr));
+}
+
+}  // namespace
