@@ -3,6 +3,7 @@
 #include <errno.h>
 #include <string.h>
 #include <sys/socket.h>
+#include <time.h>
 
 #include "Namespaces.h"
 #include "Tls.h"
@@ -131,6 +132,7 @@ void Transport::BeginExchange()
 {
     m_Connected = false;
     m_Received = 0;
+    m_Soap.start = static_cast<ULONG64>(time(nullptr));  // of transfer_timeout; the runtime sets it for SOAP alone
     m_SentSecrets.Restart();
     m_ReceivedSecrets.Restart();
 }
