@@ -197,7 +197,8 @@ void Extensions::StartUpdates(ScriptObject& object)
 {
     const bool registered = std::any_of(m_updates.begin(), m_updates.end(),
                                         [&](const Registration& update) { return update.pObject == &object; });
-    if (registered || m_instances.find(object.HeapObject()) == m_instances.end()) return;
+    const auto instance = m_instances.find(object.HeapObject());
+    if (registered || instance == m_instances.end() || instance->second.destructing) return;
     object.AddRef();
     m_updates.push_back(Registration{&object, ++m_counter});
 }
