@@ -66,6 +66,7 @@ void Extensions::Define(size_t classIndex)
             ScriptEngine::PushNative(pContext, finalize);
             duk_set_finalizer(pContext, -2);  // inherited by the instances
             duk_put_prop_string(pContext, -2, "prototype");
+            duk_dup(pContext, -1);
             ScriptEngine::PutGlobal(pContext, extension.name.c_str());
         },
         m_constructors[classIndex]);
