@@ -66,6 +66,7 @@ void Extensions::Define(size_t classIndex)
             ScriptEngine::PushNative(pContext, finalize);
             duk_set_finalizer(pContext, -2);  // inherited by the instances
             duk_put_prop_string(pContext, -2, "prototype");
+            duk_dup(pContext, -1);
             ScriptEngine::PutGlobal(pContext, extension.name.c_str());
         },
         m_constructors[classIndex]);
@@ -197,7 +198,8 @@ void Extensions::StartUpdates(ScriptObject& object)
 {
     const bool registered = std::any_of(m_updates.begin(), m_updates.end(),
                                         [&](const Registration& update) { return update.pObject == &object; });
-    if (registered || m_instances.find(object.HeapObject()) == m_instances.end()) return;
+    const auto instance = m_instances.find(object.HeapObject());
+    if (registered || instance == m_instances.end() || instance->second.destructing) return;
     object.AddRef();
     m_updates.push_back(Registration{&object, ++m_counter});
 }

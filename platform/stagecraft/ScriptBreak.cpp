@@ -74,15 +74,16 @@ bool EnterScript(void (*function)(void*), void* pData)
     entry.pOuter = s_pEntry;
     // The mask is not saved: the handler runs with SA_NODEFER, and saving it would be a system call for every
     // operation.
-    const bool finished = sigsetjmp(entry.env, 0) == 0;
-    if (finished) {
-        s_pEntry = &entry;
-        std::atomic_signal_fence(std::memory_order_seq_cst);
-        function(pData);
-        std::atomic_signal_fence(std::memory_order_seq_cst);
+    if (sigsetjmp(entry.env, 0) != 0) {
+        s_pEntry = entry.pOuter;
+        return false;
     }
+    s_pEntry = &entry;
+    std::atomic_signal_fence(std::memory_order_seq_cst);
+    function(pData);
+    std::atomic_signal_fence(std::memory_order_seq_cst);
     s_pEntry = entry.pOuter;
-    return finished;
+    return true;
 }
 
 ScriptEntry* EnterNative()

@@ -102,6 +102,7 @@ bool ScriptObject::Construct(const char* pClassName, const ASValueArray& argumen
     return Evaluate(
         [&](duk_context* pContext) {
             ScriptEngine::PushGlobal(pContext, pClassName);
+            if (!duk_is_function(pContext, -1)) duk_type_error(pContext, "there is no class %s", pClassName);
             ScriptEngine::PushArguments(pContext, arguments);
             duk_new(pContext, static_cast<duk_idx_t>(arguments.size()));
         },

@@ -1,0 +1,269 @@
+// What native code does with script objects.
+#include "RuntimeFixture.h"
+
+namespace {
+
+ASValueArray Values(std::initializer_list<ASValue> values)
+{
+    ASValueArray result;
+    for (const ASValue& value : values) {
+        result.Append(value);
+    }
+    return result;
+}
+
+TEST_F(RuntimeTest, ObjectsAndArraysAreBuilt)
+{
+    Probe::s_run = [](const Invocation& call) {
+        ASValue array, element, unused;
+        ASSERT_TRUE(call.object.Construct("Array", {}, array));
+        for (const char* pName : {"first", "second"}) {
+            ASSERT_TRUE(call.object.Construct("Object", {}, element));
+            // Neither alphabetical nor by kind: the order is the one of setting.
+            EXPECT_TRUE(element.GetObject()->SetProperty("zebra", ASValue::String(pName)));
+            EXPECT_TRUE(element.GetObject()->SetProperty("Apple", ASValue::Number(1)));
+            EXPECT_TRUE(element.GetObject()->SetProperty("nothing", ASValue::String(nullptr)));
+            EXPECT_TRUE(element.GetObject()->SetProperty("zebra", ASValue::String(pName)));
+            EXPECT_TRUE(array.GetObject()->Call("push", Values({element}), unused));
+        }
+        EXPECT_EQ(unused.GetNumber(), 2);
+        EXPECT_EQ(array.GetObject()->GetLength(), 2u);
+        EXPECT_TRUE(array.GetObject()->GetElement(1, element));
+        EXPECT_STREQ(element.GetObject()->GetText("zebra").c_str(), "second");
+        EXPECT_TRUE(array.GetObject()->GetElement(2, element));
+        EXPECT_STREQ(TypeName(element), "undefined");
+        call.result = array;
+    };
+    EXPECT_EQ(Logged("var r = probe.run(); probe.log(JSON.stringify(r), r instanceof Array, r[0] instanceof Object);"),
+              Lines{R"([{"zebra":"first","Apple":1,"nothing":null},{"zebra":"second","Apple":1,"nothing":null}])"
+                    " true true"});
+}
+
+TEST_F(RuntimeTest, DatesAreLocalTime)
+{
+    const Environment zone("TZ", "XXX-05:30");
+    Probe::s_run = [](const Invocation& call) {
+        ASValueArray parts;
+        for (const double part : {2011, 0, 31, 23, 59, 58}) {
+            parts.Append(ASValue::Number(part));
+        }
+        ASValue date;
+        EXPECT_TRUE(call.object.Construct("Date", parts, date));
+        EXPECT_TRUE(date.GetObject()->IsInstanceOf("Date"));
+        call.result = date;
+    };
+    EXPECT_EQ(Logged("var d = probe.run();"
+                     "probe.log(d.getFullYear(), d.getMonth(), d.getDate(), d.getHours(), d.getMinutes(),"
+                     "          d.getSeconds(), d.getTimezoneOffset());"),
+              Lines{"2011 0 31 23 59 58 -330"});
+}
+
+TEST_F(RuntimeTest, ClassesAreTold)
+{
+    const struct {
+        const char* pExpression;
+        const char* pClass;
+        bool expected;
+    } rows[] = {
+        {"[]", "Array", true},
+        {"[]", "Object", true},
+        {"{}", "Array", false},
+        {"{length: 2}", "Array", false},
+        {"new Date()", "Date", true},
+        {"function() {}", "Function", true},
+        {"probe", "com.example.Probe", true},
+        {"{}", "com.example.Probe", false},
+        {"{}", "com.example.Absent", false},
+        {"{}", "absent.altogether.Probe", false},
+        {"{}", "Math.PI", false},
+        {"{}", "", false},
+        {"new (function() { this.constructor = Array; })()", "Array", false},
+    };
+    for (const auto& row : rows) {
+        bool told = !row.expected;
+        Probe::s_run = [&](const Invocation& call) { told = call.arguments[0].GetObject()->IsInstanceOf(row.pClass); };
+        Logged(std::string("probe.run(") + row.pExpression + ");");
+        EXPECT_EQ(told, row.expected) << row.pExpression << " " << row.pClass;
+    }
+}
+
+TEST_F(RuntimeTest, LengthsOfWhatIsNoArray)
+{
+    Probe::s_run = [](const Invocation& call) { EXPECT_EQ(call.arguments[0].GetObject()->GetLength(), 0u); };
+    Logged("probe.run({}); probe.run({length: 'two'}); probe.run({length: NaN}); probe.run([]);");
+}
+
+TEST_F(RuntimeTest, NativeInstancesAndIdentity)
+{
+    Probe::s_run = [](const Invocation& call) {
+        ASSERT_EQ(call.arguments.size(), 4u);
+        EXPECT_EQ(call.arguments[0].GetObject(), &call.object);
+        EXPECT_EQ(call.arguments[0].GetObject()->GetExtensionInstance(), call.object.GetExtensionInstance());
+        ASExtensionClass* pOther = call.arguments[1].GetObject()->GetExtensionInstance();
+        EXPECT_NE(pOther, nullptr);
+        EXPECT_NE(pOther, call.object.GetExtensionInstance());
+        EXPECT_EQ(call.arguments[2].GetObject()->GetExtensionInstance(), nullptr);
+        EXPECT_EQ(call.arguments[3].GetObject()->GetExtensionInstance(), nullptr);
+        ASValue again;
+        EXPECT_TRUE(call.arguments[2].GetObject()->GetProperty("probe", again));
+        EXPECT_EQ(again.GetObject(), &call.object);
+    };
+    // An object that merely inherits from an instance is none.
+    Logged("probe.run(probe, new Probe(), {probe: probe}, Object.create(probe));");
+}
+
+TEST_F(RuntimeTest, CallsPassThisArgumentsAndResult)
+{
+    Probe::s_run = [](const Invocation& call) {
+        ASObject& object = *call.arguments[0].GetObject();
+        ASValue result;
+        EXPECT_TRUE(object.Call("add", Values({ASValue::Number(2), ASValue::String("x")}), result));
+        EXPECT_STREQ(result.GetString().c_str(), "402x2");
+        EXPECT_TRUE(object.Call("inherited", {}, result));
+        EXPECT_EQ(result.GetNumber(), 40);
+        ASValue function;
+        EXPECT_TRUE(object.GetProperty("add", function));
+        EXPECT_TRUE(function.GetObject()->Call("call", Values({call.arguments[0], ASValue::Number(3), ASValue::Null()}),
+                                               result));
+        EXPECT_STREQ(result.GetString().c_str(), "43null2");
+        // Into a handler that runs already.
+        Probe::s_run = [](const Invocation& inner) { inner.result = ASValue::String("inner"); };
+        EXPECT_TRUE(object.Call("reenter", {}, result));
+        EXPECT_STREQ(result.GetString().c_str(), "inner");
+        call.result = ASValue::String("outer");
+    };
+    EXPECT_EQ(Logged("var o = Object.create({inherited: function() { return this.base; }}); o.base = 40;"
+                     "o.add = function(a, b) { return (typeof b === 'string' ? '40' + a + b : (40 + a) + String(b))"
+                     "                                + arguments.length; };"
+                     "o.reenter = function() { return probe.run(); };"
+                     "probe.log(probe.run(o));"),
+              Lines{"outer"});
+}
+
+// Each row fails in the script: reported with the place and the native method; native code and the movie go on.
+TEST_F(RuntimeTest, FailingOperationsReportAndReturn)
+{
+    const struct {
+        const char* pObject;
+        std::function<bool(ASObject&, ASValue&)> operation;
+        std::vector<const char*> reported;
+    } rows[] = {
+        {"{get v() { throw new Error('no v'); }}",
+         [](ASObject& object, ASValue& value) { return object.GetProperty("v", value); },
+         {"no v", "movie.js:2"}},
+        {"Object.freeze({v: 1})",
+         [](ASObject& object, ASValue&) { return object.SetProperty("v", ASValue::Number(2)); },
+         {}},
+        {"{}", [](ASObject& object, ASValue& value) { return object.Call("absent", {}, value); }, {"absent"}},
+        {"{f: 1}", [](ASObject& object, ASValue& value) { return object.Call("f", {}, value); }, {}},
+        {"{f: function() { throw new RangeError('too far'); }}",
+         [](ASObject& object, ASValue& value) { return object.Call("f", {}, value); },
+         {"RangeError: too far", "movie.js:2"}},
+        {"{}",
+         [](ASObject& object, ASValue& value) { return object.Construct("com.absent.Thing", {}, value); },
+         {"com.absent.Thing"}},
+        {"{}",
+         [](ASObject& object, ASValue& value) {
+             return object.Construct("com.example.Probe", Values({ASValue::String("refused")}), value);
+         },
+         {"com.example.Probe"}},
+        {"{v: {toString: function() { throw new Error('no text'); }}}",
+         [](ASObject& object, ASValue& value) {
+             ASValue property;
+             AEString text("before");
+             EXPECT_TRUE(object.GetProperty("v", property));
+             const bool converted = object.ToText(property, text);
+             EXPECT_STREQ(text.c_str(), "");
+             value = ASValue();
+             return converted;
+         },
+         {"no text", "movie.js:2"}},
+    };
+    for (const auto& row : rows) {
+        bool returned = false;
+        Probe::s_lines.clear();
+        Probe::s_run = [&](const Invocation& call) {
+            ASValue value = ASValue::Number(1);
+            const ASValue object = call.arguments[0];
+            EXPECT_FALSE(row.operation(*object.GetObject(), value)) << row.pObject;
+            EXPECT_STREQ(TypeName(value), row.reported.empty() ? TypeName(value) : "undefined") << row.pObject;
+            returned = true;
+        };
+        EXPECT_EQ(Play(std::string("probe.run(") + row.pObject + "); probe.log('on');").m_nErrorValue, AEError::OK);
+        EXPECT_TRUE(returned);
+        EXPECT_EQ(Probe::s_lines, Lines{"on"}) << row.pObject;
+        EXPECT_EQ(m_errors.rfind("script error: ", 0), 0u) << m_errors;
+        EXPECT_NE(m_errors.find("com.example.Probe.run"), std::string::npos) << m_errors;
+        for (const char* pPart : row.reported) {
+            EXPECT_NE(m_errors.find(pPart), std::string::npos) << pPart << " in " << m_errors;
+        }
+    }
+}
+
+// ---- Lifetime
+
+// Garbage for collectors that run when memory is used.
+const char* const kCollect = "function collect() { for (var i = 0; i < 20000; i++) { var o = {}; o.self = o; } }\n";
+
+TEST_F(RuntimeTest, HeldObjectsOutliveTheScriptsInterest)
+{
+    ASValue held;
+    ASObject* pObject = nullptr;
+    Probe::s_run = [&](const Invocation& call) {
+        held = call.arguments[0];
+        pObject = held.GetObject();
+    };
+    Probe::s_onUpdate = [&](const Invocation& call) {
+        ASValue unused;
+        EXPECT_EQ(held.GetObject(), pObject);
+        EXPECT_NE(static_cast<Probe*>(pObject->GetExtensionInstance()), nullptr);
+        EXPECT_TRUE(pObject->Call("onComplete", Values({ASValue::Number(-7), ASValue::String("value")}), unused));
+        held = ASValue();
+        call.object.StopUpdates();
+    };
+    EXPECT_EQ(Logged(std::string(kCollect) +
+                     "(function() {"
+                     "   var p = new Probe('held');"
+                     "   p.onComplete = function(status, value) { probe.log(status, value, p.name()); };"
+                     "   probe.run(p);"
+                     "})();"
+                     "collect(); probe.startUpdates();"),
+              (Lines{"constructed held", "-7 value held", "destructed held"}));
+}
+
+TEST_F(RuntimeTest, ObjectsRegisteredForUpdatesAreKept)
+{
+    int updates = 0;
+    Probe::s_onUpdate = [&](const Invocation& call) {
+        Probe::s_lines.push_back("update");
+        if (++updates == 3) call.object.StopUpdates();
+    };
+    EXPECT_EQ(Logged(std::string(kCollect) + "new Probe('kept').startUpdates(); collect();"),
+              (Lines{"constructed kept", "update", "update", "update", "destructed kept"}));
+}
+
+TEST_F(RuntimeTest, ReferencesOutliveTheSet)
+{
+    ASValue object, instance;
+    Probe::s_run = [&](const Invocation& call) {
+        object = call.arguments[0];
+        instance = ASValue::Object(&call.object);
+    };
+    Logged("probe.run({v: 1, f: function() {}});");
+    EXPECT_EQ(Probe::s_deleted, 1);
+    EXPECT_EQ(instance.GetObject()->GetExtensionInstance(), nullptr);
+    ASValue value = ASValue::Number(1);
+    const ASValue copy = object;
+    EXPECT_FALSE(copy.GetObject()->GetProperty("v", value));
+    EXPECT_STREQ(TypeName(value), "undefined");
+    EXPECT_FALSE(object.GetObject()->SetProperty("v", object));
+    EXPECT_FALSE(object.GetObject()->Call("f", {}, value));
+    EXPECT_FALSE(object.GetObject()->Construct("Object", {}, value));
+    EXPECT_FALSE(object.GetObject()->IsInstanceOf("Object"));
+    EXPECT_EQ(object.GetObject()->GetLength(), 0u);
+    EXPECT_TRUE(std::isnan(object.GetObject()->ToNumber(ASValue::Number(1))));
+    instance.GetObject()->StartUpdates();
+    instance.GetObject()->StopUpdates();
+}
+
+}  // namespace

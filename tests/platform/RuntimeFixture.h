@@ -1,0 +1,108 @@
+// Loads a script runtime and plays movies in it that each test writes.
+//
+// The movie talks to the test through the extension class "com.example.Probe": log(text...) notes a line, run(...)
+// calls the native code that the test gave. Each movie starts with a probe of its own, `var probe`.
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "stagecraft/IAEKernel.h"
+#include "stagecraft/IStagecraft.h"
+
+using namespace ae::stagecraft;
+
+using Lines = std::vector<std::string>;
+
+// What native code gets that runs for the script.
+struct Invocation {
+    StageWindow* pWindow;
+    ASObject& object;
+    ASValueArray& arguments;
+    ASValue& result;
+};
+
+class Probe final : public ASExtensionClass {
+public:
+    explicit Probe(std::string name) : m_name(std::move(name)) {}
+    ~Probe() override { ++s_deleted; }
+
+    static const char* GetClassName() { return "com.example.Probe"; }
+    static bool FiresEvents() { return false; }
+    static void GetMethods(AEArray<Method>& methodArrayToFill);
+    // new Probe(name): a name is noted when the instance comes and goes; "refused" is not constructed.
+    static ASExtensionClass* ConstructInstance(StageWindow* pWindow, ASObject& object, ASValueArray& arguments);
+    static void DestructInstance(StageWindow* pWindow, ASObject& object);
+
+    void OnUpdate(StageWindow* pWindow, ASObject& object) override;
+
+    static Lines s_lines;
+    static std::function<void(const Invocation&)> s_run;  // what run() does; empty: nothing
+    static std::function<void(const Invocation&)> s_onUpdate;
+    static std::thread::id s_mainThread;
+    static int s_constructed;
+    static int s_deleted;
+
+private:
+    void Log(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
+    void Run(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
+    void Name(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
+    void StartUpdates(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
+    void StopUpdates(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
+
+    const std::string m_name;
+};
+
+// Sets a variable of the environment, or removes it (null), until the end of the scope.
+class Environment {
+public:
+    Environment(const char* pName, const char* pValue);
+    ~Environment();
+    Environment(const Environment&) = delete;
+    Environment& operator=(const Environment&) = delete;
+
+private:
+    const std::string m_name;
+    std::string m_previous;
+    bool m_hadPrevious;
+};
+
+class RuntimeTest : public ::testing::Test {
+protected:
+    RuntimeTest();
+    ~RuntimeTest() override;
+    void SetUp() override;
+    void TearDown() override;
+
+    // Writes the script, after the line that makes the probe, as the movie's file.
+    void WriteMovie(const std::string& script);
+    AEError Create(const std::vector<const char*>& options = {});
+    AEError Run() { return m_pRuntime->RunStageWindowSet(m_set); }
+    AEError Destroy() { return m_pRuntime->DestroyStageWindowSet(m_set); }
+    // All of it; the result is that of Run. What the movie printed to the error stream is in m_errors.
+    AEError Play(const std::string& script, const std::vector<const char*>& options = {});
+    // Likewise for a movie in which nothing may fail; returns the lines it logged.
+    Lines Logged(const std::string& script, const std::vector<const char*>& options = {});
+
+    void* m_pLibrary = nullptr;
+    IAEKernel* m_pKernel = nullptr;
+    IStagecraft* m_pRuntime = nullptr;
+    IAEModule_LoadModuleFunction m_loadModule = nullptr;
+    IAEModule_UnloadModuleFunction m_unloadModule = nullptr;
+    AEArray<StageWindow*> m_set;
+    std::string m_folder;
+    std::string m_movie;
+    std::string m_errors;
+
+private:
+    // Ticks come fast, so that tests end soon; the movie is the one that the test writes.
+    Environment m_ticks{"STAGECRAFT_FPS", "200"};
+    Environment m_noOtherMovie{"STAGECRAFT_MOVIE", nullptr};
+};
+
+// As the script writes them: for comparisons whose failure is readable.
+const char* TypeName(const ASValue& value);
