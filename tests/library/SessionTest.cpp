@@ -1,4 +1,3 @@
-#include <openssl/rand.h>
 
 #include <fstream>
 
@@ -22,19 +21,37 @@ TEST_F(Session, SetupIsValidatedBeforeAnythingIsSent)
         {"no user", [](auto& s, auto&, auto&) { s.UserName = nullptr; }, ZV_WS_Status_invalid_param},
         {"no password", [](auto& s, auto&, auto&) { s.Password = ""; }, ZV_WS_Status_invalid_param},
         {"longest id", [](auto& s, auto& id, auto&) { s.DestinationUniqueID = id.c_str(); }, ZV_WS_Status_ok},
-        {"too long id", [](auto& s, auto&, auto& id) { s.DestinationUniqueID = id.c_str(); }, ZV_WS_Status_invalid_param},
-        {"file cache without path", [](auto& s, auto&, auto&) { s.CacheParam.Type = CacheType_File; }, ZV_WS_Status_invalid_param},
-        {"small cache", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_Memory, 1, 358399, nullptr}; },
+        {"too long id", [](auto& s, auto&, auto& id) { s.DestinationUniqueID = id.c_str(); },
          ZV_WS_Status_invalid_param},
-        {"smallest cache", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_Memory, 1, 358400, nullptr}; }, ZV_WS_Status_ok},
-        {"unlimited cache", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_Memory, 1, 0, nullptr}; }, ZV_WS_Status_ok},
-        {"no cache, any limit", [](auto& s, auto&, auto&) { s.CacheParam = {CacheType_None, 1, 5, nullptr}; }, ZV_WS_Status_ok},
+        {"file cache without path", [](auto& s, auto&, auto&) { s.CacheParam.Type = CacheType_File; },
+         ZV_WS_Status_invalid_param},
+        {"small cache",
+         [](auto& s, auto&, auto&) {
+             s.CacheParam = {CacheType_Memory, 1, 358399, nullptr};
+         },
+         ZV_WS_Status_invalid_param},
+        {"smallest cache",
+         [](auto& s, auto&, auto&) {
+             s.CacheParam = {CacheType_Memory, 1, 358400, nullptr};
+         },
+         ZV_WS_Status_ok},
+        {"unlimited cache",
+         [](auto& s, auto&, auto&) {
+             s.CacheParam = {CacheType_Memory, 1, 0, nullptr};
+         },
+         ZV_WS_Status_ok},
+        {"no cache, any limit",
+         [](auto& s, auto&, auto&) {
+             s.CacheParam = {CacheType_None, 1, 5, nullptr};
+         },
+         ZV_WS_Status_ok},
         {"folder below a file",
          [](auto& s, auto&, auto&) {
              s.CacheParam = {CacheType_File, 1, 0, "/dev/null/cache"};
          },
          ZV_WS_Status_failed_to_create_cache_folder},
-        {"line end in a header value", [](auto& s, auto&, auto&) { s.ModelCode = "X\r\nEvil: 1"; }, ZV_WS_Status_invalid_param},
+        {"line end in a header value", [](auto& s, auto&, auto&) { s.ModelCode = "X\r\nEvil: 1"; },
+         ZV_WS_Status_invalid_param},
     };
     for (const auto& row : rows) {
         store->ClearLog();
@@ -72,8 +89,9 @@ TEST_F(Session, DiscoveryAsksTheDeviceEnvironment)
     Owned<ZV_WS_FileType> type;
     ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getFileType(&session, &type));
     const auto headers = store->Log().back().headers;
-    EXPECT_NE(headers.end(), std::find(headers.begin(), headers.end(),
-                                       std::make_pair(std::string("user-agent"), std::string("ZVSDK: F|A ZVMODEL:X1"))));
+    EXPECT_NE(headers.end(),
+              std::find(headers.begin(), headers.end(),
+                        std::make_pair(std::string("user-agent"), std::string("ZVSDK: F|A ZVMODEL:X1"))));
 }
 
 // Every answer that is not exactly one digit is production; no answer at all is a failure.
@@ -83,10 +101,14 @@ TEST_F(Session, DiscoveryAnswers)
         const char* fault;
         ZV_WS_Status status;
         int env;
-    } rows[] = {{"discovery=ok", ZV_WS_Status_ok, 7},           {"discovery=http:404", ZV_WS_Status_ok, 2},
-                {"discovery=garbage", ZV_WS_Status_ok, 2},      {"discovery=no-length", ZV_WS_Status_ok, 2},
-                {"discovery=split:200", ZV_WS_Status_ok, 2},    {"discovery=cut", ZV_WS_Status_ok, 2},
-                {"connect=close", ZV_WS_Status_connection_error, 0}, {"connect=reset", ZV_WS_Status_connection_error, 0}};
+    } rows[] = {{"discovery=ok", ZV_WS_Status_ok, 7},
+                {"discovery=http:404", ZV_WS_Status_ok, 2},
+                {"discovery=garbage", ZV_WS_Status_ok, 2},
+                {"discovery=no-length", ZV_WS_Status_ok, 2},
+                {"discovery=split:200", ZV_WS_Status_ok, 2},
+                {"discovery=cut", ZV_WS_Status_ok, 2},
+                {"connect=close", ZV_WS_Status_connection_error, 0},
+                {"connect=reset", ZV_WS_Status_connection_error, 0}};
     StorefrontOptions options;
     options.environment = 7;
     options.gzip = false;
@@ -111,7 +133,8 @@ TEST_F(Session, NamedEnvironmentsNeedNoDiscovery)
         EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getNavigation(&session, &genres));
         ZV_WS_release(&session);
     }
-    for (const LoggedRequest& request : store->Log()) EXPECT_EQ("browse", request.service);
+    for (const LoggedRequest& request : store->Log())
+        EXPECT_EQ("browse", request.service);
 }
 
 TEST_F(Session, UnknownAccessTypeIsAsked)

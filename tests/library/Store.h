@@ -53,7 +53,8 @@ protected:
     {
         std::vector<std::string> asked;
         for (const LoggedRequest& request : store->Log()) {
-            if (request.service != "discovery") asked.push_back(request.operation + (request.violation.empty() ? "" : "!"));
+            if (request.service != "discovery")
+                asked.push_back(request.operation + (request.violation.empty() ? "" : "!"));
         }
         return asked;
     }

@@ -31,12 +31,30 @@ TEST_F(Transport, FaultsOfOneAnswerEndThere)
         const char* fault;
         int status;
     } rows[] = {
-        {"fault11", -6012},         {"fault12", -6012},       {"http:404", -4404},       {"http:500", -4500},
-        {"http:503", -4503},        {"http:302", -4302},      {"garbage", kFails},       {"empty", kFails},
-        {"cut-header", kFails},     {"cut-body", kFails},     {"damaged-gzip", kFails},  {"bomb:64", kFails},
-        {"endless", kFails},        {"unknown-enum", -1004},  {"missing-result", -1004}, {"code:3", -1004},
-        {"must-understand", -6008}, {"soap12", 0},            {"extra-header", 0},       {"split", 0},
-        {"long", 0},                {"no-length", 0},         {"drip:0", 0},             {"short", 0},
+        {"fault11", -6012},
+        {"fault12", -6012},
+        {"http:404", -4404},
+        {"http:500", -4500},
+        {"http:503", -4503},
+        {"http:302", -4302},
+        {"garbage", kFails},
+        {"empty", kFails},
+        {"cut-header", kFails},
+        {"cut-body", kFails},
+        {"damaged-gzip", kFails},
+        {"bomb:64", kFails},
+        {"endless", kFails},
+        {"unknown-enum", -1004},
+        {"missing-result", -1004},
+        {"code:3", -1004},
+        {"must-understand", -6008},
+        {"soap12", 0},
+        {"extra-header", 0},
+        {"split", 0},
+        {"long", 0},
+        {"no-length", 0},
+        {"drip:0", 0},
+        {"short", 0},
     };
     for (const auto& row : rows) {
         Fault(std::string("getTitleListing=") + row.fault);
@@ -64,7 +82,8 @@ TEST_F(Transport, RefusalsKeepCodeAndMessage)
 
 TEST_F(Transport, OneConnectionIsKept)
 {
-    for (int i = 0; i < 3; ++i) ASSERT_EQ(ZV_WS_Status_ok, Listing());
+    for (int i = 0; i < 3; ++i)
+        ASSERT_EQ(ZV_WS_Status_ok, Listing());
     const auto log = store->Log();
     ASSERT_EQ(3u, log.size());
     EXPECT_EQ(log[0].connection, log[2].connection);
@@ -101,8 +120,8 @@ TEST_F(Transport, WhatChangesSomethingIsSentOnce)
     Fault("doPurchaseSavedbilling=cut,after");
     Owned<ZV_WS_PurchaseResponse> purchase;
     const int passes = Number("SELECT COUNT(*) FROM pass");
-    EXPECT_EQ(ZV_WS_Status_timeout_error,
-              ZV_WS_doPurchaseSavedBilling(&session, Number("SELECT MIN(sku) FROM product"), "10.0.0.1", false, &purchase));
+    EXPECT_EQ(ZV_WS_Status_timeout_error, ZV_WS_doPurchaseSavedBilling(&session, Number("SELECT MIN(sku) FROM product"),
+                                                                       "10.0.0.1", false, &purchase));
     EXPECT_EQ(1u, store->Log().size());
     EXPECT_EQ(passes + 1, Number("SELECT COUNT(*) FROM pass"));
 }

@@ -82,15 +82,14 @@ TEST(Answer, UnmarkedHeadersAreSkippedAndMarkedOnesRefused)
 {
     const std::string plain = "<s:Header><x:Trace xmlns:x=\"urn:x\">1</x:Trace></s:Header>";
     EXPECT_EQ(SOAP_OK, Listing(HttpAnswer(Envelope(kListing, kSoap11, plain))).result);
-    const std::string marked =
-        "<s:Header><x:Trace xmlns:x=\"urn:x\" s:mustUnderstand=\"1\">1</x:Trace></s:Header>";
+    const std::string marked = "<s:Header><x:Trace xmlns:x=\"urn:x\" s:mustUnderstand=\"1\">1</x:Trace></s:Header>";
     EXPECT_EQ(SOAP_MUSTUNDERSTAND, Listing(HttpAnswer(Envelope(kListing, kSoap11, marked))).result);
 }
 
 TEST(Answer, FaultsOfBothVersionsGiveTheSameText)
 {
-    const std::string fault11 = Envelope(
-        "<s:Fault xmlns=\"\"><faultcode>s:Server</faultcode><faultstring>shop closed</faultstring></s:Fault>");
+    const std::string fault11 =
+        Envelope("<s:Fault xmlns=\"\"><faultcode>s:Server</faultcode><faultstring>shop closed</faultstring></s:Fault>");
     const std::string fault12 = Envelope(
         "<s:Fault><s:Code><s:Value>s:Receiver</s:Value></s:Code>"
         "<s:Reason><s:Text xml:lang=\"en\">shop closed</s:Text></s:Reason></s:Fault>",
@@ -141,14 +140,15 @@ TEST(Answer, OddlyTypedResults)
         Exchange<DownloadAPI> exchange;
         _ZV1__checkAdultVerificationEnabled request;
         _ZV1__checkAdultVerificationEnabledResponse response;
-        const std::string body =
-            std::string("<checkAdultVerificationEnabledResponse><checkAdultVerificationEnabledResult>"
-                        "<ResponseCode>0</ResponseCode>") +
-            row.literal + "</checkAdultVerificationEnabledResult></checkAdultVerificationEnabledResponse>";
-        ASSERT_EQ(SOAP_OK, exchange.Run("checkAdultVerificationEnabled", HttpAnswer(Envelope(body)),
-                                        [&](DownloadAPI& service) {
-                                            return service.checkAdultVerificationEnabled(&request, &response);
-                                        }));
+        const std::string body = std::string(
+                                     "<checkAdultVerificationEnabledResponse><checkAdultVerificationEnabledResult>"
+                                     "<ResponseCode>0</ResponseCode>") +
+                                 row.literal +
+                                 "</checkAdultVerificationEnabledResult></checkAdultVerificationEnabledResponse>";
+        ASSERT_EQ(SOAP_OK,
+                  exchange.Run("checkAdultVerificationEnabled", HttpAnswer(Envelope(body)), [&](DownloadAPI& service) {
+                      return service.checkAdultVerificationEnabled(&request, &response);
+                  }));
         ZV_WS_CheckAdultVerificationEnabledResponse record;
         Records::Tag(record);
         ZVUtilities::Convert(response.checkAdultVerificationEnabledResult, record);

@@ -1,5 +1,5 @@
-// One exchange of a service wrapper with a peer that is two ends of a socket pair: the answer is laid ready, the request is
-// read afterwards. Both are texts written by hand.
+// One exchange of a service wrapper with a peer that is two ends of a socket pair: the answer is laid ready, the
+// request is read afterwards. Both are texts written by hand.
 #pragma once
 
 #include <gtest/gtest.h>
@@ -26,8 +26,9 @@ inline ZV_WS_SetupParams2 TestParams()
 
 inline std::string HttpAnswer(const std::string& body, const std::string& status = "200 OK")
 {
-    return "HTTP/1.1 " + status + "\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " +
-           std::to_string(body.size()) + "\r\nConnection: close\r\n\r\n" + body;
+    return "HTTP/1.1 " + status +
+           "\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " + std::to_string(body.size()) +
+           "\r\nConnection: close\r\n\r\n" + body;
 }
 
 template <class Service>

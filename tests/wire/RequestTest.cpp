@@ -29,17 +29,20 @@ void CheckBodies(const std::vector<Row<Service>>& rows)
 }
 
 // A call of the generated method with a request filled by `fill`.
-#define CALL(name, ...)                         \
-    [](auto& service) {                         \
-        _ZV1__##name request;                   \
-        _ZV1__##name##Response response;        \
-        auto& r = request;                      \
-        (void)r;                                \
-        __VA_ARGS__;                            \
+#define CALL(name, ...)                           \
+    [](auto& service) {                           \
+        _ZV1__##name request;                     \
+        _ZV1__##name##Response response;          \
+        auto& r = request;                        \
+        (void)r;                                  \
+        __VA_ARGS__;                              \
         return service.name(&request, &response); \
     }
 
-char* Text(const char* text) { return const_cast<char*>(text); }
+char* Text(const char* text)
+{
+    return const_cast<char*>(text);
+}
 
 TEST(Request, BrowseBodies)
 {
@@ -66,8 +69,8 @@ TEST(Request, BrowseBodies)
          "</ZV1:CurrentPageNumber><ZV1:PurchaseType>buy</ZV1:PurchaseType><ZV1:TitleType>movies</ZV1:TitleType>"
          "</ZV1:searchForTitleDetail>"},
         {"getTitlesByGenreArray",
-         CALL(getTitlesByGenreArray, int ids[2] = {3, 4}; ZV1__ArrayOfInt array; array.__sizeint_ = 2;
-              array.int_ = ids; r.GenreIDs = &array; r.CurrentPageNumber = 1; r.ItemsPerPage = 9),
+         CALL(getTitlesByGenreArray, int ids[2] = {3, 4}; ZV1__ArrayOfInt array; array.__sizeint_ = 2; array.int_ = ids;
+              r.GenreIDs = &array; r.CurrentPageNumber = 1; r.ItemsPerPage = 9),
          "<ZV1:getTitlesByGenreArray><ZV1:GenreIDs><ZV1:int>3</ZV1:int><ZV1:int>4</ZV1:int></ZV1:GenreIDs>"
          "<ZV1:CurrentPageNumber>1</ZV1:CurrentPageNumber><ZV1:ItemsPerPage>9</ZV1:ItemsPerPage>"
          "<ZV1:PurchaseType>rent</ZV1:PurchaseType></ZV1:getTitlesByGenreArray>"},
@@ -138,9 +141,9 @@ TEST(Request, EnvelopeAndHeaders)
     request = std::regex_replace(request, std::regex("\\d{4}-\\d\\d-\\d\\dT\\d\\d:\\d\\d:\\d\\dZ"), "CREATED");
     const std::string head = request.substr(0, request.find("\r\n\r\n") + 4);
     EXPECT_EQ("POST /api/StreamAPI.asmx HTTP/1.1", head.substr(0, head.find("\r\n")));
-    for (const char* line :
-         {"\r\nHost: 127.0.0.1:1\r\n", "\r\nUser-Agent: ZVSDK: F|A\r\n", "\r\nContent-Type: text/xml; charset=utf-8\r\n",
-          "\r\nConnection: keep-alive\r\n", "\r\nAccept-Encoding: gzip,deflate\r\n"}) {
+    for (const char* line : {"\r\nHost: 127.0.0.1:1\r\n", "\r\nUser-Agent: ZVSDK: F|A\r\n",
+                             "\r\nContent-Type: text/xml; charset=utf-8\r\n", "\r\nConnection: keep-alive\r\n",
+                             "\r\nAccept-Encoding: gzip,deflate\r\n"}) {
         EXPECT_NE(std::string::npos, head.find(line)) << line << head;
     }
     EXPECT_EQ(
