@@ -27,6 +27,7 @@ const ResponseCodes kResponseCodes[] = {
       kGeneral, kGeneral, kGeneral, kGeneral, kGeneral, kGeneral, kGeneral,
       ZV_WS_Status_product_not_available, ZV_WS_Status_discrepancy_in_total_amount,
       ZV_WS_Status_incompatible_products}},
+    {"ZV_WS_authorizeDevice", {ZV_WS_Status_invalid_pin, ZV_WS_Status_device_locked_out}},
     {"ZV_WS_getBillingInfo",
      {ZV_WS_Status_invalid_user_id, ZV_WS_Status_cc_not_on_file, ZV_WS_Status_invalid_cc_number,
       ZV_WS_Status_cc_expired}},

@@ -149,7 +149,8 @@ void Transport::Close()
     SigpipeGuard guard;
     const int error = m_Soap.error;
     m_Soap.keep_alive = 0;
-    soap_force_closesock(&m_Soap);
+    m_Soap.error = SOAP_OK;
+    soap_closesock(&m_Soap);  // keeps the TLS session for the next connection; soap_force_closesock leaves `ssl` behind
     m_Soap.error = error;
     m_Soap.keep_alive = 1;
     m_Soap.bufidx = m_Soap.buflen = 0;

@@ -52,7 +52,7 @@ void getConfig(Call& call)
             call.xml.Optional("Value", value).Raw("</Configuration>");
         };
         for (const auto& item : standard) {
-            if (call.database.Int("SELECT COUNT(*) FROM config WHERE key = ?", {item.first}) == 0)
+            if (call.database.Int("SELECT COUNT(*) FROM config WHERE key = ? COLLATE NOCASE", {item.first}) == 0)
                 write(item.first, item.second);
         }
         call.database.Each("SELECT key, value FROM config", {},
