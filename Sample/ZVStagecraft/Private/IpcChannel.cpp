@@ -1,0 +1,195 @@
+#include "IpcChannel.h"
+
+#include <pthread.h>
+#include <signal.h>
+#include <time.h>
+
+#include <atomic>
+
+#include "Host.h"
+#include "HostConsole.h"
+#include "player/NetworkStub.h"
+
+namespace {
+
+constexpr int kLastMessageSeconds = 5;
+
+// Set by the listen thread alone, when it is about to end.
+std::atomic<bool> s_quit{false};
+std::atomic<bool> s_closeRequested{false};
+pthread_t s_listenThread;  // main thread's
+bool s_listenThreadCreated = false;
+
+pthread_mutex_t s_processMutex = PTHREAD_MUTEX_INITIALIZER;
+
+int Send(NETWORK_MSG_STUB_TYPE type)
+{
+    const NETWORK_MSG_STUB_MESSAGE message = {static_cast<uint32_t>(type), {0, 0, 0}};
+    return network_stub_send_ipc_msg(&message);
+}
+
+void Dispatch(uint32_t type)
+{
+    switch (type) {
+        case NETWORK_MSG_STUB_INIT:
+            HostPrint("[ZV_FLASH] NETWORK_MSG_STUB_INIT !");
+            break;
+        case NETWORK_MSG_STUB_UNINIT:
+            HostPrint("[ZV_FLASH] NETWORK_MSG_STUB_UNINIT !");
+            // Before the movie ends: start-up reads it then.
+            zv_stagecraft_ipc_state_set(true);
+            s_quit = true;
+            zv_stagecraft_uninit_proc();
+            break;
+        case NETWORK_MSG_STUB_FINALIZE_DONE:
+            HostPrint("[ZV_FLASH] listener thread main,zv_app_recv_ipc_msg() NETWORK_MSG_STUB_FINALIZE_DONE!");
+            s_quit = true;
+            uninit_network_msg_queue();
+            break;
+        case NETWORK_MSG_STUB_FINALIZE_NETWORK_ERROR:
+            HostPrint("[ZV_FLASH] listener thread main,zv_app_recv_ipc_msg() NETWORK_MSG_STUB_FINALIZE_NETWORK_ERROR!");
+            break;
+        default:
+            break;
+    }
+}
+
+void* _zv_stagecraft_ipc_listen_thread_main(void*)
+{
+    pthread_setname_np(pthread_self(), "zv_ipc_listen");
+    HostPrint("<ZV_FLASH> Calling -------> %s, %d\n", __func__, s_quit ? 1 : 0);
+    while (!s_quit) {
+        HostPrint("[ZV_FLASH] IPC enter ");
+        NETWORK_MSG_STUB_MESSAGE message;
+        const int error = network_stub_recv_ipc_msg(&message);
+        if (error != 0) {
+            HostPrint(
+                "[ZV_FLASH]listener thread main, zv_app_recv_ipc_msg() failed! ERR =%d ,Release flash resource \n",
+                error);
+            s_quit = true;
+            zv_stagecraft_uninit_proc();
+            break;
+        }
+        HostPrint("[ZV_FLASH] IPC get %d \n", static_cast<int>(message.type));
+        Dispatch(message.type);
+    }
+    HostPrint("<ZV_FLASH> ipc listener thread main has exit!");
+    return reinterpret_cast<void*>(1);
+}
+
+}  // namespace
+
+int zv_stagecraft_ipc_init()
+{
+    HostPrint("[ZV_FLASH] zv_stagecraft_ipc_init enter ");
+    if (init_network_msg_queue() == 0) return 0;
+    HostPrint("[ZV_FLASH] zv_stagecraft_ipc_init Error ");
+    return -1;
+}
+
+void zv_stagecraft_ipc_release() {}
+
+int start_zv_stagecraft_ipc_listen_thread()
+{
+    HostPrint("<ZV_FLASH>,start_zv_stagecraft_ipc_listen_thread enter ");
+    sigset_t quit;
+    sigemptyset(&quit);
+    sigaddset(&quit, SIGQUIT);
+    int i4_ret = pthread_sigmask(SIG_BLOCK, &quit, nullptr);  // the listen thread inherits it
+    if (i4_ret != 0) {
+        HostPrint("[ZV_FLASH] start_zv_app_ipc_listen_thread: sig block error! ");
+        return i4_ret;
+    }
+    i4_ret = pthread_create(&s_listenThread, nullptr, _zv_stagecraft_ipc_listen_thread_main, nullptr);
+    if (i4_ret == 0) {
+        s_listenThreadCreated = true;
+        HostPrint("<ZV_FLASH>,start_zv_app_ipc_listen_thread create ok! ");
+    } else {
+        HostPrint("<ZV_FLASH>ERR: create  IPC thread failed, i4_ret [%ld],at L%d\r\n", static_cast<long>(i4_ret),
+                  __LINE__);
+    }
+    return i4_ret;
+}
+
+int stop_zv_stagecraft_ipc_listen_thread()
+{
+    HostPrint("[ZV_FLASH] stop_zv_app_ipc_listen_thread Enter! ");
+    if (s_quit) {
+        HostPrint("[ZV_FLASH] ipc thread already exit, now do nothing! ");
+        return 0;
+    }
+    HostPrint("[ZV_FLASH] STOP: send FINALIZE msg to BDP ");
+    const int error = Send(NETWORK_MSG_STUB_FINALIZE);
+    if (error == 0) return 0;
+    HostPrint("[ZV_FLASH] send NETWORK_MSG_STUB_FINALIZE failed! ERR =%d \n", error);
+    return -1;
+}
+
+void WaitForIpcListenThread()
+{
+    if (!s_listenThreadCreated) return;
+    timespec deadline;
+    clock_gettime(CLOCK_MONOTONIC, &deadline);
+    deadline.tv_sec += kLastMessageSeconds;
+    pthread_clockjoin_np(s_listenThread, nullptr, CLOCK_MONOTONIC, &deadline);
+    s_listenThreadCreated = false;
+}
+
+int zv_stagecraft_finalize_proc()
+{
+    HostPrint("[ZV_FLASH]Call----> zv_stagecraft_finalize_proc ");
+    exit_zv_stagecraft();
+    stop_zv_stagecraft_ipc_listen_thread();
+    return 0;
+}
+
+int zv_stagecraft_uninit_proc()
+{
+    HostPrint("[ZV_FLASH]Call----> zv_stagecraft_uninit_proc ");
+    if (exit_zv_stagecraft() != 0) HostPrint("[ZV_FLASH]zv_stagecraft_uninit_proc: exit_zv_stagecraft FAIL ");
+    return 0;
+}
+
+int zv_stagecraft_exit_by_bdp_release()
+{
+    HostPrint("[ZV_FLASH]Call----> zv_stagecraft_exit_by_bdp_release ");
+    if (Send(NETWORK_MSG_STUB_UNINIT_RET) != 0) {
+        HostPrint("[ZV_FLASH] IPC:,NETWORK_MSG_STUB_UNINIT_RET failed! ERR = \n");
+        return -1;
+    }
+    uninit_network_msg_queue();
+    return 0;
+}
+
+void zv_stagecraft_lock_init()
+{
+    pthread_mutex_init(&s_processMutex, nullptr);
+}
+
+void zv_stagecraft_lock_uninit()
+{
+    pthread_mutex_destroy(&s_processMutex);
+}
+
+void zv_stagecraft_lock()
+{
+    HostPrint("ZV_FLASH] zv_stagecraft_lock enter ! ");
+    pthread_mutex_lock(&s_processMutex);
+    pthread_mutex_unlock(&s_processMutex);
+    HostPrint("ZV_FLASH] zv_stagecraft_lock leave ! ");
+}
+
+void zv_stagecraft_unlock()
+{
+    pthread_mutex_unlock(&s_processMutex);
+}
+
+bool zv_stagecraft_ipc_state_get()
+{
+    return s_closeRequested;
+}
+
+void zv_stagecraft_ipc_state_set(bool requested)
+{
+    s_closeRequested = requested;
+}
