@@ -6,16 +6,10 @@
 #include <time.h>
 
 #include "Namespaces.h"
+#include "ReadLimits.h"
 #include "Tls.h"
 
 namespace {
-
-// The largest page of titles is below 100 KiB; what is larger than this is an attack or a fault. Counts inflated bytes
-// too.
-constexpr size_t kLongestMessage = 4u << 20;
-constexpr long kLongestString = 1l << 20;
-constexpr long kMostElements = 4096;
-constexpr unsigned int kDeepestLevel = 64;
 
 // Until a session's settings are there (discovery comes first).
 constexpr int kSendSeconds = 30;
@@ -80,10 +74,7 @@ Transport::Transport(soap& context)
     context.fposthdr = HeaderHook;
     context.fshutdownsocket = ShutdownHook;
     context.cookie_max = 0;
-    context.recv_maxlength = kLongestMessage;
-    context.maxlength = kLongestString;
-    context.maxoccurs = kMostElements;
-    context.maxlevel = kDeepestLevel;
+    LimitReading(context);
     context.ssl_flags = SOAP_SSL_DEFAULT | SOAP_TLSv1_2 | SOAP_TLSv1_3 | SOAP_SSL_NO_DEFAULT_CA_PATH;
     SetTimeouts(kSendSeconds, kReceiveSeconds);
 }
