@@ -49,7 +49,7 @@ public:
 
 private:
     // How long the script may go on after a stop request before it is broken off.
-    static constexpr std::chrono::milliseconds kScriptGrace{2000};
+    static constexpr std::chrono::milliseconds kScriptGrace{1000};
 
     mutable std::mutex m_mutex;
     std::condition_variable m_wake;
