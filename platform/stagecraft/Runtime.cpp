@@ -120,7 +120,7 @@ AEError Runtime::CreateAndConfigureStageWindowSet(AEArray<StageWindow*>& set, in
     m_movieClasses = m_classes;
     m_movie = std::make_unique<Movie>(std::move(options), std::move(text), m_movieClasses, m_stop);
     m_wasRun = false;
-    m_stop.Accept(true);
+    m_stop.Reset();
     set.Append(m_movie.get());
     return Ok();
 }
@@ -139,10 +139,7 @@ AEError Runtime::RunStageWindowSet(AEArray<StageWindow*>& set)
 
 AEError Runtime::DestroyStageWindowSet(AEArray<StageWindow*>& set)
 {
-    if (Holds(set)) {
-        m_stop.Accept(false);
-        m_movie.reset();
-    }
+    if (Holds(set)) m_movie.reset();
     set.RemoveAll();
     return Ok();
 }

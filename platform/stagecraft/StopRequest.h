@@ -9,21 +9,19 @@
 
 class StopRequest {
 public:
-    // Dropped unless requests are accepted.
     void Raise()
     {
         const std::lock_guard<std::mutex> lock(m_mutex);
-        if (!m_accepted || m_raised) return;
+        if (m_raised) return;
         m_raised = true;
         if (m_pBreakTimer) m_pBreakTimer->Start(kScriptGrace);
         m_wake.notify_all();
     }
 
-    // Accepting anew forgets an earlier request.
-    void Accept(bool accept)
+    // Forgets requests: they were for an earlier movie, or for none.
+    void Reset()
     {
         const std::lock_guard<std::mutex> lock(m_mutex);
-        m_accepted = accept;
         m_raised = false;
     }
 
@@ -49,11 +47,10 @@ public:
 
 private:
     // How long the script may go on after a stop request before it is broken off.
-    static constexpr std::chrono::milliseconds kScriptGrace{2000};
+    static constexpr std::chrono::milliseconds kScriptGrace{1000};
 
     mutable std::mutex m_mutex;
     std::condition_variable m_wake;
-    bool m_accepted = false;
     bool m_raised = false;
     BreakTimer* m_pBreakTimer = nullptr;
 };

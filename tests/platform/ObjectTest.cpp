@@ -242,6 +242,24 @@ TEST_F(RuntimeTest, ObjectsRegisteredForUpdatesAreKept)
               (Lines{"constructed kept", "update", "update", "update", "destructed kept"}));
 }
 
+TEST_F(RuntimeTest, CollectedInstancesAreDestructedWhileTheMovieRuns)
+{
+    ASValue held;
+    Probe::s_run = [&](const Invocation& call) {
+        held = ASValue();
+        if (!call.arguments.empty()) held = call.arguments[0];
+        call.result = ASValue::Number(Probe::s_deleted);
+    };
+    Probe::s_onUpdate = [](const Invocation& call) { call.object.StopUpdates(); };
+    EXPECT_EQ(Logged(std::string(kCollect) +
+                     "new Probe(); new Probe().startUpdates(); probe.run(new Probe());"
+                     "var ticks = 0, timer = setInterval(function() {"
+                     "    collect();"
+                     "    if (probe.run() === 3) { probe.log('all'); clearInterval(timer); }"
+                     "    else if (++ticks === 500) { probe.log(probe.run()); clearInterval(timer); } }, 0);"),
+              Lines{"all"});
+}
+
 TEST_F(RuntimeTest, ReferencesOutliveTheSet)
 {
     ASValue object, instance;

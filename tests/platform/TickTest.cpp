@@ -61,6 +61,14 @@ TEST_F(RuntimeTest, TimersRunInTheOrderTheyAreDue)
               (Lines{"first", "second", "negative", "nan", "none", "middle", "late", "extra 2 2"}));
 }
 
+TEST_F(RuntimeTest, TimersOfOneTickRunInTheOrderTheyAreDue)
+{
+    EXPECT_EQ(Logged("function log(text) { return function() { probe.log(text); }; }"
+                     "setTimeout(log('second'), 20); setTimeout(log('third'), 20); setTimeout(log('first'), 10);"
+                     "var start = Date.now(); while (Date.now() < start + 60) {}"),
+              (Lines{"first", "second", "third"}));
+}
+
 TEST_F(RuntimeTest, TimersAreCleared)
 {
     EXPECT_EQ(

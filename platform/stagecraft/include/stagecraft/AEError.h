@@ -22,10 +22,9 @@ public:
     AEError() : AEError("Uninitialized", Uninitialized) {}
 
     // The name is cut to kMaxName - 1 bytes; null is the empty name.
-    AEError(const char* pName, uint32_t value) : m_nErrorValue(value)
+    AEError(const char* pName, uint32_t value) : m_errorName{}, m_nErrorValue(value)
     {
-        strncpy(m_errorName, pName ? pName : "", kMaxName - 1);
-        m_errorName[kMaxName - 1] = '\0';
+        if (pName) memcpy(m_errorName, pName, strnlen(pName, kMaxName - 1));
     }
 
     AEError(const AEError&) = default;
