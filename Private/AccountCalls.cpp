@@ -5,14 +5,18 @@
 
 namespace {
 
-// Both services' page of purchases; the operations differ in name only.
-template <class Op>
+// Both services' page of purchases; the operations differ in name, and what is downloaded is never cached.
+template <class Op, bool isCached>
 ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_Pagination* page,
                       ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter, int watchStatus,
                       ZV_WS_MyVideosResponse* videos)
 {
     ServiceCall<Op> call(function, handle, videos);
     if (!call.Accepts(page)) return call.Refusal();
+    if (isCached) {
+        call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, "getMyVideos", page->CurrentPageNumber, page->ItemsPerPage,
+                     purchaseType, typeFilter, watchStatus);
+    }
     SetPage(call, *page);
     SetEnum(call->PurchaseType, purchaseType);
     SetEnum(call->TitleType, typeFilter);
@@ -39,7 +43,8 @@ bool Downloads(const ZV_WS_Session* handle)
 ZV_WS_Status ZV_WS_getMyVideos(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
                                ZV_WS_TitleTypeFilter typeFilter, int watchStatus, ZV_WS_MyVideosResponse* videos)
 {
-    const auto ask = Downloads(handle) ? MyVideos<Operation::getMyVideos> : MyVideos<Operation::getMyStreamingVideos>;
+    const auto ask =
+        Downloads(handle) ? MyVideos<Operation::getMyVideos, false> : MyVideos<Operation::getMyStreamingVideos, true>;
     return ask(__func__, handle, page, purchaseType, typeFilter, watchStatus, videos);
 }
 
@@ -81,7 +86,7 @@ ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* passw
     ServiceCall<Operation::removeAllMyPurchases> call(__func__, handle, answer);
     if (!call.Accepts(password && *password)) return call.Refusal();
     call->password = Text(password);
-    return call.Into(answer);
+    return DropStale(call.session(), "getMyVideos", call.Into(answer));
 }
 
 ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
@@ -103,12 +108,14 @@ ZV_WS_Status ZV_WS_checkAdultVerificationPin(ZV_WS_Session* handle, int pin,
 
 ZV_WS_Status ZV_WS_getEmailAddress(ZV_WS_Session* handle, ZV_WS_EmailAddressResponse* address)
 {
-    return Ask<Operation::getEmailAddress>(__func__, handle, address);
+    return Ask<Operation::getEmailAddress>(__func__, handle, address, ZV_WS_CacheParam::CacheData_Userdata,
+                                           "getEmailAddress");
 }
 
 ZV_WS_Status ZV_WS_getBillingInfo(ZV_WS_Session* handle, ZV_WS_BillingInfoResponse* billing)
 {
-    return Ask<Operation::getBillingInfo>(__func__, handle, billing);
+    return Ask<Operation::getBillingInfo>(__func__, handle, billing, ZV_WS_CacheParam::CacheData_Userdata,
+                                          "getBillingInfo");
 }
 
 ZV_WS_Status ZV_WS_getBillingInfoAndPPCBalance(ZV_WS_Session* handle, ZV_WS_BillingInfoAndPPCBalanceResponse* billing)
@@ -138,7 +145,7 @@ ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, cons
     call->SkuID = skuID;
     call->IPAddress = Text(ipAddress);
     call->UsePrePaidFunds = Text(usePrepaidFund ? "yes" : "no");
-    return call.Into(purchase);
+    return DropStale(call.session(), "getMyVideos", call.Into(purchase));
 }
 
 ZV_WS_Status ZV_WS_calcOrderTax(ZV_WS_Session* handle, int skuID, ZV_WS_CalcOrderTaxResponse* tax)

@@ -1,9 +1,11 @@
 // The catalogue: genres, titles and their details.
 #include "ServiceCall.h"
 
+static constexpr auto kMetadata = ZV_WS_CacheParam::CacheData_Metadata;
+
 ZV_WS_Status ZV_WS_getNavigation(ZV_WS_Session* handle, ZV_WS_GenreArray* genres)
 {
-    return Ask<Operation::getNavigation>(__func__, handle, genres);
+    return Ask<Operation::getNavigation>(__func__, handle, genres, kMetadata, "getNavigation");
 }
 
 ZV_WS_Status ZV_WS_getGenreLabel(ZV_WS_Session* handle, int genreID, ZV_WS_GenreLabelResponse* label)
@@ -19,6 +21,7 @@ ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pag
 {
     ServiceCall<Operation::getTitlesByNavigation> call(__func__, handle, titles);
     if (!call.Accepts(page)) return call.Refusal();
+    call.CacheAs(kMetadata, "getTitles", genreID, page->CurrentPageNumber, page->ItemsPerPage, purchaseType);
     call->GenreID = genreID;
     SetPage(call, *page);
     SetEnum(call->PurchaseType, purchaseType);
@@ -42,6 +45,7 @@ ZV_WS_Status ZV_WS_getTitleListing(ZV_WS_Session* handle, int titleID, ZV_WS_Tit
 {
     ServiceCall<Operation::getTitleListing> call(__func__, handle, listing);
     if (!call.Accepts()) return call.Refusal();
+    call.CacheAs(kMetadata, "getTitleListing", titleID);
     call->TitleID = titleID;
     return call.Into(listing);
 }
@@ -50,6 +54,7 @@ ZV_WS_Status ZV_WS_getTvEpisodeListing(ZV_WS_Session* handle, int episodeID, ZV_
 {
     ServiceCall<Operation::getTvEpisodeListing> call(__func__, handle, listing);
     if (!call.Accepts()) return call.Refusal();
+    call.CacheAs(kMetadata, "getTvEpisodeListing", episodeID);
     call->EpisodeID = episodeID;
     return call.Into(listing);
 }
@@ -58,6 +63,7 @@ ZV_WS_Status ZV_WS_getTvEpisodeListByTitleID(ZV_WS_Session* handle, int titleID,
 {
     ServiceCall<Operation::getTvEpisodeListByTitleID> call(__func__, handle, episodes);
     if (!call.Accepts()) return call.Refusal();
+    call.CacheAs(kMetadata, "getTvEpisodeListByTitleID", titleID);
     call->TitleID = titleID;
     return call.Into(episodes);
 }
@@ -67,6 +73,7 @@ ZV_WS_Status ZV_WS_getAllTvEpisodeListings(ZV_WS_Session* handle, int titleID,
 {
     ServiceCall<Operation::getAllTvEpisodeListings> call(__func__, handle, listings);
     if (!call.Accepts()) return call.Refusal();
+    call.CacheAs(kMetadata, "getAllTvEpisodeListings", titleID);
     call->TitleID = titleID;
     return call.Into(listings);
 }
@@ -75,6 +82,7 @@ ZV_WS_Status ZV_WS_translateSkuID(ZV_WS_Session* handle, int skuID, ZV_WS_Transl
 {
     ServiceCall<Operation::translateSkuId> call(__func__, handle, title);
     if (!call.Accepts()) return call.Refusal();
+    call.CacheAs(kMetadata, "translateSkuID", skuID);
     call->SkuId = skuID;
     return call.Into(title);
 }
@@ -84,18 +92,20 @@ ZV_WS_Status ZV_WS_translateTivoExternalID(ZV_WS_Session* handle, const char* ex
 {
     ServiceCall<Operation::translateTivoExternalId> call(__func__, handle, title);
     if (!call.Accepts()) return call.Refusal();
+    call.CacheAs(kMetadata, "translateTivoExternalID", externalID);
     call->TivoExternalId = Text(externalID);
     return call.Into(title);
 }
 
 // The two searches differ only in how much of each title they answer.
 template <class Op>
-static ZV_WS_Status Search(const char* function, ZV_WS_Session* handle, const ZV_WS_Pagination* page,
+static ZV_WS_Status Search(const char* function, const char* table, ZV_WS_Session* handle, const ZV_WS_Pagination* page,
                            ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter, const char* query,
                            ZV_WS_TitlesResponse* titles)
 {
     ServiceCall<Op> call(function, handle, titles);
     if (!call.Accepts(page)) return call.Refusal();
+    call.CacheAs(kMetadata, table, page->CurrentPageNumber, page->ItemsPerPage, purchaseType, typeFilter, query);
     call->Query = Text(query);
     SetPage(call, *page);
     SetEnum(call->PurchaseType, purchaseType);
@@ -106,20 +116,23 @@ static ZV_WS_Status Search(const char* function, ZV_WS_Session* handle, const ZV
 ZV_WS_Status ZV_WS_searchForTitle(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
                                   ZV_WS_TitleTypeFilter typeFilter, const char* query, ZV_WS_TitlesResponse* titles)
 {
-    return Search<Operation::searchForTitle>(__func__, handle, page, purchaseType, typeFilter, query, titles);
+    return Search<Operation::searchForTitle>(__func__, "searchForTitle", handle, page, purchaseType, typeFilter, query,
+                                             titles);
 }
 
 ZV_WS_Status ZV_WS_searchForTitleDetail(ZV_WS_Session* handle, const ZV_WS_Pagination* page,
                                         ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter,
                                         const char* query, ZV_WS_TitlesResponse* titles)
 {
-    return Search<Operation::searchForTitleDetail>(__func__, handle, page, purchaseType, typeFilter, query, titles);
+    return Search<Operation::searchForTitleDetail>(__func__, "searchForTitleDetail", handle, page, purchaseType,
+                                                   typeFilter, query, titles);
 }
 
 ZV_WS_Status ZV_WS_getRecommendedTitles(ZV_WS_Session* handle, int titleID, ZV_WS_RecommendedTitlesResponse* titles)
 {
     ServiceCall<Operation::getRecommendedTitles> call(__func__, handle, titles);
     if (!call.Accepts()) return call.Refusal();
+    call.CacheAs(kMetadata, "getRecommendedTitles", titleID);
     call->TitleId = titleID;
     return call.Into(titles);
 }

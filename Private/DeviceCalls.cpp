@@ -36,7 +36,8 @@ ZV_WS_Status ZV_WS_getConfig(ZV_WS_Session* handle, ZV_WS_ConfigResponse* config
 
 ZV_WS_Status ZV_WS_getSettingsPageInfo(ZV_WS_Session* handle, ZV_WS_SettingsPageInfoResponse* info)
 {
-    return Ask<Operation::getSettingsPageInfo>(__func__, handle, info);
+    return Ask<Operation::getSettingsPageInfo>(__func__, handle, info, ZV_WS_CacheParam::CacheData_Userdata,
+                                               "getSettingsPageInfo");
 }
 
 ZV_WS_Status ZV_WS_getCountryID(ZV_WS_Session* handle, int* countryID)

@@ -38,6 +38,8 @@ ZV_OPERATION(m_Browse,   translateTivoExternalId,               false)
 ZV_OPERATION(m_Browse,   searchForTitle,                        false)
 ZV_OPERATION(m_Browse,   searchForTitleDetail,                  false)
 ZV_OPERATION(m_Browse,   getRecommendedTitles,                  false)
+ZV_OPERATION(m_Browse,   shouldUpdateCache,                     false)
+ZV_OPERATION(m_Browse,   getLastCacheLoadTimeUTC,               false)
 
 ZV_OPERATION(m_Facade,   authorizeDevice,                       true)
 ZV_OPERATION(m_Facade,   deactivateDevice,                      true)

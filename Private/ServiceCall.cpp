@@ -13,14 +13,24 @@ void ServiceCallBase::LogProxy(const char* verb, const char* proxy, const char* 
     ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s %s::%s\n", verb, proxy, operation);
 }
 
-ZV_WS_Status ServiceCallBase::Finish(soap& context, int result, bool answered, int responseCode)
+ZV_WS_Status ServiceCallBase::Finish(soap& context, const Outcome& outcome)
 {
     soap_destroy(&context);
     soap_end(&context);
     context.header = nullptr;
-    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, ret:%d,responseCode:%d\n", m_Function, result, responseCode);
-    if (result == SOAP_OK && !answered) return ZV_WS_Status_general_error;
-    return ZVUtilities::To_ZV_WS_Status(result, m_UsesResponseCode ? responseCode : 0, m_Function);
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, ret:%d,responseCode:%d\n", m_Function, outcome.result,
+                 outcome.responseCode);
+    if (outcome.result == SOAP_OK && !outcome.answered) return ZV_WS_Status_general_error;
+    return ZVUtilities::To_ZV_WS_Status(outcome.result, m_UsesResponseCode ? outcome.responseCode : 0, m_Function);
+}
+
+ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status)
+{
+    if (status != ZV_WS_Status_ok || !session.m_Cache) return status;
+    return GuardCall([&] {
+        session.m_Cache->PurgeUserData(table);
+        return status;
+    });
 }
 
 ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, bool answer)

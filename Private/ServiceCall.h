@@ -2,17 +2,20 @@
 //
 //     ServiceCall<Operation::getTitleListing> call(__func__, handle, listing);
 //     if (!call.Accepts()) return call.Refusal();
+//     call.CacheAs(ZV_WS_CacheParam::CacheData_Metadata, "getTitleListing", titleID);
 //     call->TitleID = titleID;
 //     return call.Into(listing);
 //
 // The first line empties and tags the output, so that it can be released however the call ends. Then the call's own
-// argument checks, and the request's children. Into sends the request, once more when a connection kept from an earlier
-// call turns out to be dead and the operation changes nothing, converts the answer's result (Conversion.h), cleans up,
-// writes the log line and maps the status. Nothing is thrown through it.
+// argument checks, where the cache keeps the answer (if it does), and the request's children. Into looks there, or
+// sends the request, once more when a connection kept from an earlier call turns out to be dead and the operation
+// changes nothing, converts the answer's result (Conversion.h), cleans up, writes the log line and maps the status.
+// Nothing is thrown through it.
 #pragma once
 
 #include <utility>
 
+#include "AnswerCache.h"
 #include "CallGuard.h"
 #include "Conversion.h"
 #include "Operations.h"
@@ -48,6 +51,14 @@ public:
     /// The status shall tell of the transport only: the service's response code stays in the record.
     void IgnoreResponseCode() { m_UsesResponseCode = false; }
 
+    /// The answer is looked for in the session's cache before the service is asked, and kept there when the service
+    /// says success. The key is made of all the arguments, numbers and texts.
+    template <class... Arguments>
+    void CacheAs(ZV_WS_CacheParam::CacheData kind, const char* table, const Arguments&... arguments)
+    {
+        m_Entry = {kind, table, arguments...};
+    }
+
     /// Only when the call can be made.
     SessionImpl& session() { return *m_Session; }
 
@@ -59,9 +70,14 @@ protected:
     template <class Service, class Send>
     int Exchange(Service& service, const char* operation, bool changes, Send&& send);
 
-    /// Frees the context's temporary data, logs, and maps the status. `answered` tells whether an answer came with a
-    /// result.
-    ZV_WS_Status Finish(soap& context, int result, bool answered, int responseCode);
+    struct Outcome {
+        int result = SOAP_OK;   ///< The SOAP runtime's.
+        bool answered = false;  ///< An answer came with a result, and the output has it.
+        int responseCode = 0;
+    };
+
+    /// Frees the context's temporary data, logs, and maps the status.
+    ZV_WS_Status Finish(soap& context, const Outcome& outcome);
 
     static void LogProxy(const char* verb, const char* proxy, const char* operation);
 
@@ -69,6 +85,7 @@ protected:
     SessionImpl* m_Session;
     bool m_Tagged = true;
     bool m_UsesResponseCode = true;
+    AnswerCache::Entry m_Entry;
 };
 
 template <class Op>
@@ -106,27 +123,47 @@ public:
     ZV_WS_Status Into(Convert convert)
     {
         auto& service = Op::Service(*m_Session);
-        const int result =
-            Exchange(service, Op::kName, Op::kChanges, [&] { return Op::Send(*m_Session, m_Request, m_Response); });
-        Answer* answer = result == SOAP_OK ? Op::Result(m_Response) : nullptr;
-        const bool converted = answer && GuardCall([&] {
-                                             convert(answer);
-                                             return ZV_WS_Status_ok;
-                                         }) == ZV_WS_Status_ok;
-        return Finish(service, result, converted, answer ? CallDetail::ResponseCodeOf(*answer, 0) : 0);
+        Outcome outcome;
+        const ZV_WS_Status guarded = GuardCall([&] {
+            Make(service, convert, outcome);
+            return ZV_WS_Status_ok;
+        });
+        if (guarded != ZV_WS_Status_ok) service.transport().Close();  // left in the middle of something
+        return Finish(service, outcome);
     }
 
 private:
+    template <class Service, class Convert>
+    void Make(Service& service, Convert& convert, Outcome& outcome)
+    {
+        AnswerCache cache(*m_Session, m_Entry);
+        Answer* answer = cache.Find(m_Response) ? Op::Result(m_Response) : nullptr;
+        const bool isCached = answer != nullptr;
+        if (!isCached) {
+            outcome.result =
+                Exchange(service, Op::kName, Op::kChanges, [&] { return Op::Send(*m_Session, m_Request, m_Response); });
+            answer = outcome.result == SOAP_OK ? Op::Result(m_Response) : nullptr;
+        }
+        if (!answer) return;
+        outcome.responseCode = CallDetail::ResponseCodeOf(*answer, 0);
+        convert(answer);
+        outcome.answered = true;
+        if (!isCached && outcome.responseCode == 0) cache.Store(m_Response);
+    }
+
     typename Op::Request m_Request;
     typename Op::Response m_Response;
 };
 
-/// A whole call of an operation without arguments.
+/// A whole call of an operation without arguments, whose answer is kept in the cache when a table is named.
 template <class Op, class Output>
-ZV_WS_Status Ask(const char* function, const ZV_WS_Session* handle, Output* out)
+ZV_WS_Status Ask(const char* function, const ZV_WS_Session* handle, Output* out, ZV_WS_CacheParam::CacheData kind = {},
+                 const char* table = nullptr)
 {
     ServiceCall<Op> call(function, handle, out);
-    return call.Accepts() ? call.Into(out) : call.Refusal();
+    if (!call.Accepts()) return call.Refusal();
+    if (table) call.CacheAs(kind, table, 0);
+    return call.Into(out);
 }
 
 /// Fills the children by which all requests for a page name it.
@@ -158,6 +195,10 @@ inline ZV1__ArrayOfInt BorrowedInts(const int* numbers, unsigned int count)
     array.int_ = const_cast<int*>(numbers);
     return array;
 }
+
+/// Drops the user's data of that cache table, which a change has made stale, unless the change failed; returns its
+/// status.
+ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status);
 
 /// Logs the answer of a yes-or-no call; returns its status.
 ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, bool answer);

@@ -1,6 +1,7 @@
 #include <stdio.h>
 #include <string.h>
 
+#include "CacheMgr.h"
 #include "CallGuard.h"
 #include "Records.h"
 #include "SessionImpl.h"
@@ -136,6 +137,26 @@ void InitFacade(SessionImpl& session)
     session.m_Facade.Init(&session.m_Stream, &session.m_Download, session.m_Params.AccessType);
 }
 
+ZV_WS_CacheParam2 CacheParamOf(const ZV_WS_SetupParams2& own)
+{
+    ZV_WS_CacheParam2 param;
+    param.type = own.CacheKind;
+    param.flags = static_cast<int>(own.CacheData);
+    param.size = own.CacheLimit;
+    param.path = own.CachePath;
+    return param;
+}
+
+// Opens the session's cache. A file that cannot be opened is made anew once when `mayReplace`.
+bool OpenCache(SessionImpl& session, bool mayReplace)
+{
+    const ZV_WS_CacheParam2 param = CacheParamOf(session.m_Params);
+    session.m_Cache = std::make_unique<CacheMgr>();
+    if (session.m_Cache->Open(param) == 0) return true;
+    const char* file = param.path.c_str();
+    return mayReplace && ZVFile::Exist(file) && ZVFile::Remove(file) && session.m_Cache->Open(param) == 0;
+}
+
 void MakeEmptySession(ZV_WS_Session& handle)
 {
     handle._pSessionImpl = nullptr;
@@ -184,6 +205,10 @@ ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
     SetParams(session);
     own.AccessType = AccessTypeOf(handle, params.AccessType);
     InitFacade(session);
+
+    if (own.CacheKind == CacheType_None) return ZV_WS_Status_ok;
+    if (!OpenCache(session, true)) return ZV_WS_Status_local_cache_error;
+    ZV_WS_updateLocalCache(handle, ZV_WS_CacheParam::CacheData_Metadata | ZV_WS_CacheParam::CacheData_Userdata);
     return ZV_WS_Status_ok;
 }
 
@@ -232,7 +257,9 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
         session.m_Params = source->_pSessionImpl->m_Params;
         SetParams(session);
         InitFacade(session);
-        return ZV_WS_Status_ok;
+        // A memory cache is one session's own.
+        const bool opened = session.m_Params.CacheKind != CacheType_File || OpenCache(session, false);
+        return opened ? ZV_WS_Status_ok : ZV_WS_Status_local_cache_error;
     });
 }
 

@@ -1,6 +1,9 @@
 // What a session handle points to. Used by one thread at a time.
 #pragma once
 
+#include <memory>
+
+#include "CacheInterface.h"
 #include "RealTimeBrowse.h"
 #include "SetupParams2.h"
 #include "StreamDownloadAPI.h"
@@ -13,4 +16,8 @@ struct SessionImpl {
     DownloadAPI m_Download;
     StreamDownloadAPI m_Facade;
     ZV_WS_SetupParams2 m_Params;
+    std::unique_ptr<CacheInterface> m_Cache;  ///< Null when nothing is cached.
+
+    /// Whether there is a cache for that kind of data.
+    bool Caches(ZV_WS_CacheParam::CacheData kind) const { return m_Cache && (m_Params.CacheData & kind) != 0; }
 };

@@ -10,13 +10,36 @@ constexpr unsigned int kItemsPerPage = 50;
 // A bound for services that keep announcing one page more.
 constexpr unsigned int kMostPages = 1000;
 
+const char kListTable[] = "getWishlistItems";
+
+// Puts a title in or takes it out. `wished` is what the cache then knows of it; its pages of the list are stale.
 template <class Op>
-ZV_WS_Status ChangeItem(const char* function, ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer)
+ZV_WS_Status ChangeItem(const char* function, ZV_WS_Session* handle, int titleID, bool wished,
+                        ZV_WS_StandardResponse* answer)
 {
     ServiceCall<Op> call(function, handle, answer);
     if (!call.Accepts()) return call.Refusal();
     call->TitleID = titleID;
-    return call.Into(answer);
+    const ZV_WS_Status status = DropStale(call.session(), kListTable, call.Into(answer));
+    CacheInterface* cache = call.session().m_Cache.get();
+    if (status == ZV_WS_Status_ok && cache) cache->WriteWishlistFlag(titleID, wished);
+    return status;
+}
+
+// The flags of all the titles from the cache; false when it lacks one.
+bool ReadFlags(const SessionImpl& session, const int* titleIDs, ZV_WS_TitlesInWishlist& answers)
+{
+    for (unsigned int i = 0; i < answers.size; ++i) {
+        if (!session.m_Cache->ReadWishlistFlag(titleIDs[i], answers.IsAvailInUserWishlist[i])) return false;
+    }
+    return true;
+}
+
+void WriteFlags(const SessionImpl& session, const int* titleIDs, const ZV_WS_TitlesInWishlist& answers)
+{
+    const bool* flags = answers.IsAvailInUserWishlist;
+    session.m_Cache->WriteWishlistFlags(ZVWS_IntVector(titleIDs, titleIDs + answers.size),
+                                        ZVWS_BoolVector(flags, flags + answers.size));
 }
 
 // The titles of the whole list.
@@ -44,6 +67,8 @@ ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortO
 {
     ServiceCall<Operation::getWishlistItems> call(__func__, handle, items);
     if (!call.Accepts(page)) return call.Refusal();
+    call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, kListTable, sortOrder, page->CurrentPageNumber,
+                 page->ItemsPerPage, typeFilter);
     call->sortOrder = ZVUtilities::SortOrder2Int(sortOrder);
     SetPage(call, *page);
     SetEnum(call->TitleType, typeFilter);
@@ -52,26 +77,35 @@ ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortO
 
 ZV_WS_Status ZV_WS_addItemToWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer)
 {
-    return ChangeItem<Operation::addItemToWishlist>(__func__, handle, titleID, answer);
+    return ChangeItem<Operation::addItemToWishlist>(__func__, handle, titleID, true, answer);
 }
 
 ZV_WS_Status ZV_WS_removeItemFromWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer)
 {
-    return ChangeItem<Operation::removeItemFromWishList>(__func__, handle, titleID, answer);
+    return ChangeItem<Operation::removeItemFromWishList>(__func__, handle, titleID, false, answer);
 }
 
 ZV_WS_Status ZV_WS_removeAllItemsFromWishlist(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer)
 {
-    return Ask<Operation::removeAllItemsFromWishList>(__func__, handle, answer);
+    const ZV_WS_Status status = Ask<Operation::removeAllItemsFromWishList>(__func__, handle, answer);
+    if (status != ZV_WS_Status_ok) return status;
+    const SessionImpl& session = *handle->_pSessionImpl;
+    if (session.m_Cache) session.m_Cache->RemoveAllWishlistFlags();
+    return DropStale(session, kListTable, status);
 }
 
 ZV_WS_Status ZV_WS_checkTitleInWishlist(ZV_WS_Session* handle, int titleID, bool* isInWishlist)
 {
     ServiceCall<Operation::getTitleListing> call(__func__, handle, isInWishlist);
     if (!call.Accepts()) return call.Refusal();
+    CacheInterface* cache = call.session().m_Cache.get();
+    if (cache && cache->ReadWishlistFlag(titleID, *isInWishlist)) {
+        return LogAnswer(__func__, ZV_WS_Status_ok, *isInWishlist);
+    }
     call->TitleID = titleID;
     const ZV_WS_Status status =
         call.Into([&](const ZV1__TitleListingResponse* listing) { *isInWishlist = listing->IsAvailInUserWishList; });
+    if (cache && status == ZV_WS_Status_ok) cache->WriteWishlistFlag(titleID, *isInWishlist);
     return LogAnswer(__func__, status, *isInWishlist);
 }
 
@@ -82,12 +116,18 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
     return GuardCall([&] {
         Records::Tag(*answers);
         if (!handle || !handle->_pSessionImpl || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
+        const SessionImpl& session = *handle->_pSessionImpl;
+        Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
+        if (session.m_Cache && ReadFlags(session, titleIDs, *answers)) return ZV_WS_Status_ok;
         std::set<int> wished;
         const ZV_WS_Status status = ReadList(handle, typeFilter, wished);
-        if (status != ZV_WS_Status_ok) return status;
-        Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
+        if (status != ZV_WS_Status_ok) {
+            Records::FreeMembers(*answers);
+            return status;
+        }
         std::transform(titleIDs, titleIDs + count, answers->IsAvailInUserWishlist,
                        [&](int titleID) { return wished.count(titleID) != 0; });
+        if (session.m_Cache) WriteFlags(session, titleIDs, *answers);
         return ZV_WS_Status_ok;
     });
 }

@@ -694,6 +694,37 @@ ZV_WS_Status ZV_WS_getTHXMediaDirectorBonusAsset(ZV_WS_Session* handle, int bonu
 ZV_WS_Status ZV_WS_returnTimeout(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
 ZV_WS_Status ZV_WS_returnError(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
 
+// ---- Local cache. Calls of the catalogue and the account answer from it without asking the service, and keep there
+// what the service answered with success. A cache that fails never fails a call.
+
+/// Whether the catalogue has changed since that time (a text as ZV_WS_getLastCacheLoadTimeUTC gives it), by the
+/// service's opinion. The time is required.
+ZV_WS_Status ZV_WS_shouldUpdateCache(ZV_WS_Session* handle, const char* utcTime, bool* should);
+
+/// When the service last loaded its catalogue.
+ZV_WS_Status ZV_WS_getLastCacheLoadTimeUTC(ZV_WS_Session* handle, ZV_WS_String* utcTime);
+
+/// Refreshes the session's cache; `operations` are CacheData bits: the catalogue's answers are dropped when the service
+/// has loaded a new one, images are marked for revalidation, the user's data are dropped. ok also when nothing is
+/// cached; failed steps are not reported.
+ZV_WS_Status ZV_WS_updateLocalCache(ZV_WS_Session* handle, unsigned int operations);
+
+/// Removes images, databases and temporary files of a cache folder. The folder is required.
+ZV_WS_Status ZV_WS_clearLocalCache(const char* folder);
+
+// ---- Box art. `prefix` is a title's BoxArtPrefix and required; one that is no plain file name is
+// ZV_WS_Status_invalid_param. Others: connection_error; net_error; file_operation_error; file_not_found_on_server. An
+// image that cannot be revalidated is answered as it is cached.
+
+/// An image's bytes, from the cache or the image host.
+ZV_WS_Status ZV_WS_getBoxArtImageData(ZV_WS_Session* handle, ZV_WS_BoxArtSize size, const char* prefix,
+                                      ZV_WS_Image* image);
+
+/// Where an image is: the file in the folder of a file cache that keeps images, fetched when it is not there; for other
+/// sessions its address, and nothing is fetched.
+ZV_WS_Status ZV_WS_getBoxArtImage(ZV_WS_Session* handle, ZV_WS_BoxArtSize size, const char* prefix,
+                                  ZV_WS_String* place);
+
 // ---- Clock, bandwidth, address
 
 /// The service's clock in seconds since 1970 UTC; -1 on failure. Needs no session. ZV_WS_Status_connection_error,

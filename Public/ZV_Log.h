@@ -1,8 +1,8 @@
 // Logging: named areas, a severity mask for each, and one target for every line of the process.
 //
-// A line reads "[HH:MM:SS.mmm-area] text". Nothing adds a line end: texts bring their own. Nothing is printed until a target is set.
-// All of it may be called from any thread; lines of several threads reach the target one after the other. All failures are
-// silent: a bad id, an inactive area or a filtered severity drops the line.
+// A line reads "[HH:MM:SS.mmm-area] text". Nothing adds a line end: texts bring their own. Nothing is printed until a
+// target is set. All of it may be called from any thread; lines of several threads reach the target one after the
+// other. All failures are silent: a bad id, an inactive area or a filtered severity drops the line.
 #pragma once
 
 #include <stdarg.h>
@@ -17,11 +17,12 @@ enum { ZV_LOG_ERROR = 1, ZV_LOG_TRACE = 4, ZV_LOG_VERBOSE = 8 };
 #define ZVWS_SoapSentLOG_AREA_NAME "soap_sent"
 #define ZVWS_SoapTestLOG_AREA_NAME "soap_test"
 
-/// Takes a line. `length` 0 means that the text ends at its NUL. Called by the thread that logs, one line at a time; must not log.
+/// Takes a line. `length` 0 means that the text ends at its NUL. Called by the thread that logs, one line at a time;
+/// must not log.
 typedef void (*ZV_LogTarget)(const char* text, unsigned int length, void* user);
 
-/// The id of the area with that name, registered now unless it was before: a new one is active with all severities. 0, or 1
-/// (and id -1) when the table of 50 areas is full.
+/// The id of the area with that name, registered now unless it was before: a new one is active with all severities. 0,
+/// or 1 (and id -1) when the table of 50 areas is full.
 int ZV_LogRegisterArea(const char* name, int* id);
 void ZV_LogActivateArea(int id, bool on);
 void ZV_LogSetAreaSeverityMask(int id, int mask);
@@ -42,7 +43,8 @@ void ZV_LogSetTarget(ZV_LogTarget target, void* user);
 int ZV_LogGetConsoleTarget(ZV_LogTarget* target, void** user);
 void ZV_LogReleaseConsoleTarget(ZV_LogTarget target, void* user);
 
-/// A target that writes to a file, which it empties. `maxSize` 0 is no limit; else a full file starts again at its beginning
+/// A target that writes to a file, which it empties. `maxSize` 0 is no limit; else a full file starts again at its
+/// beginning
 /// (`wrap`), or takes no more. 0, or 2 and two nulls when the name is null or the file cannot be opened. Ends with
 /// ZV_LogReleaseFileTarget, after another target was set.
 int ZV_LogGetFileTarget(const char* fileName, ZV_LogTarget* target, void** user, unsigned int maxSize, bool wrap);
@@ -67,9 +69,9 @@ private:
 };
 
 /// Gives a source file its own GetZV_LogAreaID().
-#define ZV_LOG_AREA(name)              \
-    static int GetZV_LogAreaID()       \
-    {                                  \
+#define ZV_LOG_AREA(name)               \
+    static int GetZV_LogAreaID()        \
+    {                                   \
         static ZV_LogArea s_Area(name); \
-        return s_Area.Id();            \
+        return s_Area.Id();             \
     }

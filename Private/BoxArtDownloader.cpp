@@ -1,0 +1,125 @@
+#include "BoxArtDownloader.h"
+
+#include <algorithm>
+
+#include "BoxArtNames.h"
+#include "RawHttp.h"
+#include "ZVFile.h"
+#include "ZVUtilities.h"
+
+namespace {
+
+// The largest size is below 100 KiB.
+constexpr unsigned int kLargestImage = 4u << 20;
+
+ZVString ImagePath(const ZVString& prefix, ZV_WS_BoxArtSize size)
+{
+    return ZVString("/images/boxart/") + ZVUtilities::BoxArtSize2FolderSize(size) + "/" +
+           ZVUtilities::UrlEncode(prefix) + ZVUtilities::BoxArtSize2ImageSize(size) + ".jpg";
+}
+
+}  // namespace
+
+// Takes an image's bytes: into memory, or into a temporary file that becomes the image when it is whole.
+class BoxArtDownloader::Sink {
+public:
+    Sink(bool toFile, ZVString& target) : m_Target(target)
+    {
+        if (toFile) {
+            m_Temporary = ZVFile::CreateTempFileName(target.c_str());
+            m_IsFile = true;
+        } else {
+            m_Target = ZVString();
+        }
+    }
+    ~Sink()
+    {
+        m_File.Close();
+        if (!m_Temporary.empty()) ZVFile::Remove(m_Temporary.c_str());
+    }
+
+    ZV_WS_Status Open()
+    {
+        if (!m_IsFile) return ZV_WS_Status_ok;
+        const bool opened = !m_Temporary.empty() && m_File.Open(m_Temporary.c_str(), "wb");
+        return opened ? ZV_WS_Status_ok : ZV_WS_Status_net_error;
+    }
+
+    ZV_WS_Status Write(const char* bytes, size_t length)
+    {
+        if (!m_IsFile) {
+            m_Target.append(bytes, length);
+            return ZV_WS_Status_ok;
+        }
+        const auto size = static_cast<zv_int64>(length);
+        return m_File.Write(bytes, size) == size ? ZV_WS_Status_ok : ZV_WS_Status_file_operation_error;
+    }
+
+    ZV_WS_Status Commit()
+    {
+        if (!m_IsFile) return ZV_WS_Status_ok;
+        // What stdio still holds may not fit on the disk; the old file stays until the new one is in its place.
+        const bool written = m_File.Flush();
+        m_File.Close();
+        if (!written || !ZVFile::Rename(m_Temporary.c_str(), m_Target.c_str()))
+            return ZV_WS_Status_file_operation_error;
+        m_Temporary = ZVString();
+        return ZV_WS_Status_ok;
+    }
+
+private:
+    ZVString& m_Target;
+    bool m_IsFile = false;
+    ZVString m_Temporary;
+    ZVFile m_File;
+};
+
+ZVString BoxArtDownloader::ImageURL(const Deployment& deployment, const ZVString& prefix, ZV_WS_BoxArtSize size)
+{
+    return ZVString("http://") + deployment.image_host + ImagePath(prefix, size);
+}
+
+ZV_WS_Status BoxArtDownloader::Download(const ZVString& prefix, ZV_WS_BoxArtSize size, const ZVString& ifModifiedSince,
+                                        bool toFile, ZVString& target)
+{
+    m_LastModified = ZVString();
+    m_ContentLength = 0;
+    Sink sink(toFile, target);
+    const ZV_WS_Status status = Fetch(ImagePath(prefix, size), ifModifiedSince, sink);
+    return status == ZV_WS_Status_ok ? sink.Commit() : status;
+}
+
+ZV_WS_Status BoxArtDownloader::Fetch(const ZVString& path, const ZVString& ifModifiedSince, Sink& sink)
+{
+    const ZVString& host = m_Transport.deployment().image_host;
+    RawHttp http(m_Transport);
+    if (!http.Connect(ZVString("http://") + host + path)) return ZV_WS_Status_connection_error;
+    ZVString request = ZVString("GET ") + path + " HTTP/1.1\r\n";
+    if (!ifModifiedSince.empty()) request += ZVString("If-Modified-Since: ") + ifModifiedSince + "\r\n";
+    request += ZVString("User-Agent: ZVWSLib\r\nHost: ") + host + "\r\n\r\n";
+    if (!http.Send(request) || !http.ReceiveHead()) return ZV_WS_Status_net_error;
+    if (!http.StatusIs("HTTP/1.1 200 OK")) {
+        if (http.Holds("HTTP/1.1 404 Not Found")) return ZV_WS_Status_file_not_found_on_server;
+        if (http.Holds("HTTP/1.1 304 Not Modified")) return ZV_WS_Status_file_not_modified_on_server;
+        return ZV_WS_Status_net_error;
+    }
+    http.Header("Last-Modified", m_LastModified);
+    m_ContentLength = http.ContentLength();
+    const char* body = nullptr;
+    size_t received = 0;
+    if (m_ContentLength < 1 || m_ContentLength > kLargestImage || !http.BodyStart(body, received)) {
+        return ZV_WS_Status_net_error;
+    }
+    ZV_WS_Status status = sink.Open();
+    char piece[RawHttp::kPiece];
+    for (size_t rest = m_ContentLength; status == ZV_WS_Status_ok && rest > 0;) {
+        received = std::min(received, rest);
+        status = sink.Write(body, received);
+        rest -= received;
+        if (rest == 0 || status != ZV_WS_Status_ok) break;
+        received = http.Receive(piece, std::min(rest, sizeof piece));
+        if (received == 0) return ZV_WS_Status_net_error;
+        body = piece;
+    }
+    return status;
+}
