@@ -19,18 +19,62 @@
 
 /// Every script method in the order of the table: M for member functions, S for static ones. Movies rest on order and
 /// kinds.
-#define ZVWSLIBAE_METHODS(M, S)     \
-    M(init)                         \
-    M(clone)                        \
-    M(idle)                         \
-    M(getNavigation)                \
-    M(getTitles)                    \
-    M(getTitleListing)              \
-    M(quitFlash)                    \
-    M(getUserAgent)                 \
-    S(setLogAreaIDsAndTargetConfig) \
-    M(getAvailableEnvLists)         \
-    M(getDeviceEnv)                 \
+#define ZVWSLIBAE_METHODS(M, S)       \
+    M(init)                           \
+    M(clone)                          \
+    M(idle)                           \
+    M(getNavigation)                  \
+    M(getTitles)                      \
+    M(getTitleListing)                \
+    M(searchForTitle)                 \
+    M(getRecommendedTitles)           \
+    M(translateSkuID)                 \
+    M(getTvEpisodeListing)            \
+    M(getTvEpisodeListByTitleID)      \
+    M(getAllTvEpisodeListings)        \
+    M(authorizeDevice)                \
+    M(deactivateDevice)               \
+    M(checkAuthToken)                 \
+    M(getMyVideos)                    \
+    M(getWishlistItems)               \
+    M(addItemToWishlist)              \
+    M(removeItemFromWishlist)         \
+    M(removeAllItemsFromWishlist)     \
+    M(checkTitleInWishlist)           \
+    M(checkTitlesInWishlist)          \
+    M(doPurchaseSavedBilling)         \
+    M(checkForPurchasedTitle)         \
+    M(checkForPurchasedSku)           \
+    M(checkAdultVerificationEnabled)  \
+    M(checkAdultVerificationPin)      \
+    M(assignGiftCertificateToUser)    \
+    M(checkRentalExpiration)          \
+    M(getStreamingAssetLocation)      \
+    M(getStreamingBonusAssetLocation) \
+    M(loadLastStreamingAssetLocation) \
+    M(manageStreamingInstanceStatus)  \
+    M(getTHXMediaDirector)            \
+    M(getTHXMediaDirectorBonusAsset)  \
+    M(getEmailAddress)                \
+    M(getBillingInfo)                 \
+    M(getPrePaidCardBalance)          \
+    M(getConfig)                      \
+    M(getSettingsPageInfo)            \
+    M(getCountryID)                   \
+    M(getFileType)                    \
+    M(checkBandwidth)                 \
+    M(calcOrderTax)                   \
+    M(quitFlash)                      \
+    M(getLocalIPAddr)                 \
+    M(getSysInfo)                     \
+    M(setAudioDefaultProperty)        \
+    M(getAudioDefaultProperty)        \
+    M(getUserAgent)                   \
+    S(setLogAreaIDsAndTargetConfig)   \
+    S(fileExist)                      \
+    M(getAvailableEnvLists)           \
+    M(getDeviceEnv)                   \
+    S(checkZVSWFmd5sum)               \
     S(trace)
 
 class ZVWSLibAE : public ae::stagecraft::ASExtensionClass {

@@ -1,4 +1,5 @@
 // Methods that answer at once. Only getAvailableEnvLists uses the network.
+#include <openssl/evp.h>
 #include <stdio.h>
 #include <stdlib.h>
 #include <string.h>
@@ -44,6 +45,62 @@ void ZVWSLibAE::trace(StageWindow* /*window*/, ASObject& object, ASValueArray& a
 {
     printf("FLASH TRACE == %s\n", TextOf(object, arguments, 0).c_str());
     fflush(stdout);
+}
+
+void ZVWSLibAE::getSysInfo(StageWindow* /*window*/, ASObject& object, ASValueArray& arguments, ASValue& returnValue)
+{
+    const ZVWSAELog scope("ZVWSLibAE", "getSysInfo", GetZV_LogAreaID());
+    returnValue = ASValue::String(arguments.size() == 1 ? TextOf(object, arguments, 0) : AEString());
+}
+
+// ---- Files
+
+void ZVWSLibAE::fileExist(StageWindow* /*window*/, ASObject& object, ASValueArray& arguments, ASValue& returnValue)
+{
+    const ZVWSAELog scope("ZVWSLibAE", "fileExist", GetZV_LogAreaID());
+    bool exists = false;
+    if (arguments.size() == 1) ZV_WS_fileExist(TextOf(object, arguments, 0).c_str(), &exists);
+    returnValue = ASValue::Boolean(exists);
+}
+
+namespace {
+
+// The MD5 sum of a file in lower-case hexadecimal digits; empty when the file cannot be read whole.
+ZVString Md5Of(const char* path)
+{
+    ZVFile file;
+    const std::unique_ptr<EVP_MD_CTX, decltype(&EVP_MD_CTX_free)> digest(EVP_MD_CTX_new(), EVP_MD_CTX_free);
+    if (!digest || !file.Open(path, "rb") || ZVFile::FolderExist(path)) return ZVString();
+    EVP_DigestInit_ex(digest.get(), EVP_md5(), nullptr);
+    char block[65536];
+    zv_int64 got;
+    while ((got = file.Read(block, sizeof block)) > 0)
+        EVP_DigestUpdate(digest.get(), block, static_cast<size_t>(got));
+    unsigned char sum[EVP_MAX_MD_SIZE];
+    unsigned int size = 0;
+    if (EVP_DigestFinal_ex(digest.get(), sum, &size) != 1) return ZVString();
+    ZVString text;
+    for (unsigned int i = 0; i < size; ++i) {
+        char digits[3];
+        snprintf(digits, sizeof digits, "%02x", sum[i]);
+        text += digits;
+    }
+    return text;
+}
+
+}  // namespace
+
+// Arguments: the movie's path, its MD5 sum as the movie's maker wrote it down. Guards against damage, not against
+// forgery.
+void ZVWSLibAE::checkZVSWFmd5sum(StageWindow* /*window*/, ASObject& object, ASValueArray& arguments,
+                                 ASValue& returnValue)
+{
+    const ZVWSAELog scope("ZVWSLibAE", "checkZVSWFmd5sum", GetZV_LogAreaID());
+    const ZVString sum = Md5Of(TextOf(object, arguments, 0).c_str());
+    const bool isWhole = !sum.empty() && strcasecmp(sum.c_str(), TextOf(object, arguments, 1).c_str()) == 0;
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "ZVWSLibAE::checkZVSWFmd5sum result: (%s)\n",
+                 isWhole ? "true" : "false");
+    returnValue = ASValue::Boolean(isWhole);
 }
 
 // ---- Of the session: fixed at set-up, so that they can be read beside a worker.
