@@ -5,6 +5,7 @@
 #include "HostConsole.h"
 #include "IpcChannel.h"
 #include "ZVMutex.h"
+#include "ZVWSLibAE.h"
 #include "player/Drm.h"
 #include "player/ZVPlayerLibAE.h"
 #include "stagecraft/IStagecraft.h"
@@ -49,6 +50,7 @@ void Register(IStagecraft& runtime)
 
 void RegisterExtensionClasses(IStagecraft& runtime)
 {
+    Register<ZVWSLibAE>(runtime);
     Register<ZVPlayerLibAE>(runtime);
 }
 

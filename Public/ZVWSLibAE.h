@@ -1,0 +1,121 @@
+// ZVWSLibAE: the extension class "com.orvex.ZVWSLib", through which a movie reaches the web-service library.
+//
+// A host registers it with IStagecraft::RegisterExtensionClass<ZVWSLibAE>() and does nothing else with it: the script
+// owns the instances, the runtime constructs, calls and destructs them. The kernel must be initialised before the first
+// instance and stay so until the last is gone.
+//
+// Threads. Everything here runs on the runtime's main thread. An asynchronous method starts one worker thread, which
+// uses the instance's library session alone; its result is handed over on a later update tick. Destructing an instance
+// waits for its worker, that is at most for the time-outs of the library's calls.
+//
+// Calling convention of the asynchronous methods: one argument, an Array of the callback object and the parameter
+// object. They return a code at once, and only after ReturnCode::kStarted the callback's "onComplete"(status, result)
+// is called, once. The status is a ZV_WS_Status; the result is built also when it is a failure.
+#pragma once
+
+#include <memory>
+
+#include "stagecraft/ASExtensionClass.h"
+
+/// Every script method in the order of the table: M for member functions, S for static ones. Movies rest on order and
+/// kinds.
+#define ZVWSLIBAE_METHODS(M, S)       \
+    M(init)                           \
+    M(clone)                          \
+    M(idle)                           \
+    M(getNavigation)                  \
+    M(getTitles)                      \
+    M(getTitleListing)                \
+    M(searchForTitle)                 \
+    M(getRecommendedTitles)           \
+    M(translateSkuID)                 \
+    M(getTvEpisodeListing)            \
+    M(getTvEpisodeListByTitleID)      \
+    M(getAllTvEpisodeListings)        \
+    M(authorizeDevice)                \
+    M(deactivateDevice)               \
+    M(checkAuthToken)                 \
+    M(getMyVideos)                    \
+    M(getWishlistItems)               \
+    M(addItemToWishlist)              \
+    M(removeItemFromWishlist)         \
+    M(removeAllItemsFromWishlist)     \
+    M(checkTitleInWishlist)           \
+    M(checkTitlesInWishlist)          \
+    M(doPurchaseSavedBilling)         \
+    M(checkForPurchasedTitle)         \
+    M(checkForPurchasedSku)           \
+    M(checkAdultVerificationEnabled)  \
+    M(checkAdultVerificationPin)      \
+    M(assignGiftCertificateToUser)    \
+    M(checkRentalExpiration)          \
+    M(getStreamingAssetLocation)      \
+    M(getStreamingBonusAssetLocation) \
+    M(loadLastStreamingAssetLocation) \
+    M(manageStreamingInstanceStatus)  \
+    M(getTHXMediaDirector)            \
+    M(getTHXMediaDirectorBonusAsset)  \
+    M(getEmailAddress)                \
+    M(getBillingInfo)                 \
+    M(getPrePaidCardBalance)          \
+    M(getConfig)                      \
+    M(getSettingsPageInfo)            \
+    M(getCountryID)                   \
+    M(getFileType)                    \
+    M(checkBandwidth)                 \
+    M(calcOrderTax)                   \
+    M(quitFlash)                      \
+    M(getLocalIPAddr)                 \
+    M(getSysInfo)                     \
+    M(setAudioDefaultProperty)        \
+    M(getAudioDefaultProperty)        \
+    M(getUserAgent)                   \
+    S(setLogAreaIDsAndTargetConfig)   \
+    S(fileExist)                      \
+    M(getAvailableEnvLists)           \
+    M(getDeviceEnv)                   \
+    S(checkZVSWFmd5sum)               \
+    S(trace)
+
+class ZVWSLibAE : public ae::stagecraft::ASExtensionClass {
+public:
+    /// What script methods return at once.
+    enum ReturnCode : int {
+        kStarted = 0,              ///< The worker runs ("clone": the instance is ready).
+        kNotInitialized = -1,      ///< "init" has not succeeded.
+        kBusy = -2,                ///< A call of this instance has not been delivered yet; it goes on undisturbed.
+        kWrongArguments = -3,      ///< Not one Array of two objects ("clone": not another, initialised instance).
+        kAlreadyInitialized = -4,  ///< "clone" only.
+        kDuplicateFailed = -5,     ///< "clone" only: no session of its own, also because the other instance is busy.
+    };
+
+    static const char* GetClassName();
+    static bool FiresEvents();
+    static void GetMethods(AEArray<ae::stagecraft::ASExtensionClass::Method>& methodArrayToFill);
+    static ae::stagecraft::ASExtensionClass* ConstructInstance(ae::stagecraft::StageWindow* window,
+                                                               ae::stagecraft::ASObject& object,
+                                                               ae::stagecraft::ASValueArray& arguments);
+    static void DestructInstance(ae::stagecraft::StageWindow* window, ae::stagecraft::ASObject& object);
+
+    ZVWSLibAE(ae::stagecraft::StageWindow* window, ae::stagecraft::ASObject& object,
+              ae::stagecraft::ASValueArray& arguments);
+    ~ZVWSLibAE() override;
+    ZVWSLibAE(const ZVWSLibAE&) = delete;
+    ZVWSLibAE& operator=(const ZVWSLibAE&) = delete;
+
+    /// Delivers a result that waits.
+    void OnUpdate(ae::stagecraft::StageWindow* window, ae::stagecraft::ASObject& object) override;
+
+    /// The instance's insides, for its handlers and workers.
+    struct State;
+    State& GetState() { return *m_State; }
+
+private:
+#define ZVWSLIBAE_DECLARE(name)                                                      \
+    void name(ae::stagecraft::StageWindow* window, ae::stagecraft::ASObject& object, \
+              ae::stagecraft::ASValueArray& arguments, ae::stagecraft::ASValue& returnValue);
+    ZVWSLIBAE_METHODS(ZVWSLIBAE_DECLARE, ZVWSLIBAE_DECLARE)
+#undef ZVWSLIBAE_DECLARE
+
+    std::unique_ptr<State> m_State;
+};

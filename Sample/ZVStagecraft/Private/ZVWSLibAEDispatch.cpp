@@ -1,0 +1,102 @@
+#include "ZVWSLibAEDispatch.h"
+
+#include "ZV_Log.h"
+
+using namespace ae::stagecraft;
+
+ZV_LOG_AREA(ZVWSAELOG_AREA_NAME)
+
+ZVWSLibAE::State::~State()
+{
+    ZVThread* thread = nullptr;
+    {
+        const KernelLock lock(m_ThreadMutex);
+        std::swap(thread, m_Thread);
+    }
+    ZVThread::SafeDestroyThread(thread);
+    m_Result.Release();
+    ZV_WS_release(&m_Session);
+}
+
+bool ZVWSLibAE::State::IsBusy()
+{
+    const KernelLock lock(m_ThreadMutex);
+    return m_Thread != nullptr;
+}
+
+namespace ZVWSLib {
+
+int LogAreaID()
+{
+    return GetZV_LogAreaID();
+}
+
+void LogStatus(const char* name, ZV_WS_Status status)
+{
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "ZVWSLib::%s, ret:%d\n", name, static_cast<int>(status));
+}
+
+bool ReadArguments(ASValueArray& arguments, ASValue& callback, ASValue& parameters)
+{
+    if (arguments.size() != 1 || !arguments[0].IsObject()) return false;
+    ASObject& array = *arguments[0].GetObject();
+    return array.IsInstanceOf("Array") && array.GetLength() == 2 && array.GetElement(0, callback) &&
+           callback.IsObject() && array.GetElement(1, parameters) && parameters.IsObject();
+}
+
+void RunThread(ZVWSLibAE::State& state, const char* name, void (*function)(void*), void* param, ASObject& object,
+               const ASValue& callback)
+{
+    const KernelLock lock(state.m_ThreadMutex);
+    state.m_CallbackObject = callback;
+    state.m_FlashIdle = false;
+    state.m_Thread = ZVThread::CreateThread();
+    ZV_ASSERT(state.m_Thread != 0);
+    if (state.m_Thread->Run(name, function, param)) {
+        object.StartUpdates();
+        return;
+    }
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR, "Failed to launch worker thread: %s!\n", name);
+    ZVThread::DestroyThread(state.m_Thread);
+    state.m_Thread = nullptr;
+}
+
+}  // namespace ZVWSLib
+
+// ---- Delivery
+
+void ZVWSLibAE::OnUpdate(StageWindow* /*window*/, ASObject& object)
+{
+    State& state = *m_State;
+    if (!state.m_NeedFireEvent) return;
+    object.StopUpdates();
+    state.m_NeedFireEvent = false;
+    ZVThread::Sleep(10);  // movies rest on a result never coming at once
+
+    ASValue callback;
+    {
+        const KernelLock lock(state.m_ThreadMutex);
+        callback = std::move(state.m_CallbackObject);
+        state.m_CallbackObject = ASValue();
+    }
+    ASValueArray arguments;
+    if (callback.IsObject()) {
+        ASValue value;
+        ZVWSLib::SetResult(state.m_Result, value, *callback.GetObject());
+        arguments.Append(ASValue::Number(state.m_Result.retCode));
+        arguments.Append(std::move(value));
+    }
+    state.m_Result.Release();
+
+    ZVThread* thread = nullptr;
+    {
+        const KernelLock lock(state.m_ThreadMutex);
+        std::swap(thread, state.m_Thread);
+    }
+    // From here on a call is accepted; the callback may make one.
+    if (callback.IsObject()) {
+        ASValue ignored;
+        callback.GetObject()->Call("onComplete", arguments, ignored);
+    }
+    ZVThread::SafeDestroyThread(thread);
+}

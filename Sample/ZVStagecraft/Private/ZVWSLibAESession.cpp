@@ -1,0 +1,112 @@
+// How an instance gets its session: by set-up, or from another instance.
+#include "ZVWSLibAEDispatch.h"
+#include "ZV_Log.h"
+
+using namespace ae::stagecraft;
+
+ZV_LOG_AREA(ZVWSAELOG_AREA_NAME)
+
+namespace ZVWSLib {
+
+void Remember(ZVWSLibAE::State& state, const Param_init& param)
+{
+    state.m_Listing.m_CurrentCacheType = param.CacheType;
+    state.m_Listing.m_CurrentCacheData = param.CacheData;
+}
+
+namespace {
+
+ZV_WS_SetupParams SetupOf(const Param_init& param)
+{
+    ZV_WS_SetupParams setup;
+    setup.APIKey = param.APIKey.c_str();
+    setup.AuthToken = param.AuthToken.c_str();
+    setup.DestinationUniqueID = param.DestinationUniqueID.c_str();
+    setup.DestinationTypeID = param.DestinationTypeID;
+    setup.UserName = param.UserName.c_str();
+    setup.Password = param.Password.c_str();
+    setup.ServiceBaseURL = param.ServiceBaseURL.c_str();
+    setup.Type = param.Type;
+    setup.EnvNum = param.EnvNum;
+    setup.CacheParam.Type = param.CacheType;
+    setup.CacheParam.Data = param.CacheData;
+    setup.CacheParam.Limit = param.CacheLimit;
+    setup.CacheParam.Path = param.CachePath.c_str();
+    setup.ProxyParam.Host = param.ProxyHost.c_str();
+    setup.ProxyParam.Port = param.ProxyPort;
+    setup.ProxyParam.UserName = param.ProxyUserName.c_str();
+    setup.ProxyParam.Password = param.ProxyPassword.c_str();
+    setup.AccessType = param.AccessType;
+    setup.ApplicationRevision = param.ApplicationRevision.c_str();
+    setup.FirmwareRevision = param.FirmwareRevision.c_str();
+    setup.ModelCode = param.ModelCode.c_str();
+    return setup;
+}
+
+}  // namespace
+
+void init(void* argument)
+{
+    const std::unique_ptr<Param_init> param(static_cast<Param_init*>(argument));
+    ZV_ASSERT(param != 0);
+    ZV_ASSERT(param->pZVWSLibAE != 0);
+    ZVWSLibAE::State& state = param->pZVWSLibAE->GetState();
+    const ZV_WS_SetupParams setup = SetupOf(*param);
+    const ZV_WS_Status status = ZV_WS_initialize(&state.m_Session, &setup);
+    LogStatus("init", status);
+    const bool succeeded = status == ZV_WS_Status_ok;
+    if (!succeeded) ZV_WS_release(&state.m_Session);  // one failure leaves something behind
+    state.m_Init = succeeded;
+    state.Publish(succeeded, status);
+}
+
+}  // namespace ZVWSLib
+
+void ZVWSLibAE::init(StageWindow* /*window*/, ASObject& object, ASValueArray& arguments, ASValue& returnValue)
+{
+    const ZVWSAELog scope("ZVWSLibAE", "init", GetZV_LogAreaID());
+    if (m_State->m_Init) {
+        ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "ZVWSLibAE::init left since Already initialized!\n");
+        returnValue = ASValue::Number(kStarted);
+        return;
+    }
+    returnValue = ASValue::Number(ZVWSLib::StartCall(*this, "init", ZVWSLib::init, Param_init(), object, arguments));
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "ZVWSLibAE::init left\n");
+}
+
+namespace {
+
+// The other instance behind the only argument, when it can be cloned.
+ZVWSLibAE* SourceOfClone(ZVWSLibAE& self, ASValueArray& arguments)
+{
+    if (arguments.size() != 1 || !arguments[0].IsObject()) return nullptr;
+    auto* source = dynamic_cast<ZVWSLibAE*>(arguments[0].GetObject()->GetExtensionInstance());
+    return source && source != &self && source->GetState().m_Init ? source : nullptr;
+}
+
+ZVWSLibAE::ReturnCode Clone(ZVWSLibAE& self, ASValueArray& arguments)
+{
+    ZVWSLibAE::State& state = self.GetState();
+    if (state.m_Init) return ZVWSLibAE::kAlreadyInitialized;
+    if (state.IsBusy()) return ZVWSLibAE::kBusy;  // its "init" uses the session
+    ZVWSLibAE* source = SourceOfClone(self, arguments);
+    if (!source) return ZVWSLibAE::kWrongArguments;
+
+    // A session serves one thread at a time, and the worker of a busy source has it.
+    if (source->GetState().IsBusy()) return ZVWSLibAE::kDuplicateFailed;
+    if (ZV_WS_duplicate(&state.m_Session, &source->GetState().m_Session) != ZV_WS_Status_ok) {
+        ZV_WS_release(&state.m_Session);
+        return ZVWSLibAE::kDuplicateFailed;
+    }
+    state.m_Listing = source->GetState().m_Listing;
+    state.m_Init = true;
+    return ZVWSLibAE::kStarted;
+}
+
+}  // namespace
+
+void ZVWSLibAE::clone(StageWindow* /*window*/, ASObject& /*object*/, ASValueArray& arguments, ASValue& returnValue)
+{
+    const ZVWSAELog scope("ZVWSLibAE", "clone", GetZV_LogAreaID());
+    returnValue = ASValue::Number(Clone(*this, arguments));
+}

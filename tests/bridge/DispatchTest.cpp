@@ -1,0 +1,108 @@
+// Return codes, delivery and the end of instances, as far as they need no service: a set-up that the library refuses
+// at once goes the whole way through worker and delivery.
+#include <gtest/gtest.h>
+
+#include "MovieRun.h"
+
+namespace {
+
+const char kListener[] =
+    "var ws = new com.orvex.ZVWSLib();\n"
+    "function listener(name) { return {onComplete: function (status, result) {\n"
+    "    report(name + ' ' + status + ' ' + JSON.stringify(result)); } }; }\n";
+
+std::string Report(const std::string& script)
+{
+    const MovieRun run = RunMovie(kListener + script);
+    EXPECT_TRUE(run.succeeded);
+    return run.Text();
+}
+
+TEST(Dispatch, CallsBeforeInitAreRefused)
+{
+    EXPECT_EQ("-1\n-1\n-1\n", Report("report(ws.getNavigation([listener('a'), {}]));\n"
+                                     "report(ws.getTitles({genreid: 1}));\n"
+                                     "report(ws.getTitleListing());\n"));
+}
+
+TEST(Dispatch, ArgumentsMustBeOneArrayOfTwoObjects)
+{
+    const char* kWrong[] = {"",
+                            "{}",
+                            "null",
+                            "listener('a'), {}",
+                            "[listener('a')]",
+                            "[listener('a'), {}, {}]",
+                            "[listener('a'), 5]",
+                            "[null, {}]",
+                            "['text', {}]",
+                            "[listener('a'), {}], 1",
+                            "{length: 2, 0: listener('a'), 1: {}}"};
+    for (const char* arguments : kWrong)
+        EXPECT_EQ("-3\n", Report(std::string("report(ws.init(") + arguments + "));\n")) << arguments;
+}
+
+TEST(Dispatch, AResultComesOnceAndNeverDuringTheCall)
+{
+    EXPECT_EQ("0\nafter\na -1000 false\n", Report("report(ws.init([listener('a'), {}])); report('after');\n"));
+}
+
+TEST(Dispatch, ASecondCallIsRefusedUntilTheFirstIsDelivered)
+{
+    EXPECT_EQ("0\n-2\na -1000 false\n0\nc -1000 false\n",
+              Report("report(ws.init([{onComplete: function (status, result) {\n"
+                     "    listener('a').onComplete(status, result);\n"
+                     "    report(ws.init([listener('c'), {}])); } }, {}]));\n"
+                     "report(ws.init([listener('b'), {}]));\n"));
+}
+
+TEST(Dispatch, ACallMadeByAGetterWins)
+{
+    EXPECT_EQ("inner 0\nouter -2\ninner -1000 false\n",
+              Report("var parameters = {get APIKey() {\n"
+                     "    report('inner ' + ws.init([listener('inner'), {}])); return ''; } };\n"
+                     "report('outer ' + ws.init([listener('outer'), parameters]));\n"));
+}
+
+TEST(Dispatch, AListenerWithoutOnCompleteOrOneThatThrowsDoesNotBlockTheInstance)
+{
+    EXPECT_EQ("0\n0\nb -1000 false\n", Report("report(ws.init([{}, {}]));\n"
+                                              "var timer = setInterval(function () {\n"
+                                              "    var code = ws.init([listener('b'), {}]);\n"
+                                              "    if (code === -2) return;\n"
+                                              "    report(code); clearInterval(timer); }, 1);\n"));
+    EXPECT_EQ("0\nb -1000 false\n", Report("ws.init([{onComplete: function () {\n"
+                                           "    report(ws.init([listener('b'), {}])); throw new Error('expected');\n"
+                                           "} }, {}]);\n"));
+}
+
+TEST(Dispatch, CloneNeedsAnotherInitialisedInstance)
+{
+    EXPECT_EQ("-3\n-3\n-3\n-3\n-3\n-2\n",
+              Report("var other = new com.orvex.ZVWSLib();\n"
+                     "report(ws.clone()); report(ws.clone(ws)); report(ws.clone(other)); report(ws.clone({}));\n"
+                     "report(ws.clone(new test.Native()));\n"
+                     "ws.init([{}, {}]); report(ws.clone(other));\n"));
+}
+
+TEST(Dispatch, InstancesEndWhileTheirWorkersDo)
+{
+    for (int i = 0; i < 20; ++i) {
+        // The delay moves the end of the movie along the life of the worker.
+        EXPECT_EQ("", Report("for (var i = 0; i < 3; ++i) new com.orvex.ZVWSLib().init([{}, {}]);\n"
+                             "ws.init([{onComplete: quit}, {}]); if (" +
+                             std::to_string(i % 2) + ") quit();\n"));
+    }
+}
+
+TEST(Dispatch, IdleKeepsTheMovieUntilQuitFlash)
+{
+    EXPECT_EQ("0\n0\n", Report("report(ws.idle()); setTimeout(function () { report(ws.quitFlash()); }, 50);\n"));
+}
+
+TEST(Methods, StandInTheOrderAndKindsThatMoviesRestOn)
+{
+    EXPECT_EQ("", Report("report(Object.keys(com.orvex.ZVWSLib).join());\n"));
+}
+
+}  // namespace

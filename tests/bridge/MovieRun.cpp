@@ -1,0 +1,91 @@
+#include "MovieRun.h"
+
+#include <stdio.h>
+#include <stdlib.h>
+#include <unistd.h>
+
+#include "ZVWSLibAE.h"
+#include "stagecraft/IStagecraft.h"
+
+using namespace ae::stagecraft;
+
+namespace {
+
+MovieRun* s_Run = nullptr;
+const Result* s_Shown = nullptr;
+
+class TestClass : public ASExtensionClass {
+public:
+    static const char* GetClassName() { return "test.Native"; }
+    static bool FiresEvents() { return false; }
+    static void GetMethods(AEArray<Method>& methods)
+    {
+        methods.Append(MakeMethod("report", Method::kStaticFunction, &TestClass::report));
+        methods.Append(MakeMethod("result", Method::kStaticFunction, &TestClass::result));
+    }
+    static ASExtensionClass* ConstructInstance(StageWindow*, ASObject&, ASValueArray&) { return new TestClass; }
+    static void DestructInstance(StageWindow*, ASObject& object) { delete object.GetExtensionInstance(); }
+
+private:
+    void report(StageWindow*, ASObject& object, ASValueArray& arguments, ASValue&)
+    {
+        AEString text;
+        object.ToText(arguments[0], text);
+        s_Run->lines.push_back(text.c_str());
+    }
+    void result(StageWindow*, ASObject& object, ASValueArray&, ASValue& returnValue)
+    {
+        ZVWSLib::SetResult(*s_Shown, returnValue, object);
+    }
+};
+
+class MovieFile {
+public:
+    explicit MovieFile(const std::string& script)
+    {
+        const int file = mkstemp(m_Path);
+        FILE* stream = fdopen(file, "w");
+        fputs(
+            "function report(text) { test.Native.report(text); }\n"
+            "function result() { return test.Native.result(); }\n",
+            stream);
+        fputs(script.c_str(), stream);
+        fclose(stream);
+    }
+    ~MovieFile() { unlink(m_Path); }
+    MovieFile(const MovieFile&) = delete;
+    MovieFile& operator=(const MovieFile&) = delete;
+    const char* Path() const { return m_Path; }
+
+private:
+    char m_Path[32] = "/tmp/zvmovieXXXXXX";
+};
+
+}  // namespace
+
+std::string MovieRun::Text() const
+{
+    std::string text;
+    for (const std::string& line : lines)
+        text += line + "\n";
+    return text;
+}
+
+MovieRun RunMovie(const std::string& script, const Result& shown)
+{
+    MovieRun run;
+    s_Run = &run;
+    s_Shown = &shown;
+    const MovieFile movie(script);
+    const char* arguments[] = {"test", movie.Path()};
+    IStagecraft* runtime = IStagecraft::InitializeStagecraftLibrary(2, arguments);
+    if (!runtime) return run;
+    runtime->RegisterExtensionClass<ZVWSLibAE>();
+    runtime->RegisterExtensionClass<TestClass>();
+    AEArray<StageWindow*> windows;
+    runtime->CreateAndConfigureStageWindowSet(windows, 2, arguments, 1);
+    run.succeeded = runtime->RunStageWindowSet(windows).m_nErrorValue == AEError::OK;
+    runtime->DestroyStageWindowSet(windows);
+    IStagecraft::UninitializeStagecraftLibrary();
+    return run;
+}

@@ -1,0 +1,18 @@
+// Runs a movie in the desktop runtime with the extension class and a class of the test's own.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "ZVWSLibAEResult.h"
+
+struct MovieRun {
+    std::vector<std::string> lines;  ///< What the movie reported, in order.
+    bool succeeded = false;          ///< No script error at the top level.
+
+    /// The lines, one below the other.
+    std::string Text() const;
+};
+
+/// The movie sees com.orvex.ZVWSLib, report(text), and result(): the script value of `shown`.
+MovieRun RunMovie(const std::string& script, const Result& shown = Result());
