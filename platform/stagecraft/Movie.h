@@ -22,7 +22,6 @@ struct MovieOptions {
 class Movie final : public ae::stagecraft::StageWindow {
 public:
     Movie(MovieOptions options, std::string text, const std::vector<ExtensionClass>& classes, StopRequest& stop);
-    ~Movie() = default;
 
     void EndMovie() override { m_ended = true; }
 

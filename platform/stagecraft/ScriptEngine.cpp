@@ -55,8 +55,8 @@ ScriptEngine::~ScriptEngine()
     m_objects.clear();
     m_natives.clear();  // finalizers still run
     if (m_alive) duk_destroy_heap(m_pContext);
-    while (m_blocks.pNext != &m_blocks) {
-        Free(this, m_blocks.pNext + 1);
+    for (Block* pBlock = m_blocks.pNext; pBlock != &m_blocks;) {
+        free(std::exchange(pBlock, pBlock->pNext));
     }
 }
 
