@@ -136,6 +136,11 @@ struct EndlessScript {
     const char* pScript;  // calls probe.run() where it begins to be endless
 };
 
+void PrintTo(const EndlessScript& script, std::ostream* pOut)
+{
+    *pOut << script.pScript;
+}
+
 class EndlessTest : public RuntimeTest, public ::testing::WithParamInterface<EndlessScript> {};
 
 TEST_P(EndlessTest, IsBrokenOffByAStopRequest)
