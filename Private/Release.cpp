@@ -34,14 +34,18 @@ constexpr std::array<FreeFunction, kTagCount> MakeTable(std::tuple<R...>*)
 // By tag; tags that no record has own nothing.
 constexpr auto kFree = MakeTable(static_cast<ZV_WS_AllRecords*>(nullptr));
 
-constexpr unsigned int CountUsed()
+template <class... R>
+constexpr bool HasUniqueTags(std::tuple<R...>*)
 {
-    unsigned int used = 0;
-    for (auto free : kFree)
-        used += free != nullptr;
-    return used;
+    bool used[kTagCount] = {};
+    used[SessionImpl::kTag] = true;
+    for (const unsigned int tag : {ZV_WS_RecordTraits<R>::kTag...}) {
+        if (used[tag]) return false;
+        used[tag] = true;
+    }
+    return true;
 }
-static_assert(CountUsed() == std::tuple_size_v<ZV_WS_AllRecords> + 1, "two records share a tag");
+static_assert(HasUniqueTags(static_cast<ZV_WS_AllRecords*>(nullptr)), "two records share a tag");
 
 }  // namespace
 

@@ -59,6 +59,14 @@ protected:
         return asked;
     }
 
+    static std::string Header(const LoggedRequest& request, const std::string& name)
+    {
+        for (const auto& header : request.headers) {
+            if (header.first == name) return header.second;
+        }
+        return "";
+    }
+
     int Number(const std::string& sql) const { return atoi(store->Query(sql).c_str()); }
 
     std::unique_ptr<Storefront> store;

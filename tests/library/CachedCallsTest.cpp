@@ -1,0 +1,396 @@
+// What was seen once comes back without the network.
+#include <filesystem>
+#include <fstream>
+#include <functional>
+
+#include "Store.h"
+#include "ZVFile.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr unsigned int kAll = ZV_WS_CacheParam::CacheData_Metadata | ZV_WS_CacheParam::CacheData_BoxArtImage |
+                              ZV_WS_CacheParam::CacheData_Userdata;
+
+class Cached : public Store {
+protected:
+    ZV_WS_Status Begin(CacheType type, unsigned int data = kAll)
+    {
+        ZV_WS_release(&session);
+        folder = store->DataFolder() + "/cache";
+        ZV_WS_SetupParams setup = Setup();
+        setup.CacheParam = {type, data, 0, folder.c_str()};
+        const ZV_WS_Status status = Initialize(setup);
+        store->ClearLog();
+        return status;
+    }
+
+    std::string Database() const
+    {
+        for (const auto& entry : fs::directory_iterator(folder)) {
+            if (entry.path().extension() == ".zv") return entry.path().string();
+        }
+        return "";
+    }
+
+    ZV_WS_Status Listing(const char* name = nullptr)
+    {
+        Owned<ZV_WS_TitleListingResponse> listing;
+        const ZV_WS_Status status = ZV_WS_getTitleListing(&session, 12, &listing);
+        EXPECT_EQ(status == ZV_WS_Status_ok ? store->Query("SELECT name FROM title WHERE id = 12") : "",
+                  listing.TitleName ? listing.TitleName : "")
+            << (name ? name : "");
+        return status;
+    }
+
+    std::string folder;
+};
+
+template <class Record>
+std::function<ZV_WS_Status(ZV_WS_Session*)> Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Record*))
+{
+    return [call](ZV_WS_Session* session) {
+        Owned<Record> record;
+        return call(session, &record);
+    };
+}
+
+template <class Record>
+std::function<ZV_WS_Status(ZV_WS_Session*)> Asking(ZV_WS_Status (*call)(ZV_WS_Session*, int, Record*), int id)
+{
+    return [=](ZV_WS_Session* session) {
+        Owned<Record> record;
+        return call(session, id, &record);
+    };
+}
+
+// All sixteen caching calls: the second time nothing is sent, whatever kind of cache it is.
+TEST_F(Cached, TheSecondTimeNothingIsSent)
+{
+    const ZV_WS_Pagination page = Page(1, 5);
+    const std::vector<std::function<ZV_WS_Status(ZV_WS_Session*)>> calls = {
+        Asking(ZV_WS_getNavigation),
+        [&](ZV_WS_Session* s) {
+            Owned<ZV_WS_TitlesResponse> record;
+            const ZV_WS_Status status = ZV_WS_getTitles(s, 1, &page, PURCHASE_TYPE_ANY, &record);
+            EXPECT_EQ(5u, record.Titles.size);
+            return status;
+        },
+        Asking(ZV_WS_getTitleListing, 12),
+        Asking(ZV_WS_getTvEpisodeListing, Number("SELECT MIN(id) FROM title WHERE season > 0")),
+        Asking(ZV_WS_getTvEpisodeListByTitleID, Number("SELECT MIN(id) FROM title WHERE is_tv = 1")),
+        Asking(ZV_WS_getAllTvEpisodeListings, Number("SELECT MIN(id) FROM title WHERE is_tv = 1")),
+        [](ZV_WS_Session* s) {
+            Owned<ZV_WS_TranslateTivoExternalIDResponse> record;
+            return ZV_WS_translateTivoExternalID(s, "EXT31", &record);
+        },
+        Asking(ZV_WS_translateSkuID, Number("SELECT MIN(sku) FROM product")),
+        [&](ZV_WS_Session* s) {
+            Owned<ZV_WS_TitlesResponse> record;
+            return ZV_WS_searchForTitle(s, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, "harbour", &record);
+        },
+        [&](ZV_WS_Session* s) {
+            Owned<ZV_WS_TitlesResponse> record;
+            return ZV_WS_searchForTitleDetail(s, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, "harbour", &record);
+        },
+        Asking(ZV_WS_getRecommendedTitles, 12),
+        Asking(ZV_WS_getEmailAddress),
+        Asking(ZV_WS_getBillingInfo),
+        Asking(ZV_WS_getSettingsPageInfo),
+        [&](ZV_WS_Session* s) {
+            Owned<ZV_WS_WishlistItemsResponse> record;
+            return ZV_WS_getWishlistItems(s, SORT_ORDER_RATING, &page, TITLE_TYPE_FILTER_ANY, &record);
+        },
+        [&](ZV_WS_Session* s) {
+            Owned<ZV_WS_MyVideosResponse> record;
+            const ZV_WS_Status status =
+                ZV_WS_getMyVideos(s, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, WATCH_STATUS_UNDEFINED, &record);
+            EXPECT_EQ(3u, record.Titles.size);
+            return status;
+        },
+    };
+    for (const CacheType type : {CacheType_Memory, CacheType_File}) {
+        ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
+        for (size_t i = 0; i < calls.size(); ++i) {
+            store->ClearLog();
+            EXPECT_EQ(ZV_WS_Status_ok, calls[i](&session)) << i;
+            EXPECT_EQ(1u, store->Log().size()) << i;
+            EXPECT_EQ(ZV_WS_Status_ok, calls[i](&session)) << i;
+            EXPECT_EQ(1u, store->Log().size()) << i;
+        }
+    }
+}
+
+TEST_F(Cached, DownloadedVideosAreNeverCached)
+{
+    ZV_WS_SetupParams setup = Setup(ACCESS_TYPE_DOWNLOAD);
+    setup.CacheParam = {CacheType_Memory, kAll, 0, nullptr};
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+    store->ClearLog();
+    const ZV_WS_Pagination page = Page(1, 5);
+    for (int i = 0; i < 2; ++i) {
+        Owned<ZV_WS_MyVideosResponse> videos;
+        EXPECT_EQ(ZV_WS_Status_ok,
+                  ZV_WS_getMyVideos(&session, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, 3, &videos));
+    }
+    EXPECT_EQ(2u, store->Log().size());
+}
+
+TEST_F(Cached, OnlySuccessIsKept)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_Memory));
+    for (const char* fault : {"getTitleListing=code:3", "getTitleListing=http:503", "getTitleListing=missing-result"}) {
+        Fault(fault);
+        EXPECT_NE(ZV_WS_Status_ok, Listing(fault));
+    }
+    EXPECT_EQ(ZV_WS_Status_ok, Listing());
+    EXPECT_EQ(4u, store->Log().size());
+    // Kinds that the session does not cache are asked each time.
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_Memory, ZV_WS_CacheParam::CacheData_Userdata));
+    Listing();
+    Listing();
+    EXPECT_EQ(2u, store->Log().size());
+}
+
+TEST_F(Cached, WishlistChangesMakeItsPagesStale)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    const ZV_WS_Pagination page = Page(1, 9);
+    const auto items = [&] {
+        Owned<ZV_WS_WishlistItemsResponse> record;
+        EXPECT_EQ(ZV_WS_Status_ok,
+                  ZV_WS_getWishlistItems(&session, SORT_ORDER_DATEADDED, &page, TITLE_TYPE_FILTER_ANY, &record));
+        return record.TotalItems;
+    };
+    const auto wished = [&](int title) {
+        bool flag = false;
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_checkTitleInWishlist(&session, title, &flag));
+        return flag;
+    };
+    EXPECT_EQ(3, items());
+    EXPECT_FALSE(wished(50));
+    Owned<ZV_WS_StandardResponse> answers[3];
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_addItemToWishlist(&session, 50, &answers[0]));
+    store->ClearLog();
+    EXPECT_TRUE(wished(50));  // from the flag
+    EXPECT_TRUE(store->Log().empty());
+    EXPECT_EQ(4, items());
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_removeItemFromWishlist(&session, 50, &answers[1]));
+    const int titles[] = {50, 7, 19};
+    for (const size_t requests : {2u, 2u}) {  // a walk through the list and the pages above; then flags alone
+        Owned<ZV_WS_TitlesInWishlist> flags;
+        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_checkTitlesInWishlist(&session, titles, 3, TITLE_TYPE_FILTER_ANY, &flags));
+        EXPECT_EQ((std::vector<bool>{false, true, true}),
+                  std::vector<bool>(flags.IsAvailInUserWishlist, flags.IsAvailInUserWishlist + 3));
+        EXPECT_LE(store->Log().size(), requests + 1);
+    }
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_removeAllItemsFromWishlist(&session, &answers[2]));
+    EXPECT_FALSE(wished(7));
+    EXPECT_EQ(0, items());
+}
+
+TEST_F(Cached, ANewCatalogueDropsTheAnswers)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    Owned<ZV_WS_String> time;
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getLastCacheLoadTimeUTC(&session, &time));
+    bool should = true;
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_shouldUpdateCache(&session, time.data, &should));
+    EXPECT_FALSE(should);
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_shouldUpdateCache(&session, "", &should));
+    Listing();
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_updateLocalCache(&session, ZV_WS_CacheParam::CacheData_Metadata));
+    store->ClearLog();
+    Listing();
+    EXPECT_TRUE(store->Log().empty());
+    store->Query("UPDATE account SET load_time = '11/21/2026 6:00:00 AM'");
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_shouldUpdateCache(&session, time.data, &should));
+    EXPECT_TRUE(should);
+    // A new session looks by itself.
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    Listing();
+    EXPECT_EQ(std::vector<std::string>{"getTitleListing"}, Asked());
+}
+
+TEST_F(Cached, DuplicatesShareAFileAndNotTheMemory)
+{
+    for (const CacheType type : {CacheType_File, CacheType_Memory}) {
+        ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
+        Listing();
+        ZV_WS_Session copy;
+        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
+        Owned<ZV_WS_TitleListingResponse> listing;
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getTitleListing(&copy, 12, &listing));
+        EXPECT_EQ(type == CacheType_File ? 1u : 2u, store->Log().size());
+        ZV_WS_release(&copy);
+    }
+}
+
+// Whatever happens to the cache, the call answers as if there were none.
+TEST_F(Cached, ABrokenCacheIsNoCache)
+{
+    const std::function<void(const std::string&)> breaks[] = {
+        [](const std::string& file) {
+            std::ofstream(file, std::ios::trunc) << "this is no database at all, but long enough";
+        },
+        [](const std::string& file) { fs::resize_file(file, fs::file_size(file) / 2); },
+        [](const std::string& file) { fs::resize_file(file, 0); },
+        [](const std::string& file) { fs::remove_all(fs::path(file).parent_path()); },
+        [](const std::string& file) {
+            fs::remove(file);
+            fs::create_directory(file);
+        },
+    };
+    for (size_t i = 0; i < std::size(breaks); ++i) {
+        ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File)) << i;
+        Listing();
+        const std::string file = Database();
+        breaks[i](file);
+        EXPECT_EQ(ZV_WS_Status_ok, Listing()) << i;
+        Owned<ZV_WS_String> place;
+        ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, "ZV00012", &place);
+        // The next session makes it anew, unless a folder is in its place.
+        ZV_WS_release(&session);
+        const ZV_WS_Status status = Begin(CacheType_File);
+        EXPECT_TRUE(status == ZV_WS_Status_ok || i == 4) << i << " " << status;
+        EXPECT_EQ(ZV_WS_Status_ok, i == 4 ? ZV_WS_Status_ok : Listing());
+        fs::remove_all(folder);
+    }
+}
+
+// ---- Box art
+
+class BoxArt : public Cached {
+protected:
+    ZV_WS_Status Image(ZV_WS_Image* image)
+    {
+        return ZV_WS_getBoxArtImageData(&session, BOX_ART_SIZE_135S, "ZV00012", image);
+    }
+    std::string File() const { return folder + "/ZV00012135.jpg"; }
+    void Revalidate()
+    {
+        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_updateLocalCache(&session, ZV_WS_CacheParam::CacheData_BoxArtImage));
+    }
+    size_t Temporaries() const
+    {
+        size_t count = 0;
+        for (const auto& entry : fs::directory_iterator(folder))
+            count += entry.path().filename().string().rfind("zvws", 0) == 0;
+        return count;
+    }
+};
+
+TEST_F(BoxArt, IsFetchedOnceAndRevalidated)
+{
+    for (const CacheType type : {CacheType_Memory, CacheType_File}) {
+        ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
+        Owned<ZV_WS_Image> images[4];
+        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[0]));
+        ASSERT_GT(images[0].size, 100u);
+        EXPECT_EQ(0xff, images[0].data[0]);
+        EXPECT_EQ(0xd8, images[0].data[1]);
+        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[1]));
+        EXPECT_EQ(1u, store->Log().size());
+        Revalidate();
+        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[2]));  // 304
+        EXPECT_EQ("Mon, 02 Nov 2026 06:00:00 GMT", Header(store->Log().back(), "if-modified-since"));
+        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[3]));
+        EXPECT_EQ(2u, store->Log().size());
+        for (const auto& image : images) {
+            ASSERT_EQ(images[0].size, image.size);
+            EXPECT_EQ(0, memcmp(images[0].data, image.data, image.size));
+        }
+    }
+}
+
+// A revalidation that fails leaves the image that there is; one that finds a newer image takes it.
+TEST_F(BoxArt, AFailedRevalidationLosesNothing)
+{
+    for (const CacheType type : {CacheType_Memory, CacheType_File}) {
+        ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
+        Owned<ZV_WS_Image> first;
+        ASSERT_EQ(ZV_WS_Status_ok, Image(&first));
+        for (const char* fault :
+             {"cut", "cut-body", "short", "http:404", "http:503", "no-length", "zero-length", "reset", "modified"}) {
+            Revalidate();
+            Fault(std::string("boxart=") + fault);
+            Owned<ZV_WS_Image> image;
+            EXPECT_EQ(ZV_WS_Status_ok, Image(&image)) << fault;
+            EXPECT_EQ(first.size, image.size) << fault;
+        }
+        if (type == CacheType_File) {
+            EXPECT_EQ(0u, Temporaries());
+        }
+    }
+}
+
+TEST_F(BoxArt, FailuresOfTheFirstFetch)
+{
+    const struct {
+        const char* fault;
+        ZV_WS_Status status;
+    } rows[] = {{"http:404", ZV_WS_Status_file_not_found_on_server},
+                {"http:503", ZV_WS_Status_net_error},
+                {"no-length", ZV_WS_Status_net_error},
+                {"zero-length", ZV_WS_Status_net_error},
+                {"cut", ZV_WS_Status_net_error},
+                {"cut-body", ZV_WS_Status_net_error},
+                {"short", ZV_WS_Status_net_error},
+                {"endless", ZV_WS_Status_net_error},
+                {"split", ZV_WS_Status_ok}};
+    for (const CacheType type : {CacheType_None, CacheType_Memory, CacheType_File}) {
+        for (const auto& row : rows) {
+            ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
+            Fault(std::string("boxart=") + row.fault);
+            Owned<ZV_WS_Image> image;
+            EXPECT_EQ(row.status, Image(&image)) << type << row.fault;
+            EXPECT_EQ(row.status == ZV_WS_Status_ok, image.size > 0) << type << row.fault;
+            if (type == CacheType_File) {
+                EXPECT_EQ(0u, Temporaries()) << row.fault;
+                EXPECT_EQ(row.status == ZV_WS_Status_ok, fs::exists(File())) << row.fault;
+                fs::remove_all(folder);
+            }
+        }
+    }
+}
+
+TEST_F(BoxArt, IsAFileOrAnAddress)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_Memory));
+    Owned<ZV_WS_String> address;
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_135S, "A b", &address));
+    EXPECT_EQ("http://localhost:" + std::to_string(store->HttpPort()) + "/images/boxart/135s/A%20b135.jpg",
+              address.data);
+    EXPECT_TRUE(store->Log().empty());
+
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    for (int i = 0; i < 3; ++i) {
+        Owned<ZV_WS_String> place;
+        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_135S, "ZV00012", &place));
+        EXPECT_EQ(File(), place.data);
+        EXPECT_TRUE(fs::exists(File()));
+        if (i == 1) fs::remove(File());  // a row without its file is fetched again
+    }
+    EXPECT_EQ(2u, store->Log().size());
+    std::ofstream(folder + "/zvwsLEFT") << "left over";
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_clearLocalCache(folder.c_str()));
+    EXPECT_TRUE(fs::is_empty(folder));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_clearLocalCache(""));
+}
+
+TEST_F(BoxArt, PrefixesThatLeaveTheFolderAreRefused)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    for (const char* prefix : {"", "../evil", "a/b", "a\\b", "..", "a\nb"}) {
+        Owned<ZV_WS_Image> image;
+        EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getBoxArtImageData(&session, BOX_ART_SIZE_95, prefix, &image))
+            << prefix;
+        Owned<ZV_WS_String> place;
+        EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, prefix, &place))
+            << prefix;
+    }
+    EXPECT_TRUE(store->Log().empty());
+}
+
+}  // namespace
