@@ -19,7 +19,7 @@ Serializer::Serializer(bool compress, bool indent)
     soap_set_imode(this, common);
     soap_set_omode(this, output);
     mode = common;
-    soap_set_namespaces(this, namespaces);
+    soap_set_namespaces(this, ::namespaces);  // not the member
     LimitReading(*this);
 }
 

@@ -1,0 +1,45 @@
+// A folder of a test's own, removed with everything in it when the test ends.
+#pragma once
+
+#include <gtest/gtest.h>
+#include <stdlib.h>
+
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+
+class TempFolder {
+public:
+    TempFolder()
+    {
+        std::string name = (std::filesystem::temp_directory_path() / "zvtestXXXXXX").string();
+        EXPECT_NE(nullptr, mkdtemp(&name[0]));
+        m_Path = name + "/";
+    }
+    ~TempFolder()
+    {
+        std::error_code ignored;
+        std::filesystem::remove_all(m_Path, ignored);
+    }
+    TempFolder(const TempFolder&) = delete;
+    TempFolder& operator=(const TempFolder&) = delete;
+
+    // The folder with its "/", or a name in it.
+    std::string operator/(const std::string& name) const { return m_Path + name; }
+
+    std::string Write(const std::string& name, const std::string& content) const
+    {
+        std::ofstream(m_Path + name, std::ios::binary) << content;
+        return m_Path + name;
+    }
+    std::string Read(const std::string& name) const
+    {
+        std::ifstream file(m_Path + name, std::ios::binary);
+        return std::string(std::istreambuf_iterator<char>(file), {});
+    }
+    bool Has(const std::string& name) const { return std::filesystem::exists(m_Path + name); }
+
+private:
+    std::string m_Path;
+};

@@ -1,0 +1,541 @@
+#include "CacheMgr.h"
+
+#include <gtest/gtest.h>
+#include <sqlite3.h>
+
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "../foundation/TempFolder.h"
+
+namespace {
+
+constexpr int kService = 1, kBoxArt = 2, kUserData = 4, kAll = 7;
+
+ZVString Bytes(const std::string& text)
+{
+    return ZVString(text.data(), text.size());
+}
+
+// A second connection to the cache's file.
+class Database {
+public:
+    explicit Database(const std::string& path) { EXPECT_EQ(SQLITE_OK, sqlite3_open(path.c_str(), &m_DB)); }
+    ~Database() { sqlite3_close(m_DB); }
+    Database(const Database&) = delete;
+    Database& operator=(const Database&) = delete;
+
+    void Run(const std::string& sql)
+    {
+        EXPECT_EQ(SQLITE_OK, sqlite3_exec(m_DB, sql.c_str(), nullptr, nullptr, nullptr));
+    }
+
+    // The first column of every row, each followed by a blank.
+    std::string Query(const std::string& sql)
+    {
+        std::string values;
+        const auto add = [](void* to, int, char** columns, char**) {
+            *static_cast<std::string*>(to) += std::string(columns[0] ? columns[0] : "NULL") + " ";
+            return 0;
+        };
+        EXPECT_EQ(SQLITE_OK, sqlite3_exec(m_DB, sql.c_str(), add, &values, nullptr)) << sqlite3_errmsg(m_DB);
+        return values;
+    }
+
+private:
+    sqlite3* m_DB = nullptr;
+};
+
+class CacheMgrTest : public ::testing::Test {
+protected:
+    ZV_WS_CacheParam2 Param(int type, int flags = kAll, unsigned int size = 0) const
+    {
+        ZV_WS_CacheParam2 param;
+        param.type = type;
+        param.flags = flags;
+        param.size = size;
+        param.path = m_Path.c_str();
+        return param;
+    }
+    void Open(int type, int flags = kAll, unsigned int size = 0)
+    {
+        ASSERT_EQ(0, m_Cache.Open(Param(type, flags, size)));
+    }
+
+    // One row of a kind that counts `size` bytes.
+    bool Put(int kind, const ZVString& key, unsigned int size)
+    {
+        const ZVString value = Bytes(std::string(kind == kBoxArt ? 0 : size, 'v'));
+        if (kind == kService) return m_Cache.WriteMetaData("getTitles", key, value);
+        if (kind == kUserData) return m_Cache.WriteUserData("getMyVideos", key, value);
+        return m_Cache.WriteBoxArt(key, BOX_ART_SIZE_95, size, "", 0, "");
+    }
+    bool Has(int kind, const ZVString& key)
+    {
+        ZVString text, data;
+        unsigned int size, needUpdate;
+        if (kind == kService) return m_Cache.ReadMetaData("getTitles", key, text);
+        if (kind == kUserData) return m_Cache.ReadUserData("getMyVideos", key, text);
+        return m_Cache.ReadBoxArt(key, BOX_ART_SIZE_95, size, text, needUpdate, data);
+    }
+    bool Flag(int titleId)
+    {
+        bool flag = true;
+        return m_Cache.ReadWishlistFlag(titleId, flag) && flag;
+    }
+
+    TempFolder m_Folder;
+    std::string m_Path = m_Folder / "cache.zv";
+    CacheMgr m_Cache;
+};
+
+// ---- What every operation refuses
+
+struct Operation {
+    const char* name;
+    int kind;
+    std::function<bool(CacheMgr&)> run;
+};
+
+const std::vector<Operation>& Operations()
+{
+    static ZVString text;
+    static unsigned int number;
+    static bool flag;
+    static const std::vector<Operation> operations = {
+        {"WriteMetaData", kService, [](CacheMgr& c) { return c.WriteMetaData("n", "k", "v"); }},
+        {"ReadMetaData", kService, [](CacheMgr& c) { return c.ReadMetaData("n", "k", text); }},
+        {"UpdateLastCacheLoadTime", kService, [](CacheMgr& c) { return c.UpdateLastCacheLoadTime("t"); }},
+        {"WriteBoxArt", kBoxArt, [](CacheMgr& c) { return c.WriteBoxArt("p", BOX_ART_SIZE_95, 1, "", 0, ""); }},
+        {"ReadBoxArt", kBoxArt,
+         [](CacheMgr& c) { return c.ReadBoxArt("p", BOX_ART_SIZE_95, number, text, number, text); }},
+        {"SetBoxArtNeedUpdate", kBoxArt, [](CacheMgr& c) { return c.SetBoxArtNeedUpdate(); }},
+        {"WriteUserData", kUserData, [](CacheMgr& c) { return c.WriteUserData("n", "k", "v"); }},
+        {"ReadUserData", kUserData, [](CacheMgr& c) { return c.ReadUserData("n", "k", text); }},
+        {"WriteWishlistFlag", kUserData, [](CacheMgr& c) { return c.WriteWishlistFlag(1, true); }},
+        {"ReadWishlistFlag", kUserData, [](CacheMgr& c) { return c.ReadWishlistFlag(1, flag); }},
+        {"WriteWishlistFlags", kUserData, [](CacheMgr& c) { return c.WriteWishlistFlags({1}, {true}); }},
+        {"RemoveWishlistFlag", kUserData, [](CacheMgr& c) { return c.RemoveWishlistFlag(1); }},
+        {"RemoveAllWishlistFlags", kUserData, [](CacheMgr& c) { return c.RemoveAllWishlistFlags(); }},
+        {"PurgeUserData", kUserData, [](CacheMgr& c) { return c.PurgeUserData(""); }},
+    };
+    return operations;
+}
+
+void ExpectAll(CacheMgr& cache, int kinds, const char* when)
+{
+    for (const Operation& operation : Operations()) {
+        EXPECT_EQ((operation.kind & kinds) != 0, operation.run(cache)) << operation.name << ", " << when;
+    }
+}
+
+TEST_F(CacheMgrTest, OperationsNeedAnOpenCacheOfTheirKind)
+{
+    ExpectAll(m_Cache, 0, "never opened");
+    for (const int type : {CacheType_Memory, CacheType_File}) {
+        for (int kinds = 0; kinds <= kAll; ++kinds) {
+            Open(type, kinds);
+            ExpectAll(m_Cache, kinds, "open");
+        }
+        m_Cache.Close();
+        ExpectAll(m_Cache, 0, "closed");
+    }
+    Open(CacheType_None);
+    ExpectAll(m_Cache, 0, "no cache");
+}
+
+TEST_F(CacheMgrTest, RefusesEmptyNamesAndValues)
+{
+    Open(CacheType_File);
+    ZVString text;
+    unsigned int number;
+    EXPECT_FALSE(m_Cache.WriteMetaData("", "k", "v"));
+    EXPECT_FALSE(m_Cache.WriteMetaData("n", "k", ""));
+    EXPECT_FALSE(m_Cache.ReadMetaData("", "k", text));
+    EXPECT_FALSE(m_Cache.UpdateLastCacheLoadTime(""));
+    EXPECT_FALSE(m_Cache.WriteUserData("", "k", "v"));
+    EXPECT_FALSE(m_Cache.WriteUserData("n", "k", ""));
+    EXPECT_FALSE(m_Cache.ReadUserData("", "k", text));
+    EXPECT_FALSE(m_Cache.WriteBoxArt("", BOX_ART_SIZE_95, 1, "m", 0, "d"));
+    EXPECT_FALSE(m_Cache.ReadBoxArt("", BOX_ART_SIZE_95, number, text, number, text));
+    EXPECT_FALSE(m_Cache.WriteWishlistFlags({}, {}));
+    EXPECT_FALSE(m_Cache.WriteWishlistFlags({1, 2, 3}, {true, true}));
+    EXPECT_EQ("0 ", Database(m_Path).Query("SELECT (SELECT COUNT(*) FROM Service) + (SELECT COUNT(*) FROM Userdata) + "
+                                           "(SELECT COUNT(*) FROM BoxArt) + (SELECT COUNT(*) FROM Cache)"));
+    EXPECT_TRUE(m_Cache.WriteMetaData("n", "", "v")) << "an empty key is a key";
+}
+
+// ---- What is stored
+
+TEST_F(CacheMgrTest, MakesItsTables)
+{
+    Open(CacheType_File);
+    EXPECT_EQ(
+        "CREATE TABLE Service (Name TEXT NOT NULL, Key TEXT NOT NULL, Value TEXT NOT NULL, Size INTEGER, PRIMARY KEY "
+        "(Name, Key)) "
+        "CREATE TABLE BoxArt (Prefix TEXT NOT NULL, Dim INTEGER NOT NULL, Size INTEGER, LastModified TEXT, NeedUpdate "
+        "INTEGER NOT NULL, TS DATETIME DEFAULT CURRENT_TIMESTAMP, Data BLOB, PRIMARY KEY (Prefix, Dim)) "
+        "CREATE TABLE Cache (ID INTEGER, LastLoadTime TEXT NOT NULL, PRIMARY KEY (ID)) "
+        "CREATE TABLE Userdata (Name TEXT NOT NULL, Key TEXT NOT NULL, Value TEXT NOT NULL, Size INTEGER, PRIMARY KEY "
+        "(Name, Key)) ",
+        Database(m_Path).Query("SELECT sql FROM sqlite_master WHERE type = 'table' ORDER BY rowid"));
+}
+
+TEST_F(CacheMgrTest, KeepsEveryByte)
+{
+    const ZVString value = Bytes(std::string("\x1f\x8b\0\xff\xc3(\0", 7));
+    const ZVString key1 = Bytes(std::string("k\0a", 3)), key2 = Bytes(std::string("k\0b", 3));
+    for (const int type : {CacheType_Memory, CacheType_File}) {
+        SCOPED_TRACE(type);
+        Open(type);
+        ZVString read = "before";
+        EXPECT_TRUE(m_Cache.WriteMetaData("n", key1, value));
+        EXPECT_FALSE(m_Cache.ReadMetaData("n", key2, read));
+        EXPECT_TRUE(read == "before");
+        EXPECT_TRUE(m_Cache.ReadMetaData("n", key1, read));
+        EXPECT_TRUE(read == value);
+        EXPECT_TRUE(m_Cache.WriteUserData("n", key2, value));
+        EXPECT_TRUE(m_Cache.ReadUserData("n", key2, read));
+        EXPECT_TRUE(read == value);
+        EXPECT_FALSE(m_Cache.ReadUserData("n", key1, read)) << "answers and user data are apart";
+
+        unsigned int size = 9, needUpdate = 9;
+        ZVString modified = "x", data = "x";
+        EXPECT_FALSE(m_Cache.ReadBoxArt("ABC", BOX_ART_SIZE_175, size, modified, needUpdate, data));
+        EXPECT_TRUE(size == 0 && needUpdate == 0 && modified.empty() && data.empty());
+        EXPECT_TRUE(m_Cache.WriteBoxArt("ABC", BOX_ART_SIZE_175, 4000000000u, "Mon, 1 Jan", 0, value));
+        EXPECT_TRUE(m_Cache.ReadBoxArt("ABC", BOX_ART_SIZE_175, size, modified, needUpdate, data));
+        EXPECT_TRUE(size == 4000000000u && needUpdate == 0 && modified == "Mon, 1 Jan" && data == value);
+        EXPECT_FALSE(m_Cache.ReadBoxArt("ABC", BOX_ART_SIZE_95, size, modified, needUpdate, data));
+
+        EXPECT_TRUE(m_Cache.WriteBoxArt("ABC", BOX_ART_SIZE_175, 5, "", 0, ""));
+        EXPECT_TRUE(m_Cache.SetBoxArtNeedUpdate());
+        EXPECT_TRUE(m_Cache.ReadBoxArt("ABC", BOX_ART_SIZE_175, size, modified, needUpdate, data));
+        EXPECT_TRUE(size == 5 && needUpdate == 1 && modified.empty() && data.empty());
+    }
+    EXPECT_EQ("7 7 ", Database(m_Path).Query("SELECT Size FROM Service UNION ALL SELECT Size FROM Userdata"));
+}
+
+TEST_F(CacheMgrTest, MemoryForgetsOnCloseAndAFileDoesNot)
+{
+    for (const int type : {CacheType_Memory, CacheType_File}) {
+        Open(type);
+        EXPECT_TRUE(Put(kService, "k", 1));
+        EXPECT_TRUE(Has(kService, "k"));
+        EXPECT_EQ(0, m_Cache.Close());
+        Open(type);
+        EXPECT_EQ(type == CacheType_File, Has(kService, "k"));
+        Open(type);  // closes by itself
+        EXPECT_EQ(type == CacheType_File, Has(kService, "k"));
+    }
+    CacheMgr other;
+    ASSERT_EQ(0, other.Open(Param(CacheType_File)));
+    EXPECT_TRUE(Put(kService, "k2", 1));
+    ZVString value;
+    EXPECT_TRUE(other.ReadMetaData("getTitles", "k2", value)) << "a file is shared";
+}
+
+// ---- Budgets
+
+TEST_F(CacheMgrTest, SplitsTheBudget)
+{
+    constexpr unsigned int kNoLimit = 0;
+    const struct {
+        unsigned int size;
+        int flags, kind;
+        unsigned int limit;
+    } rows[] = {
+        {1000, kAll, kService, 150},
+        {1000, kAll, kBoxArt, 700},
+        {1000, kAll, kUserData, 150},
+        {1005, kService | kUserData, kService, 150},
+        {1005, kService | kUserData, kUserData, 855},
+        {1005, kAll, kBoxArt, 705},  // 703 and what truncating has left
+        {1009, kService, kService, 1009},
+        {1009, kService | kBoxArt, kBoxArt, 858},
+        {1009, kUserData, kUserData, 1009},
+        {4000000000u, kBoxArt, kBoxArt, 4000000000u},
+        {6, kService | kBoxArt, kService, kNoLimit},  // 15 % of it is no whole byte
+        {0, kAll, kService, kNoLimit},
+        {0, kAll, kBoxArt, kNoLimit},
+        {0, kAll, kUserData, kNoLimit},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(testing::Message() << row.size << " bytes, flags " << row.flags << ", kind " << row.kind);
+        Open(CacheType_Memory, row.flags, row.size);
+        const bool unlimited = row.limit == kNoLimit;
+        EXPECT_TRUE(Put(row.kind, "first", unlimited ? 5000 : row.limit - 1));
+        EXPECT_TRUE(Put(row.kind, "fills", 1));
+        // The limit is looked at before an insert: the row that goes over it stays, and the next one evicts.
+        EXPECT_TRUE(Put(row.kind, "over", 1));
+        EXPECT_TRUE(Has(row.kind, "first"));
+        EXPECT_TRUE(Put(row.kind, "next", 1));
+        EXPECT_EQ(unlimited, Has(row.kind, "first"));
+        EXPECT_TRUE(Has(row.kind, "next"));
+    }
+}
+
+TEST_F(CacheMgrTest, AnswersAndUserDataAreEvictedTogether)
+{
+    for (const int kind : {kService, kUserData, kBoxArt}) {
+        SCOPED_TRACE(kind);
+        Open(CacheType_Memory, kAll, 1000);
+        for (const int other : {kService, kUserData, kBoxArt})
+            EXPECT_TRUE(Put(other, "old", 10));
+        EXPECT_TRUE(m_Cache.WriteWishlistFlag(1, true));
+        EXPECT_TRUE(Put(kind, "old2", 700));
+        EXPECT_TRUE(Put(kind, "new", 1));
+        const bool texts = kind != kBoxArt;
+        EXPECT_EQ(!texts, Has(kService, "old"));
+        EXPECT_EQ(!texts, Has(kUserData, "old"));
+        EXPECT_EQ(!texts, Flag(1));
+        EXPECT_EQ(texts, Has(kBoxArt, "old"));
+        EXPECT_TRUE(Has(kind, "new"));
+    }
+}
+
+TEST_F(CacheMgrTest, EvictsTheTenOldestImagesWithAllSizesOfTheirTitles)
+{
+    Open(CacheType_File, kBoxArt, 1000);
+    // Title 0 has three sizes, two of them young; titles 1 to 11 have one each and grow younger.
+    for (int i = 0; i < 12; ++i) {
+        const std::string prefix = "T" + std::to_string(i) + "_";
+        EXPECT_TRUE(m_Cache.WriteBoxArt(Bytes(prefix), BOX_ART_SIZE_135S, 10, "", 0, ""));
+        m_Folder.Write(prefix + "135.jpg", "image");
+    }
+    EXPECT_TRUE(m_Cache.WriteBoxArt("T0_", BOX_ART_SIZE_95, 10, "", 0, ""));
+    EXPECT_TRUE(m_Cache.WriteBoxArt("T0_", BOX_ART_SIZE_321, 2000, "", 0, ""));
+    m_Folder.Write("T0_95.jpg", "image");
+    m_Folder.Write("T0_321.jpg", "image");
+    Database(m_Path).Run(
+        "UPDATE BoxArt SET TS = '2001-01-' || printf('%02d', 1 + CAST(substr(Prefix, 2) AS INTEGER));"
+        "UPDATE BoxArt SET TS = '2002-01-01' WHERE Prefix = 'T0_' AND Dim <> 6");
+
+    EXPECT_TRUE(m_Cache.WriteBoxArt("N_", BOX_ART_SIZE_95, 1, "", 0, ""));
+    EXPECT_EQ("N_ T10_ T11_ ", Database(m_Path).Query("SELECT Prefix FROM BoxArt ORDER BY Prefix"));
+    for (int i = 0; i < 12; ++i) {
+        EXPECT_EQ(i >= 10, m_Folder.Has("T" + std::to_string(i) + "_135.jpg")) << i;
+    }
+    EXPECT_TRUE(m_Folder.Has("T0_95.jpg")) << "only the files of the rows selected are removed";
+    EXPECT_TRUE(m_Folder.Has("T0_321.jpg"));
+}
+
+TEST_F(CacheMgrTest, EvictsOncePerInsert)
+{
+    Open(CacheType_File, kBoxArt, 1000);
+    for (int i = 0; i < 15; ++i)
+        EXPECT_TRUE(Put(kBoxArt, Bytes(std::to_string(100 + i)), i < 14 ? 60 : 5000));
+    Database(m_Path).Run("UPDATE BoxArt SET TS = Prefix");
+    EXPECT_TRUE(Put(kBoxArt, "new", 1));
+    EXPECT_EQ("110 111 112 113 114 new ", Database(m_Path).Query("SELECT Prefix FROM BoxArt ORDER BY Prefix"));
+}
+
+// ---- Refreshing and purging
+
+TEST_F(CacheMgrTest, ANewLoadTimeDropsAnswers)
+{
+    Open(CacheType_File);
+    const struct {
+        const char* time;
+        bool keeps;
+    } rows[] = {{"1", false}, {"1", true}, {"2", false}, {"1", false}, {"1", true}};
+    EXPECT_TRUE(Put(kUserData, "k", 1));
+    for (const auto& row : rows) {
+        EXPECT_TRUE(Put(kService, "k", 1));
+        EXPECT_TRUE(m_Cache.UpdateLastCacheLoadTime(row.time));
+        EXPECT_EQ(row.keeps, Has(kService, "k")) << row.time;
+        EXPECT_EQ(std::string(row.time) + " ", Database(m_Path).Query("SELECT LastLoadTime FROM Cache WHERE ID = 1"));
+    }
+    EXPECT_TRUE(Has(kUserData, "k"));
+}
+
+TEST_F(CacheMgrTest, PurgingTakesTheAnswersThatShowWishlistState)
+{
+    const struct {
+        const char* name;
+        int flags;
+        const char* answers;   // left in Service
+        const char* userData;  // left in Userdata
+    } rows[] = {
+        {"", kAll, "getTitles ", ""},
+        {"WishlistFlag", kAll, "getTitles ", "getMyVideos "},
+        {"getMyVideos", kAll, "getAllTvEpisodeListings getTitleListing getTitles getTvEpisodeListing ",
+         "WishlistFlag "},
+        {"", kUserData, "getAllTvEpisodeListings getTitleListing getTitles getTvEpisodeListing ", ""},
+        {"nothing", kAll, "getAllTvEpisodeListings getTitleListing getTitles getTvEpisodeListing ",
+         "WishlistFlag getMyVideos "},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(testing::Message() << row.name << ", flags " << row.flags);
+        Open(CacheType_File);
+        for (const char* name : {"getTitles", "getTitleListing", "getTvEpisodeListing", "getAllTvEpisodeListings"}) {
+            EXPECT_TRUE(m_Cache.WriteMetaData(name, "1", "v"));
+        }
+        EXPECT_TRUE(Put(kUserData, "1", 1));
+        EXPECT_TRUE(m_Cache.WriteWishlistFlag(1, true));
+        Open(CacheType_File, row.flags);
+        EXPECT_TRUE(m_Cache.PurgeUserData(row.name));
+        Database database(m_Path);
+        EXPECT_EQ(row.answers, database.Query("SELECT Name FROM Service ORDER BY Name"));
+        EXPECT_EQ(row.userData, database.Query("SELECT Name FROM Userdata ORDER BY Name"));
+    }
+}
+
+// ---- Wish-list flags
+
+TEST_F(CacheMgrTest, KeepsAFlagForEachTitle)
+{
+    Open(CacheType_File);
+    bool flag = true;
+    EXPECT_FALSE(m_Cache.ReadWishlistFlag(1, flag));
+    EXPECT_FALSE(flag);
+    EXPECT_TRUE(m_Cache.WriteWishlistFlags({1, -2, 2147483647}, {true, false, true}));
+    EXPECT_TRUE(Flag(1) && Flag(2147483647));
+    EXPECT_TRUE(m_Cache.ReadWishlistFlag(-2, flag));
+    EXPECT_FALSE(flag);
+    EXPECT_TRUE(m_Cache.WriteWishlistFlag(1, false));
+    EXPECT_FALSE(Flag(1));
+    EXPECT_TRUE(m_Cache.RemoveWishlistFlag(1));
+    EXPECT_FALSE(m_Cache.ReadWishlistFlag(1, flag));
+    EXPECT_EQ("-2=0/1 2147483647=1/1 ",
+              Database(m_Path).Query("SELECT Key || '=' || Value || '/' || Size FROM Userdata ORDER BY Key"));
+    EXPECT_TRUE(m_Cache.RemoveAllWishlistFlags());
+    EXPECT_FALSE(Flag(2147483647));
+}
+
+TEST_F(CacheMgrTest, WritesFlagsFromTheLastToTheFirst)
+{
+    Open(CacheType_File, kUserData, 100);
+    EXPECT_TRUE(m_Cache.WriteWishlistFlags({7, 7}, {true, false}));
+    EXPECT_TRUE(Flag(7));
+
+    Database(m_Path).Run(
+        "CREATE TRIGGER refuse BEFORE INSERT ON Userdata WHEN NEW.Key = '2' BEGIN SELECT RAISE(ABORT, 'no'); END");
+    EXPECT_FALSE(m_Cache.WriteWishlistFlags({1, 2, 3}, {true, true, true}));
+    EXPECT_EQ("3 7 ", Database(m_Path).Query("SELECT Key FROM Userdata ORDER BY Key")) << "the last ones stay written";
+
+    EXPECT_TRUE(Put(kUserData, "big", 200));
+    EXPECT_TRUE(m_Cache.WriteWishlistFlags({4}, {true}));
+    EXPECT_TRUE(Flag(7)) << "the budget is not looked at";
+    EXPECT_TRUE(m_Cache.WriteWishlistFlag(5, true));
+    EXPECT_FALSE(Flag(7)) << "here it is";
+    EXPECT_TRUE(Flag(5));
+}
+
+// ---- Trouble
+
+// The default file system of SQLite, with a clock hand of the test's own: `onSleep` is called in place of waiting.
+class FakeSleep {
+public:
+    explicit FakeSleep(std::function<void()> onSleep) : m_Original(sqlite3_vfs_find(nullptr))
+    {
+        m_Vfs = *m_Original;
+        m_Vfs.zName = "test";
+        m_Vfs.xSleep = [](sqlite3_vfs*, int microseconds) {
+            s_Slept += microseconds;
+            s_OnSleep();
+            return microseconds;
+        };
+        s_OnSleep = std::move(onSleep);
+        s_Slept = 0;
+        sqlite3_vfs_register(&m_Vfs, 1);
+    }
+    ~FakeSleep()
+    {
+        sqlite3_vfs_unregister(&m_Vfs);
+        sqlite3_vfs_register(m_Original, 1);
+    }
+    FakeSleep(const FakeSleep&) = delete;
+    FakeSleep& operator=(const FakeSleep&) = delete;
+
+    static int Slept() { return s_Slept; }
+
+private:
+    static inline std::function<void()> s_OnSleep;
+    static inline int s_Slept;
+    sqlite3_vfs m_Vfs;
+    sqlite3_vfs* m_Original;
+};
+
+TEST_F(CacheMgrTest, WaitsTenSecondsForALockedFile)
+{
+    Open(CacheType_File);
+    EXPECT_TRUE(Put(kService, "before", 1));
+    Database holder(m_Path);
+    bool releases = false;
+    const FakeSleep sleep([&] {
+        if (releases) holder.Run("COMMIT");
+        releases = false;
+    });
+    holder.Run("BEGIN EXCLUSIVE");
+    EXPECT_FALSE(Put(kService, "k", 1));
+    EXPECT_EQ(10000000, FakeSleep::Slept());
+    EXPECT_FALSE(Has(kService, "before"));
+    EXPECT_NE(0, CacheMgr().Open(Param(CacheType_File)));
+
+    releases = true;
+    EXPECT_TRUE(Put(kService, "k", 1)) << "the lock went while it waited";
+    EXPECT_FALSE(releases);
+    EXPECT_TRUE(Has(kService, "k") && Has(kService, "before"));
+
+    holder.Run("BEGIN IMMEDIATE");
+    EXPECT_TRUE(Has(kService, "k")) << "a writer that has not committed yet does not keep readers out";
+    holder.Run("COMMIT");
+}
+
+TEST_F(CacheMgrTest, AnUnusablePathIsACode)
+{
+    const std::string file = m_Folder.Write("garbage.zv", std::string(8192, 'g'));
+    m_Folder.Write("short.zv", "no database");
+    for (const char* name : {"garbage.zv", "short.zv", "garbage.zv/x.zv", "none/x.zv", ""}) {
+        ZV_WS_CacheParam2 param = Param(CacheType_File);
+        param.path = Bytes(m_Folder / name);
+        EXPECT_NE(0, m_Cache.Open(param)) << name;
+        ExpectAll(m_Cache, 0, name);
+    }
+    EXPECT_EQ(std::string(8192, 'g'), m_Folder.Read("garbage.zv")) << "what is no cache is not touched";
+    ZV_WS_CacheParam2 readOnly = Param(CacheType_File);
+    readOnly.path = "/proc/cache.zv";
+    EXPECT_NE(0, m_Cache.Open(readOnly));
+    EXPECT_EQ(0, m_Cache.Open(Param(CacheType_File))) << "a failure leaves nothing behind";
+    ExpectAll(m_Cache, kAll, "opened after failures");
+}
+
+TEST_F(CacheMgrTest, ADatabaseThatBreaksWhileInUseIsFalse)
+{
+    Open(CacheType_File, kAll, 1000);
+    EXPECT_TRUE(Put(kService, "k", 600));
+    const std::string whole = m_Folder.Read("cache.zv");
+    const struct {
+        const char* damage;
+        std::string content;
+    } rows[] = {
+        {"overwritten", std::string(whole.size(), 'x')},
+        {"all pages but the first overwritten", whole.substr(0, 4096) + std::string(whole.size() - 4096, '\xee')},
+        {"cut", whole.substr(0, 5000)},
+        {"emptied", ""},
+    };
+    for (const auto& row : rows) {
+        m_Folder.Write("cache.zv", row.content);
+        ExpectAll(m_Cache, 0, row.damage);
+    }
+    m_Folder.Write("cache.zv", whole);
+    EXPECT_TRUE(Has(kService, "k")) << "the damage was the file's, not the object's";
+
+    // A file format that is too new to be written.
+    std::string readOnly = whole;
+    readOnly[18] = 3;
+    m_Folder.Write("cache.zv", readOnly);
+    EXPECT_TRUE(Has(kService, "k"));
+    EXPECT_FALSE(Put(kService, "k2", 1));
+    EXPECT_FALSE(m_Cache.PurgeUserData(""));
+    EXPECT_FALSE(m_Cache.SetBoxArtNeedUpdate());
+    EXPECT_FALSE(m_Cache.UpdateLastCacheLoadTime("t"));
+    EXPECT_TRUE(m_Folder.Read("cache.zv") == readOnly);
+
+    std::filesystem::remove_all(m_Folder / "");
+    ExpectAll(m_Cache, 0, "folder gone");
+}
+
+}  // namespace

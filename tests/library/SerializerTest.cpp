@@ -1,0 +1,280 @@
+#include "Serializer.h"
+
+#include <gtest/gtest.h>
+#include <soapH.h>
+#include <zlib.h>
+
+#include <string>
+#include <vector>
+
+#include "CacheMgr.h"
+
+namespace {
+
+typedef _ZV1__getTitleListingResponse Response;
+
+ZVString Bytes(const std::string& text)
+{
+    return ZVString(text.data(), text.size());
+}
+std::string Text(const ZVString& text)
+{
+    return std::string(text.c_str(), text.length());
+}
+
+// An answer with texts, numbers, empty and absent members, nested arrays and one record in two places.
+class Answer {
+public:
+    Answer()
+    {
+        m_Product.SkuID = 17;
+        m_Product.Price = m_Price;
+        m_ProductPointers[0] = m_ProductPointers[1] = &m_Product;
+        m_Products.__sizeProductListing = 2;
+        m_Products.ProductListing = m_ProductPointers;
+        m_Title.TitleID = -4;
+        m_Title.TitleName = m_Name;
+        m_Title.BoxArtPrefix = m_Empty;
+        m_Title.TitlePosition = -32768;
+        m_Title.IsTvListing = true;
+        m_Title.AvailableProducts = &m_Products;
+        m_Response.getTitleListingResult = &m_Title;
+    }
+    const Response& response() const { return m_Response; }
+
+private:
+    char m_Price[5] = "4.99";
+    char m_Name[64] = "<Caf\xc3\xa9> & \"\xe2\x82\xac\xf0\x9f\x8e\xac\"\t\n ]]>";
+    char m_Empty[1] = "";
+    ZV1__ProductListing m_Product;
+    ZV1__ProductListing* m_ProductPointers[2];
+    ZV1__ArrayOfProductListing m_Products;
+    ZV1__TitleListingResponse m_Title;
+    Response m_Response;
+};
+
+ZVString Written(bool compress, bool indent = false)
+{
+    Serializer serializer(compress, indent);
+    ZVString text;
+    EXPECT_TRUE(serializer.Write(Answer().response(), text));
+    return text;
+}
+
+// What a text that must not be accepted leaves behind: nothing.
+void ExpectRefused(const ZVString& text, const char* what)
+{
+    Serializer serializer(true, false);
+    Response response;
+    ZV1__TitleListingResponse stale;
+    response.getTitleListingResult = &stale;
+    EXPECT_FALSE(serializer.Read(text, response)) << what;
+    EXPECT_EQ(nullptr, response.getTitleListingResult) << what;
+}
+
+// A text written by hand, with an answer's result of that content.
+std::string Around(const std::string& content)
+{
+    return "<ZVWSLib xmlns:ZV1=\"http://api.zorvane.example/api/\"><ZV1:getTitleListingResult>" + content +
+           "</ZV1:getTitleListingResult></ZVWSLib>";
+}
+
+std::string Gzip(const std::string& text)
+{
+    z_stream stream = {};
+    EXPECT_EQ(Z_OK, deflateInit2(&stream, 9, Z_DEFLATED, 15 + 16, 9, Z_DEFAULT_STRATEGY));
+    std::string packed(deflateBound(&stream, text.size()), '\0');
+    stream.next_in = reinterpret_cast<Bytef*>(const_cast<char*>(text.data()));
+    stream.avail_in = text.size();
+    stream.next_out = reinterpret_cast<Bytef*>(&packed[0]);
+    stream.avail_out = packed.size();
+    EXPECT_EQ(Z_STREAM_END, deflate(&stream, Z_FINISH));
+    packed.resize(stream.total_out);
+    deflateEnd(&stream);
+    return packed;
+}
+
+TEST(SerializerTest, ReadsBackWhatItWrote)
+{
+    for (const bool compress : {true, false}) {
+        for (const bool indent : {true, false}) {
+            SCOPED_TRACE(testing::Message() << "compress " << compress << ", indent " << indent);
+            const ZVString text = Written(compress, indent);
+            EXPECT_EQ(compress, text.length() > 2 && Text(text).compare(0, 2, "\x1f\x8b") == 0);
+
+            Serializer serializer(true, false);
+            Response response;
+            ASSERT_TRUE(serializer.Read(text, response));
+            const ZV1__TitleListingResponse* title = response.getTitleListingResult;
+            ASSERT_NE(nullptr, title);
+            EXPECT_EQ(-4, title->TitleID);
+            EXPECT_STREQ("<Caf\xc3\xa9> & \"\xe2\x82\xac\xf0\x9f\x8e\xac\"\t\n ]]>", title->TitleName);
+            EXPECT_STREQ("", title->BoxArtPrefix);
+            EXPECT_EQ(nullptr, title->MPAARating);
+            EXPECT_EQ(-32768, title->TitlePosition);
+            EXPECT_TRUE(title->IsTvListing);
+            ASSERT_NE(nullptr, title->AvailableProducts);
+            ASSERT_EQ(2, title->AvailableProducts->__sizeProductListing);
+            for (int i : {0, 1})
+                EXPECT_STREQ("4.99", title->AvailableProducts->ProductListing[i]->Price);
+
+            ZVString again;
+            EXPECT_TRUE(Serializer(compress, indent).Write(response, again));
+            EXPECT_TRUE(again == text);
+        }
+    }
+}
+
+TEST(SerializerTest, WritesOneElementWithoutReferences)
+{
+    const std::string text = Text(Written(false));
+    EXPECT_NE(std::string::npos, text.find("<ZVWSLib"));
+    EXPECT_EQ("</ZVWSLib>", text.substr(text.find_last_of('<')).substr(0, 10));
+    EXPECT_EQ(std::string::npos, text.find("Envelope"));
+    EXPECT_EQ(std::string::npos, text.find("href"));
+    EXPECT_EQ(std::string::npos, text.find(" id="));
+    EXPECT_EQ(std::string::npos, text.find("HTTP"));
+}
+
+TEST(SerializerTest, OneSerializerServesSeveralTexts)
+{
+    const ZVString whole = Written(true), plain = Written(false);
+    Serializer serializer(true, false);
+    Response response;
+    EXPECT_FALSE(serializer.Read(whole.substr(0, whole.length() / 2), response));
+    EXPECT_TRUE(serializer.Read(plain, response));
+    EXPECT_TRUE(serializer.Read(whole, response));
+    ZVString text;
+    EXPECT_TRUE(serializer.Write(response, text));
+    EXPECT_TRUE(text == whole);
+}
+
+TEST(SerializerTest, PassesThroughTheCache)
+{
+    CacheMgr cache;
+    ZV_WS_CacheParam2 param;
+    param.type = CacheType_Memory;
+    param.flags = 1;
+    ASSERT_EQ(0, cache.Open(param));
+    ZVString text;
+    EXPECT_TRUE(cache.WriteMetaData("getTitleListing", "-4", Written(true)));
+    EXPECT_TRUE(cache.ReadMetaData("getTitleListing", "-4", text));
+    Serializer serializer(true, false);
+    Response response;
+    ASSERT_TRUE(serializer.Read(text, response));
+    EXPECT_EQ(-4, response.getTitleListingResult->TitleID);
+}
+
+// ---- Texts that are no answers
+
+TEST(SerializerTest, RefusesEveryTextCutShort)
+{
+    for (const bool compress : {true, false}) {
+        const ZVString text = Written(compress);
+        const size_t element = compress ? text.length() : Text(text).find_last_of('>') + 1;
+        for (size_t length = 0; length < element; ++length) {
+            ExpectRefused(text.substr(0, length), ("cut at " + std::to_string(length)).c_str());
+        }
+    }
+}
+
+TEST(SerializerTest, RefusesDamagedTexts)
+{
+    const std::string packed = Text(Written(true));
+    // The checksum stands in the last eight bytes together with the length.
+    for (const size_t fromEnd : {8u, 5u, 4u, 1u}) {
+        std::string damaged = packed;
+        damaged[damaged.size() - fromEnd] ^= 1;
+        ExpectRefused(Bytes(damaged), "wrong checksum or length");
+    }
+    const struct {
+        const char* what;
+        std::string text;
+    } rows[] = {
+        {"no XML", "no XML"},
+        {"zeros", std::string(1000, '\0')},
+        {"another element", "<Other><getTitleListingResult/></Other>"},
+        {"a number that is none", Around("<ZV1:TitleID>x</ZV1:TitleID>")},
+        {"only the magic bytes of gzip", "\x1f\x8b"},
+        {"a gzip header", packed.substr(0, 10)},
+        {"gzip of garbage", Gzip("garbage")},
+        {"too long a string", Around("<ZV1:TitleName>" + std::string(2 << 20, 'x') + "</ZV1:TitleName>")},
+    };
+    for (const auto& row : rows)
+        ExpectRefused(Bytes(row.text), row.what);
+
+    // Whatever a single byte is changed to, reading ends; what it yields, if anything, is a whole answer.
+    for (size_t i = 0; i < packed.size(); ++i) {
+        std::string damaged = packed;
+        damaged[i] ^= 0xff;
+        Serializer serializer(true, false);
+        Response response;
+        const bool read = serializer.Read(Bytes(damaged), response);
+        EXPECT_EQ(read, response.getTitleListingResult != nullptr) << "byte " << i;
+    }
+}
+
+TEST(SerializerTest, RefusesWhatGrowsWithoutEnd)
+{
+    const auto repeated = [](const char* text, size_t count) {
+        std::string all;
+        for (size_t i = 0; i < count; ++i)
+            all += text;
+        return all;
+    };
+    const auto products = [&](size_t count) {
+        return "<ZV1:AvailableProducts>" + repeated("<ZV1:ProductListing/>", count) + "</ZV1:AvailableProducts>";
+    };
+    const struct {
+        const char* what;
+        std::string content;
+        bool reads;
+    } rows[] = {
+        {"as many products as an array may have", products(4096), true},
+        {"one more", products(4097), false},
+        {"3 MiB of elements in each other", repeated("<a>", 1 << 19) + repeated("</a>", 1 << 19), true},
+        {"3 MiB of elements without use", repeated("<a/>", 3 << 18), true},
+        {"5 MiB of elements without use", repeated("<a/>", 5 << 18), false},
+        {"3 MiB of blanks", std::string(3 << 20, ' '), true},
+        {"5 MiB of blanks", std::string(5 << 20, ' '), false},
+    };
+    for (const auto& row : rows) {
+        const std::string plain = Around(row.content);
+        for (const std::string& text : {plain, Gzip(plain)}) {
+            Serializer serializer(true, false);
+            Response response;
+            EXPECT_EQ(row.reads, serializer.Read(Bytes(text), response)) << row.what << ", " << text.size() << " bytes";
+            EXPECT_EQ(row.reads, response.getTitleListingResult != nullptr) << row.what;
+        }
+    }
+}
+
+// ---- The hooks
+
+TEST(SerializerTest, ReceivesFromTheFrontOfTheText)
+{
+    Serializer serializer(true, false);
+    serializer.SetXML(Bytes(std::string("ab\0cde", 6)));
+    char buffer[8] = {};
+    EXPECT_EQ(0u, serializer.frecv(&serializer, buffer, 0));
+    EXPECT_EQ(6u, serializer.GetXML().length());
+    EXPECT_EQ(4u, serializer.frecv(&serializer, buffer, 4));
+    EXPECT_EQ(std::string("ab\0c", 4), std::string(buffer, 4));
+    EXPECT_TRUE(serializer.GetXML() == "de");
+    EXPECT_EQ(2u, serializer.frecv(&serializer, buffer, sizeof buffer));
+    EXPECT_EQ(0u, serializer.frecv(&serializer, buffer, sizeof buffer));
+
+    EXPECT_EQ(SOAP_OK, serializer.fsend(&serializer, "x\0y", 3));
+    EXPECT_EQ(SOAP_OK, serializer.fsend(&serializer, "z", 1));
+    EXPECT_EQ(std::string("x\0yz", 4), Text(serializer.GetXML()));
+}
+
+TEST(SerializerDeathTest, HooksNeedAContext)
+{
+    Serializer serializer(true, false);
+    char buffer[1];
+    EXPECT_DEATH(serializer.fsend(nullptr, "x", 1), "Private/Serializer.*pSerializer != 0");
+    EXPECT_DEATH(serializer.frecv(nullptr, buffer, 1), "Private/Serializer.*pSerializer != 0");
+}
+
+}  // namespace
