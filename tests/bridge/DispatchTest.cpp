@@ -108,21 +108,23 @@ TEST(Methods, StandInTheOrderAndKindsThatMoviesRestOn)
     const char kTable[] =
         "init clone idle getNavigation getTitles getTitleListing searchForTitle getRecommendedTitles translateSkuID "
         "getTvEpisodeListing getTvEpisodeListByTitleID getAllTvEpisodeListings authorizeDevice deactivateDevice "
-        "checkAuthToken getMyVideos getWishlistItems addItemToWishlist removeItemFromWishlist "
+        "checkAuthToken getBoxArtImage getMyVideos getWishlistItems addItemToWishlist removeItemFromWishlist "
         "removeAllItemsFromWishlist checkTitleInWishlist checkTitlesInWishlist doPurchaseSavedBilling "
         "checkForPurchasedTitle checkForPurchasedSku checkAdultVerificationEnabled checkAdultVerificationPin "
         "assignGiftCertificateToUser checkRentalExpiration getStreamingAssetLocation getStreamingBonusAssetLocation "
         "loadLastStreamingAssetLocation manageStreamingInstanceStatus getTHXMediaDirector "
         "getTHXMediaDirectorBonusAsset getEmailAddress getBillingInfo getPrePaidCardBalance getConfig "
-        "getSettingsPageInfo getCountryID getFileType checkBandwidth calcOrderTax quitFlash getLocalIPAddr getSysInfo "
-        "setAudioDefaultProperty getAudioDefaultProperty getUserAgent +setLogAreaIDsAndTargetConfig +fileExist "
-        "getAvailableEnvLists getDeviceEnv +checkZVSWFmd5sum +trace ";
+        "getSettingsPageInfo getCountryID getFileType updateLocalCache checkBandwidth calcOrderTax quitFlash "
+        "getLocalIPAddr getSysInfo setAudioDefaultProperty getAudioDefaultProperty getUserAgent "
+        "+setLogAreaIDsAndTargetConfig +fileExist getAvailableEnvLists +clearLocalCache getDeviceEnv "
+        "+checkZVSWFmd5sum +trace ";
     AEArray<ae::stagecraft::ASExtensionClass::Method> methods;
     ZVWSLibAE::GetMethods(methods);
     std::string table;
     for (const auto& method : methods)
         table += std::string(method.m_type == method.kStaticFunction ? "+" : "") + method.m_pName + " ";
     EXPECT_EQ(kTable, table);
+    EXPECT_EQ(59u, methods.size());
     EXPECT_FALSE(ZVWSLibAE::FiresEvents());
 }
 

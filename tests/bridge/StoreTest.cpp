@@ -239,6 +239,29 @@ TEST_F(Movies, WhatASessionKnowsIsAnsweredAtOnce)
                      "  report(environments()); });\n"));
 }
 
+// ---- The cache
+
+TEST_F(Movies, BoxArtAndCacheCanBeRefreshedAndCleared)
+{
+    const std::string prefix = store->Query("SELECT prefix FROM title LIMIT 1");
+    const std::string folder = store->DataFolder() + "/cache/";
+    EXPECT_EQ("0 string true\n0 true\n-1000\n0\nfalse\n",
+              Report("setup.CacheType = 2; setup.CacheData = 7; setup.CachePath = '" + folder +
+                     "';\n"
+                     "var lib = com.orvex.ZVWSLib;\n"
+                     "ready(function () {\n"
+                     "  call(ws, 'getBoxArtImage', {boxartsize: 6, boxartprefix: '" +
+                     prefix +
+                     "'}, function (status, path) {\n"
+                     "    report(status + ' ' + typeof path + ' ' + lib.fileExist(path));\n"
+                     "  call(ws, 'updateLocalCache', {operations: 7}, function (status, result) {\n"
+                     "    report(status + ' ' + result);\n"
+                     "    report(lib.clearLocalCache()); report(lib.clearLocalCache('" +
+                     folder +
+                     "'));\n"
+                     "    report(lib.fileExist(path)); }); }); });\n"));
+}
+
 // ---- The end of an instance whose worker is inside a call: it is waited for, and what it brings is freed.
 
 TEST_F(Movies, TheMovieEndsWhileCallsWaitForTheStore)
