@@ -35,6 +35,7 @@
     M(authorizeDevice)                \
     M(deactivateDevice)               \
     M(checkAuthToken)                 \
+    M(getBoxArtImage)                 \
     M(getMyVideos)                    \
     M(getWishlistItems)               \
     M(addItemToWishlist)              \
@@ -62,6 +63,7 @@
     M(getSettingsPageInfo)            \
     M(getCountryID)                   \
     M(getFileType)                    \
+    M(updateLocalCache)               \
     M(checkBandwidth)                 \
     M(calcOrderTax)                   \
     M(quitFlash)                      \
@@ -73,6 +75,7 @@
     S(setLogAreaIDsAndTargetConfig)   \
     S(fileExist)                      \
     M(getAvailableEnvLists)           \
+    S(clearLocalCache)                \
     M(getDeviceEnv)                   \
     S(checkZVSWFmd5sum)               \
     S(trace)

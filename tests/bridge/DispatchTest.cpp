@@ -1,8 +1,11 @@
 // Return codes, delivery and the end of instances, as far as they need no service: a set-up that the library refuses
 // at once goes the whole way through worker and delivery.
 #include <gtest/gtest.h>
+#include <stdlib.h>
+#include <unistd.h>
 
 #include "MovieRun.h"
+#include "ZVWSLibAE.h"
 
 namespace {
 
@@ -88,10 +91,9 @@ TEST(Dispatch, CloneNeedsAnotherInitialisedInstance)
 TEST(Dispatch, InstancesEndWhileTheirWorkersDo)
 {
     for (int i = 0; i < 20; ++i) {
-        // The delay moves the end of the movie along the life of the worker.
         EXPECT_EQ("", Report("for (var i = 0; i < 3; ++i) new com.orvex.ZVWSLib().init([{}, {}]);\n"
-                             "ws.init([{onComplete: quit}, {}]); if (" +
-                             std::to_string(i % 2) + ") quit();\n"));
+                             "for (var end = Date.now() + " +
+                             std::to_string(i % 4) + "; Date.now() < end;) {} quit();\n"));
     }
 }
 
@@ -102,7 +104,56 @@ TEST(Dispatch, IdleKeepsTheMovieUntilQuitFlash)
 
 TEST(Methods, StandInTheOrderAndKindsThatMoviesRestOn)
 {
-    EXPECT_EQ("", Report("report(Object.keys(com.orvex.ZVWSLib).join());\n"));
+    // The kinds: + for static functions.
+    const char kTable[] =
+        "init clone idle getNavigation getTitles getTitleListing searchForTitle getRecommendedTitles translateSkuID "
+        "getTvEpisodeListing getTvEpisodeListByTitleID getAllTvEpisodeListings authorizeDevice deactivateDevice "
+        "checkAuthToken getBoxArtImage getMyVideos getWishlistItems addItemToWishlist removeItemFromWishlist "
+        "removeAllItemsFromWishlist checkTitleInWishlist checkTitlesInWishlist doPurchaseSavedBilling "
+        "checkForPurchasedTitle checkForPurchasedSku checkAdultVerificationEnabled checkAdultVerificationPin "
+        "assignGiftCertificateToUser checkRentalExpiration getStreamingAssetLocation getStreamingBonusAssetLocation "
+        "loadLastStreamingAssetLocation manageStreamingInstanceStatus getTHXMediaDirector "
+        "getTHXMediaDirectorBonusAsset getEmailAddress getBillingInfo getPrePaidCardBalance getConfig "
+        "getSettingsPageInfo getCountryID getFileType updateLocalCache checkBandwidth calcOrderTax quitFlash "
+        "getLocalIPAddr getSysInfo setAudioDefaultProperty getAudioDefaultProperty getUserAgent "
+        "+setLogAreaIDsAndTargetConfig +fileExist getAvailableEnvLists +clearLocalCache getDeviceEnv "
+        "+checkZVSWFmd5sum +trace ";
+    AEArray<ae::stagecraft::ASExtensionClass::Method> methods;
+    ZVWSLibAE::GetMethods(methods);
+    std::string table;
+    for (const auto& method : methods)
+        table += std::string(method.m_type == method.kStaticFunction ? "+" : "") + method.m_pName + " ";
+    EXPECT_EQ(kTable, table);
+    EXPECT_EQ(59u, methods.size());
+    EXPECT_FALSE(ZVWSLibAE::FiresEvents());
+}
+
+TEST(Methods, PrintAndAnswerTexts)
+{
+    testing::internal::CaptureStdout();
+    EXPECT_EQ("[12][][][]\n", Report("com.orvex.ZVWSLib.trace('é ' + 1); ws.trace(null); ws.trace();\n"
+                                     "report('[' + [ws.getSysInfo(12), ws.getSysInfo(), ws.getSysInfo('a', 'b'),\n"
+                                     "    ws.getSysInfo('')].join('][') + ']');\n"));
+    EXPECT_EQ("FLASH TRACE == é 1\nFLASH TRACE == null\nFLASH TRACE == \n", testing::internal::GetCapturedStdout());
+}
+
+TEST(Methods, LookAtFiles)
+{
+    char path[] = "/tmp/zvfileXXXXXX";
+    const int file = mkstemp(path);
+    ASSERT_EQ(3, write(file, "abc", 3));
+    close(file);
+    const std::string name = path;
+    EXPECT_EQ(
+        "true,false,false,false\ntrue,true,false,false,false,false\n",
+        Report("var lib = com.orvex.ZVWSLib, path = '" + name +
+               "';\n"
+               "report([lib.fileExist(path), lib.fileExist(path + 'x'), lib.fileExist(), lib.fileExist(path, 1)]);\n"
+               "report([lib.checkZVSWFmd5sum(path, '900150983cd24fb0d6963f7d28e17f72'),\n"
+               "    lib.checkZVSWFmd5sum(path, '900150983CD24FB0D6963F7D28E17F72'),\n"
+               "    lib.checkZVSWFmd5sum(path, '900150983cd24fb0d6963f7d28e17f73'), lib.checkZVSWFmd5sum(path),\n"
+               "    lib.checkZVSWFmd5sum(path + 'x', ''), lib.checkZVSWFmd5sum('/tmp', '')]);\n"));
+    unlink(path);
 }
 
 }  // namespace

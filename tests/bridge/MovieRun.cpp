@@ -77,6 +77,8 @@ MovieRun RunMovie(const std::string& script, const Result& shown)
     s_Run = &run;
     s_Shown = &shown;
     const MovieFile movie(script);
+    setenv("STAGECRAFT_FPS", "200", 1);
+    unsetenv("STAGECRAFT_MOVIE");
     const char* arguments[] = {"test", movie.Path()};
     IStagecraft* runtime = IStagecraft::InitializeStagecraftLibrary(2, arguments);
     if (!runtime) return run;

@@ -29,6 +29,7 @@ struct ZVWSLibAE::State {
         ZV_WS_TitleTypeFilter m_PrefetchTypeFilter = TITLE_TYPE_FILTER_ANY;
         ZV_WS_WatchStatus m_PrefetchWatchStatus = WATCH_STATUS_WATCHNOW;
         ZV_WS_PurchaseType m_PrefetchPurchaseType = PURCHASE_TYPE_RENT;
+        ZV_WS_BoxArtSize m_PrefetchBoxArtSize = BOX_ART_SIZE_95;
         CacheType m_CurrentCacheType = CacheType_None;
         unsigned int m_CurrentCacheData = 0;
     };
@@ -66,6 +67,7 @@ inline void Remember(ZVWSLibAE::State&, const Param_base&) {}
 void Remember(ZVWSLibAE::State& state, const Param_getTitles& param);
 void Remember(ZVWSLibAE::State& state, const Param_getMyVideos& param);
 void Remember(ZVWSLibAE::State& state, const Param_getWishlistItems& param);
+void Remember(ZVWSLibAE::State& state, const Param_getBoxArtImage& param);
 void Remember(ZVWSLibAE::State& state, const Param_init& param);
 
 /// The elements of the one argument when it is an Array of two objects.
@@ -156,11 +158,12 @@ void Work(const char* name, ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...),
 
 }  // namespace ZVWSLib
 
-#define ZVWS_ASYNC(name, prototype)                                                                      \
+/// A row whose worker calls `call`.
+#define ZVWS_ASYNC_CALL(name, prototype, call)                                                           \
     namespace ZVWSLib {                                                                                  \
     void name(void* param)                                                                               \
     {                                                                                                    \
-        Work<decltype(prototype)>(#name, ZV_WS_##name, param);                                           \
+        Work<decltype(prototype)>(#name, call, param);                                                   \
     }                                                                                                    \
     }                                                                                                    \
     void ZVWSLibAE::name(ae::stagecraft::StageWindow* /*window*/, ae::stagecraft::ASObject& object,      \
@@ -168,3 +171,5 @@ void Work(const char* name, ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...),
     {                                                                                                    \
         returnValue = ZVWSLib::AsyncDispatch(*this, #name, ZVWSLib::name, prototype, object, arguments); \
     }
+
+#define ZVWS_ASYNC(name, prototype) ZVWS_ASYNC_CALL(name, prototype, ZV_WS_##name)

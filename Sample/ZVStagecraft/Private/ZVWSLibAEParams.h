@@ -65,6 +65,12 @@ struct Param_getWishlistItems : Param_base {
     ZVWS_PROPERTIES(sortorder, page, typefilter)
 };
 
+struct Param_getBoxArtImage : Param_base {
+    ZV_WS_BoxArtSize boxartsize = BOX_ART_SIZE_95;
+    AEString boxartprefix;
+    ZVWS_PROPERTIES(boxartsize, boxartprefix)
+};
+
 struct Param_doPurchaseSavedbilling : Param_base {
     int skuid = 0;
     AEString ipaddress;

@@ -63,6 +63,13 @@ void ZVWSLibAE::fileExist(StageWindow* /*window*/, ASObject& object, ASValueArra
     returnValue = ASValue::Boolean(exists);
 }
 
+void ZVWSLibAE::clearLocalCache(StageWindow* /*window*/, ASObject& object, ASValueArray& arguments,
+                                ASValue& returnValue)
+{
+    const ZVWSAELog scope("ZVWSLibAE", "clearLocalCache", GetZV_LogAreaID());
+    returnValue = ASValue::Number(ZV_WS_clearLocalCache(TextOf(object, arguments, 0).c_str()));
+}
+
 namespace {
 
 // The MD5 sum of a file in lower-case hexadecimal digits; empty when the file cannot be read whole.

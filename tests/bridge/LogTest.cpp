@@ -1,0 +1,109 @@
+// The tracer, and the log that a movie sets up.
+#include <gtest/gtest.h>
+#include <stdlib.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <fstream>
+#include <regex>
+#include <sstream>
+
+#include "MovieRun.h"
+#include "ZVWSAELog.h"
+#include "ZV_Log.h"
+
+namespace {
+
+class Log : public testing::Test {
+protected:
+    void SetUp() override
+    {
+        char folder[] = "/tmp/zvlogXXXXXX";
+        ASSERT_TRUE(mkdtemp(folder));
+        m_Folder = std::string(folder) + "/";
+    }
+    void TearDown() override
+    {
+        ZVWSAELog::InitWSLogs(0x3F00, ZVWSAELog::kConsole);  // closes the file
+        ZV_LogSetTarget(nullptr, nullptr);
+        unlink((m_Folder + "log.txt").c_str());
+        rmdir(m_Folder.c_str());
+    }
+
+    // The file's lines without their times.
+    std::string File()
+    {
+        ZVWSAELog::InitWSLogs(0, ZVWSAELog::kConsole);
+        std::stringstream text;
+        text << std::ifstream(m_Folder + "log.txt").rdbuf();
+        return std::regex_replace(text.str(), std::regex("\\[[0-9:.]{12}-"), "[");
+    }
+
+    std::string m_Folder;
+};
+
+int AreaId(const char* name)
+{
+    int id = -1;
+    ZV_LogRegisterArea(name, &id);
+    return id;
+}
+
+TEST_F(Log, EachBitOfTheMaskSwitchesItsArea)
+{
+    const char* kNames[] = {"ZV_WSAE", "ZV_WSCFGAE", "soap_proxy", "soap_recv", "soap_sent", "soap_test"};
+    for (int on = 0; on < 6; ++on) {
+        ASSERT_EQ(0, ZVWSAELog::InitWSLogs(0x100u << on, ZVWSAELog::kFile, m_Folder.c_str()));
+        for (const char* name : kNames)
+            ZV_LogOutput(AreaId(name), ZV_LOG_TRACE, "line\n");
+        EXPECT_EQ(std::string("[") + kNames[on] + "] line\n", File());
+    }
+}
+
+TEST_F(Log, TargetsAndFailures)
+{
+    EXPECT_EQ(0, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, m_Folder.c_str()));
+    EXPECT_EQ(1, ZVWSAELog::InitWSLogs(0x100, 0));
+    EXPECT_EQ(2, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, "/no/such/folder/"));
+    EXPECT_EQ(2, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, std::string(300, 'x').c_str()));
+    {
+        const ZVWSAELog scope("Class", "method", AreaId("ZV_WSAE"));
+        ZV_LogOutput(AreaId("ZV_WSAE"), ZV_LOG_ERROR, "inside\n");
+    }
+    // The target that failures left unchanged.
+    EXPECT_EQ("[ZV_WSAE] Entering Class::method\n[ZV_WSAE] inside\n[ZV_WSAE] Exiting Class::method\n", File());
+
+    testing::internal::CaptureStdout();
+    EXPECT_EQ(0, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kConsole | ZVWSAELog::kFile, m_Folder.c_str()));
+    ZV_LogOutput(AreaId("ZV_WSAE"), ZV_LOG_TRACE, "to the console\n");
+    EXPECT_NE(std::string::npos, testing::internal::GetCapturedStdout().find("to the console"));
+}
+
+TEST_F(Log, AMovieSetsItUp)
+{
+    const MovieRun run = RunMovie(
+        "var lib = com.orvex.ZVWSLib;\n"
+        "report([lib.setLogAreaIDsAndTargetConfig(), lib.setLogAreaIDsAndTargetConfig('0x100'),\n"
+        "    lib.setLogAreaIDsAndTargetConfig({LogAreaIDs: '0x100', LogTarget: 2, SettingsFile: '" +
+        m_Folder +
+        "settings.xml'})]);\n"
+        "var ws = new lib(); ws.getNavigation();\n");
+    EXPECT_EQ("-3,-3,0\n", run.Text());
+    EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
+}
+
+TEST_F(Log, TheEnvironmentOverridesTheMovie)
+{
+    setenv("ZV_LOG_AREAS", "256", 1);
+    setenv("ZV_LOG_TARGET", "02", 1);
+    const MovieRun run = RunMovie(
+        "var lib = com.orvex.ZVWSLib;\n"
+        "report(lib.setLogAreaIDsAndTargetConfig({LogAreaIDs: 0, LogTarget: 1, PreferenceFile: '" +
+        m_Folder + "p'}));\nnew lib().getNavigation();\n");
+    unsetenv("ZV_LOG_AREAS");
+    unsetenv("ZV_LOG_TARGET");
+    EXPECT_EQ("0\n", run.Text());
+    EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
+}
+
+}  // namespace
