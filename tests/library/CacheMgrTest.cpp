@@ -534,8 +534,16 @@ TEST_F(CacheMgrTest, ADatabaseThatBreaksWhileInUseIsFalse)
     EXPECT_FALSE(m_Cache.UpdateLastCacheLoadTime("t"));
     EXPECT_TRUE(m_Folder.Read("cache.zv") == readOnly);
 
-    std::filesystem::remove_all(m_Folder / "");
+    const std::string folder = m_Folder / "inner";
+    ASSERT_TRUE(std::filesystem::create_directory(folder));
+    m_Path = folder + "/cache.zv";
+    Open(CacheType_File);
+    EXPECT_TRUE(Put(kService, "k", 1));
+    std::filesystem::rename(folder, m_Folder / "away");
     ExpectAll(m_Cache, 0, "folder gone");
+    EXPECT_FALSE(Has(kService, "k"));
+    std::filesystem::rename(m_Folder / "away", folder);
+    EXPECT_TRUE(Has(kService, "k"));
 }
 
 }  // namespace

@@ -130,6 +130,7 @@ TEST(SerializerTest, WritesOneElementWithoutReferences)
     const std::string text = Text(Written(false));
     EXPECT_NE(std::string::npos, text.find("<ZVWSLib"));
     EXPECT_EQ("</ZVWSLib>", text.substr(text.find_last_of('<')).substr(0, 10));
+    EXPECT_NE(std::string::npos, text.find("Caf\xc3\xa9")) << "UTF-8, as it came";
     EXPECT_EQ(std::string::npos, text.find("Envelope"));
     EXPECT_EQ(std::string::npos, text.find("href"));
     EXPECT_EQ(std::string::npos, text.find(" id="));
