@@ -61,7 +61,7 @@ function showDetails(title) {
         if (title[name]) trace("    " + pad(name, 12) + title[name]);
     });
     title.AvailableProducts.forEach(function (product) {
-        trace("    " + pad(purchaseTypes[product.PurchaseType], 12) + product.Price + ", until " + product.ExpireDate);
+        trace("    " + pad(purchaseTypes[product.PurchaseType], 12) + product.Price + ", until " + product.ExpireDate.toDateString());
     });
 }
 
