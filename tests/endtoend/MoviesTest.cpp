@@ -1,0 +1,78 @@
+// The movies that come with the project, and what a movie sees when the store is not as it should be.
+#include <gtest/gtest.h>
+
+#include "Process.h"
+#include "Storefront.h"
+
+namespace {
+
+class Demonstration : public testing::Test {
+protected:
+    void SetUp() override
+    {
+        std::string error;
+        store = Storefront::Start(StorefrontOptions(), error);
+        ASSERT_TRUE(store) << error;
+    }
+
+    ProcessOutput Run(const std::string& movie, const std::string& deployment = "")
+    {
+        return RunMovieFile(std::string(ZV_MOVIES) + "/" + movie,
+                            {{"ZV_DEPLOYMENT", deployment.empty() ? store->DeploymentFile() : deployment}});
+    }
+
+    static void ExpectScriptErrors(const ProcessOutput& output, const std::string& error)
+    {
+        EXPECT_EQ(error, output.After("script error: ").substr(0, error.size())) << output.Text();
+    }
+
+    std::unique_ptr<Storefront> store;
+};
+
+TEST_F(Demonstration, TheStoreIsShown)
+{
+    const ProcessOutput output = Run("storefront.js");
+    EXPECT_EQ(0, output.status);
+    ExpectScriptErrors(output, "(none)");
+    EXPECT_EQ("", output.After("Genres"));
+    EXPECT_EQ(store->Query("SELECT '1 of ' || ((COUNT(*) + 9) / 10) || ' (' || COUNT(*) || ' titles)' FROM title_genre "
+                           "WHERE genre = 100"),
+              output.After("Titles, page "));
+    EXPECT_EQ(
+        store->Query("SELECT synopsis FROM title WHERE id = (SELECT MIN(title) FROM title_genre WHERE genre = 100)"),
+        output.After("    Synopsis    "));
+    for (const LoggedRequest& request : store->Log())
+        EXPECT_EQ("", request.violation) << request.operation;
+}
+
+TEST_F(Demonstration, AnEveningChangesTheAccount)
+{
+    const ProcessOutput output = Run("evening.js");
+    EXPECT_EQ(0, output.status);
+    ExpectScriptErrors(output, "(none)");
+    EXPECT_EQ("0 goes on at 1234 s", output.After("loadLastStreamingAssetLocation: "));
+    EXPECT_EQ("1234", store->Query("SELECT position FROM pass ORDER BY id DESC LIMIT 1"));
+    for (const LoggedRequest& request : store->Log())
+        EXPECT_EQ("", request.violation) << request.operation;
+}
+
+TEST_F(Demonstration, AStoreThatCannotBeTrustedOrReachedEndsTheMovieWithAnError)
+{
+    store->SetCertificate(CertificateKind::Untrusted);
+    ExpectScriptErrors(Run("storefront.js"), "Error: init failed with status -2011");
+    ExpectScriptErrors(Run("storefront.js", "/no/such/file"), "Error: init failed with status -1900");
+    store->SetCertificate(CertificateKind::Good);
+    std::string error;
+    ASSERT_TRUE(store->AddFault("getTitlesByNavigation=http:503", error));
+    ExpectScriptErrors(Run("storefront.js"), "Error: getTitles failed with status -4503");
+    ExpectScriptErrors(Run("storefront.js"), "(none)");
+}
+
+TEST_F(Demonstration, AMovieThatCannotBeReadIsOneLine)
+{
+    const ProcessOutput output = Run("no-such-movie.js");
+    EXPECT_EQ("", output.After("[ZV_FLASH]CreateAndConfigureStageWindowSet fail "));
+    EXPECT_NE(std::string::npos, output.After("stagecraft: cannot read the movie ").find("no-such-movie.js"));
+}
+
+}  // namespace
