@@ -208,7 +208,9 @@ TEST(PlayerSystemTest, DrivesAHost)
     player.Type("init\nnonsense\nneter");
     Process closed({ZV_STAGECRAFT, "5"}, environment);
     ASSERT_TRUE(closed.WaitForLine("[ZV_FLASH] NETWORK_MSG_STUB_INIT !"));
-    player.Type("ror\nuninit\n");
+    player.Type("ror\n");
+    ASSERT_TRUE(closed.WaitForLine("[ZV_FLASH] IPC get 7 "));
+    player.Type("uninit\n");
     EXPECT_EQ(0, closed.WaitForEnd());
     ASSERT_TRUE(player.WaitForLine("disconnected"));
 
