@@ -1,10 +1,13 @@
 // Every way in which the host ends, with the whole console output and the messages that the player system gets.
 #include <errno.h>
 #include <fcntl.h>
+#include <sched.h>
+#include <string.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
+#include <chrono>
 #include <filesystem>
-#include <fstream>
 
 #include "HostConsole.h"
 #include "HostLines.h"
@@ -67,6 +70,18 @@ TEST_F(ExitTest, RequestedClose)
     ExpectReceived({4});
 }
 
+// A FIFO's writing end, once somebody reads it.
+int OpenForReader(const std::string& path)
+{
+    const auto patience = std::chrono::steady_clock::now() + std::chrono::minutes(1);
+    int fifo = -1;
+    while (fifo == -1 && std::chrono::steady_clock::now() < patience) {
+        fifo = open(path.c_str(), O_WRONLY | O_NONBLOCK | O_CLOEXEC);
+        sched_yield();
+    }
+    return fifo;
+}
+
 // The movie is a FIFO: reading it holds the start up until the close has been requested.
 TEST_F(ExitTest, RequestedCloseBeforeTheMovieHasBegun)
 {
@@ -77,7 +92,10 @@ TEST_F(ExitTest, RequestedCloseBeforeTheMovieHasBegun)
     m_player.Accept();
     m_player.Send(3);
     ASSERT_TRUE(host.WaitForLine("<ZV_FLASH> ipc listener thread main has exit!"));
-    m_folder.Write("fifo", kRunsOn);
+    const int fifo = OpenForReader(m_folder.Path("fifo"));
+    ASSERT_NE(-1, fifo) << "the host does not read its movie";
+    EXPECT_EQ(static_cast<ssize_t>(strlen(kRunsOn)), write(fifo, kRunsOn, strlen(kRunsOn)));
+    close(fifo);
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines() + ReleaseLines(), ListenLines({UninitMessage()})));
     ExpectReceived({4});
