@@ -20,7 +20,8 @@ std::atomic<bool> s_closeRequested{false};
 pthread_t s_listenThread;  // main thread's
 bool s_listenThreadCreated = false;
 
-pthread_mutex_t s_processMutex = PTHREAD_MUTEX_INITIALIZER;
+// Error-checking: an unlock by someone who holds nothing, which zv_stagecraft_lock invites, then does nothing.
+pthread_mutex_t s_processMutex = PTHREAD_ERRORCHECK_MUTEX_INITIALIZER_NP;
 
 int Send(NETWORK_MSG_STUB_TYPE type)
 {
@@ -163,7 +164,11 @@ int zv_stagecraft_exit_by_bdp_release()
 
 void zv_stagecraft_lock_init()
 {
-    pthread_mutex_init(&s_processMutex, nullptr);
+    pthread_mutexattr_t attributes;
+    pthread_mutexattr_init(&attributes);
+    pthread_mutexattr_settype(&attributes, PTHREAD_MUTEX_ERRORCHECK);
+    pthread_mutex_init(&s_processMutex, &attributes);
+    pthread_mutexattr_destroy(&attributes);
 }
 
 void zv_stagecraft_lock_uninit()

@@ -1,0 +1,265 @@
+// Every way in which the host ends, with the whole console output and the messages that the player system gets.
+#include <errno.h>
+#include <fcntl.h>
+#include <sched.h>
+#include <string.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <filesystem>
+
+#include "HostConsole.h"
+#include "HostLines.h"
+#include "IpcChannel.h"
+
+namespace {
+
+class ExitTest : public testing::Test {
+protected:
+    Environment WithMovie(const std::string& movie)
+    {
+        return {{"ZV_IPC_SOCKET", m_folder.Path("player")}, {"STAGECRAFT_MOVIE", m_folder.Write("movie.js", movie)}};
+    }
+
+    // Everything that the player system must have got, up to the end of the connection.
+    void ExpectReceived(const std::vector<uint32_t>& types)
+    {
+        for (const uint32_t type : types) {
+            EXPECT_EQ(Player::Message(type), m_player.Receive());
+        }
+        EXPECT_EQ("", m_player.Receive());
+    }
+
+    Folder m_folder;
+    Player m_player{m_folder.Path("player")};
+};
+
+TEST_F(ExitTest, ActiveExit)
+{
+    Process host({ZV_STAGECRAFT, "5"}, WithMovie(kEndsAtOnce));
+    m_player.Accept();
+    m_player.Send(1);
+    EXPECT_EQ(Player::Message(5), m_player.Receive());
+    m_player.Send(6);
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"hello"}) + ActiveExitLines(),
+                        ListenLines({InitMessage(), DoneMessage()})));
+    EXPECT_EQ(Lines{}, host.Errors());
+    ExpectReceived({});
+}
+
+TEST_F(ExitTest, ActiveExitThatNobodyAcknowledges)
+{
+    Process host({ZV_STAGECRAFT, "5"}, WithMovie(kEndsAtOnce));
+    m_player.Accept();
+    EXPECT_EQ(0, host.WaitForEnd());
+    ExpectReceived({5});
+}
+
+TEST_F(ExitTest, RequestedClose)
+{
+    Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
+    m_player.Accept();
+    ASSERT_TRUE(host.WaitForLine("running"));
+    m_player.Send(3);
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"running"}) + ReleaseLines(),
+                        ListenLines({UninitMessage()})));
+    EXPECT_EQ(Lines{}, host.Errors());
+    ExpectReceived({4});
+}
+
+// A FIFO's writing end, once somebody reads it.
+int OpenForReader(const std::string& path)
+{
+    const auto patience = std::chrono::steady_clock::now() + std::chrono::minutes(1);
+    int fifo = -1;
+    while (fifo == -1 && std::chrono::steady_clock::now() < patience) {
+        fifo = open(path.c_str(), O_WRONLY | O_NONBLOCK | O_CLOEXEC);
+        sched_yield();
+    }
+    return fifo;
+}
+
+// The movie is a FIFO: reading it holds the start up until the close has been requested.
+TEST_F(ExitTest, RequestedCloseBeforeTheMovieHasBegun)
+{
+    Environment environment = WithMovie("");
+    environment.back().second = m_folder.Path("fifo");
+    ASSERT_EQ(0, mkfifo(m_folder.Path("fifo").c_str(), 0600));
+    Process host({ZV_STAGECRAFT, "5"}, environment);
+    m_player.Accept();
+    m_player.Send(3);
+    ASSERT_TRUE(host.WaitForLine("<ZV_FLASH> ipc listener thread main has exit!"));
+    const int fifo = OpenForReader(m_folder.Path("fifo"));
+    ASSERT_NE(-1, fifo) << "the host does not read its movie";
+    EXPECT_EQ(static_cast<ssize_t>(strlen(kRunsOn)), write(fifo, kRunsOn, strlen(kRunsOn)));
+    close(fifo);
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines() + ReleaseLines(), ListenLines({UninitMessage()})));
+    ExpectReceived({4});
+}
+
+TEST_F(ExitTest, PlayerSystemGoes)
+{
+    Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
+    m_player.Accept();
+    ASSERT_TRUE(host.WaitForLine("running"));
+    m_player.Close();
+    EXPECT_EQ(0, host.WaitForEnd());
+    const Lines nothingSent = {"[ZV_FLASH] ipc thread already exit, now do nothing! ", "[ZV_FLASH] ZV FLASH Run End "};
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"running"}) + FinalizeLines() + nothingSent,
+                        ListenLines({ReceiveFailure(ECONNRESET)})));
+}
+
+TEST_F(ExitTest, NetworkErrorAndUnknownMessagesChangeNothing)
+{
+    Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
+    m_player.Accept();
+    ASSERT_TRUE(host.WaitForLine("running"));
+    m_player.Send(7);
+    m_player.SendBytes("short");
+    m_player.Send(2);
+    m_player.SendBytes(Player::Message(3) + "long");
+    m_player.Send(0xFFFFFFFFu);
+    m_player.SendBytes(Player::Message(3).substr(0, 4) + std::string(12, '\x7f'));  // words 1 to 3 do not count
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_TRUE(IsMerge(
+        host.Output(), StartLines() + MovieLines({"running"}) + ReleaseLines(),
+        ListenLines({NetworkErrorMessage(), {"[ZV_FLASH] IPC get 2 "}, {"[ZV_FLASH] IPC get -1 "}, UninitMessage()})));
+    EXPECT_EQ((Lines{"player: dropped a packet of 5 bytes, a message has 16",
+                     "player: dropped a packet of 20 bytes, a message has 16"}),
+              host.Errors());
+}
+
+TEST_F(ExitTest, FloodOfMessages)
+{
+    Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
+    m_player.Accept();
+    ASSERT_TRUE(host.WaitForLine("running"));
+    const size_t kMany = 500;  // fewer bytes of output than its pipe holds
+    for (size_t i = 0; i < kMany; ++i) {
+        m_player.Send(8);
+    }
+    m_player.Send(3);
+    EXPECT_EQ(0, host.WaitForEnd());
+    std::vector<Lines> messages(kMany, Lines{"[ZV_FLASH] IPC get 8 "});
+    messages.push_back(UninitMessage());
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"running"}) + ReleaseLines(), ListenLines(messages)));
+}
+
+TEST_F(ExitTest, NoQueue)
+{
+    Environment environment = WithMovie("setInterval(function () {}, 10);");
+    environment.front().second = m_folder.Path("nobody");
+    Process host({ZV_STAGECRAFT, "5"}, environment);
+    EXPECT_EQ(0, host.WaitForEnd());
+    Lines start = StartLines();
+    start.insert(start.begin() + 4, "[ZV_FLASH] zv_stagecraft_ipc_init Error ");
+    const Lines nothingSent = {"[ZV_FLASH] ipc thread already exit, now do nothing! ", "[ZV_FLASH] ZV FLASH Run End "};
+    EXPECT_TRUE(IsMerge(host.Output(), start + MovieLines() + FinalizeLines() + nothingSent,
+                        ListenLines({ReceiveFailure(ENOTCONN)})));
+    EXPECT_EQ(
+        Lines{"player: no queue to the player system at " + m_folder.Path("nobody") + ": No such file or directory"},
+        host.Errors());
+}
+
+TEST_F(ExitTest, StageWindowSetFails)
+{
+    Environment environment = WithMovie("");
+    environment.back().second = m_folder.Path("no movie");
+    Process host({ZV_STAGECRAFT, "5"}, environment);
+    m_player.Accept();
+    EXPECT_EQ(Player::Message(5), m_player.Receive());
+    m_player.Send(6);
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_TRUE(IsMerge(host.Output(),
+                        StartLines() + Lines{"[ZV_FLASH]CreateAndConfigureStageWindowSet fail "} + ActiveExitLines(),
+                        ListenLines({DoneMessage()})));
+}
+
+// A copy of the program that finds no runtime beside itself.
+TEST_F(ExitTest, RuntimeLibraryMissing)
+{
+    std::filesystem::copy_file(ZV_STAGECRAFT, m_folder.Path("zv_stagecraft"));
+    Process host({m_folder.Path("zv_stagecraft"), "5"}, WithMovie(kEndsAtOnce));
+    m_player.Accept();
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + ReleaseLines(), ListenLines({ReceiveFailure(ENOTCONN)})));
+    EXPECT_EQ(Lines{"Failed to load libIAEKernel.so: libIAEKernel.so: cannot open shared object file: No such file or "
+                    "directory"},
+              host.Errors());
+    ExpectReceived({4});
+}
+
+TEST_F(ExitTest, ReleaseWithoutQueueSaysSo)
+{
+    std::filesystem::copy_file(ZV_STAGECRAFT, m_folder.Path("zv_stagecraft"));
+    Process host({m_folder.Path("zv_stagecraft"), "5"}, {{"ZV_IPC_SOCKET", m_folder.Path("nobody")}});
+    EXPECT_EQ(0, host.WaitForEnd());
+    Lines start = StartLines();
+    start.insert(start.begin() + 4, "[ZV_FLASH] zv_stagecraft_ipc_init Error ");
+    EXPECT_TRUE(IsMerge(host.Output(),
+                        start + ReleaseLines() + Lines{"[ZV_FLASH] IPC:,NETWORK_MSG_STUB_UNINIT_RET failed! ERR = "},
+                        ListenLines({ReceiveFailure(ENOTCONN)})));
+}
+
+TEST_F(ExitTest, PlayedByTheStandIn)
+{
+    Environment environment = WithMovie(kEndsAtOnce);
+    environment.erase(environment.begin());
+    Process host({ZV_STAGECRAFT, "5"}, environment);
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"hello"}) + ActiveExitLines(),
+                        ListenLines({InitMessage(), DoneMessage()})));
+}
+
+// The console for people plays the other side as scripts do, through pipes.
+TEST(PlayerSystemTest, DrivesAHost)
+{
+    const Folder folder;
+    const std::string socket = folder.Path("player");
+    const Environment environment = {{"ZV_IPC_SOCKET", socket}, {"STAGECRAFT_MOVIE", folder.Write("m.js", kRunsOn)}};
+    Process player({ZV_PLAYER_SYSTEM, socket}, {});
+    ASSERT_TRUE(player.WaitForLine("listening"));
+    player.Type("init\nnonsense\nneter");
+    Process closed({ZV_STAGECRAFT, "5"}, environment);
+    ASSERT_TRUE(closed.WaitForLine("[ZV_FLASH] NETWORK_MSG_STUB_INIT !"));
+    player.Type("ror\n");
+    ASSERT_TRUE(closed.WaitForLine("[ZV_FLASH] IPC get 7 "));
+    player.Type("uninit\n");
+    EXPECT_EQ(0, closed.WaitForEnd());
+    ASSERT_TRUE(player.WaitForLine("disconnected"));
+
+    folder.Write("m.js", kEndsAtOnce);
+    Process finished({ZV_STAGECRAFT, "5"}, environment);
+    ASSERT_TRUE(player.WaitForLine("received 5 "));
+    player.Type("done\n");
+    EXPECT_EQ(0, finished.WaitForEnd());
+    player.Type("quit\n");
+    EXPECT_EQ(0, player.WaitForEnd());
+    // The second host's connection may end before or after "quit".
+    Lines printed = player.Output();
+    if (printed.back() == "disconnected") printed.pop_back();
+    EXPECT_EQ((Lines{"listening", "connected", "received 4 NETWORK_MSG_STUB_UNINIT_RET 0 0 0", "disconnected",
+                     "connected", "received 5 NETWORK_MSG_STUB_FINALIZE 0 0 0"}),
+              printed);
+    EXPECT_EQ(Lines{"zv_player_system: unknown input \"nonsense\"; known are init, uninit, done, neterror, quit"},
+              player.Errors());
+    EXPECT_FALSE(std::filesystem::exists(socket));
+}
+
+// It waits for a holder and keeps nothing: a second call would block for ever if it did.
+TEST(ProcessLockTest, IsNotKept)
+{
+    testing::internal::CaptureStdout();
+    zv_stagecraft_lock_init();
+    zv_stagecraft_lock();
+    zv_stagecraft_lock();
+    zv_stagecraft_lock_uninit();
+    const std::string once = "ZV_FLASH] zv_stagecraft_lock enter ! \nZV_FLASH] zv_stagecraft_lock leave ! \n";
+    EXPECT_EQ(once + once, testing::internal::GetCapturedStdout());
+}
+
+}  // namespace

@@ -1,0 +1,81 @@
+// What the host makes of its arguments and environment before the movie runs.
+#include "HostLines.h"
+
+namespace {
+
+struct Variant {
+    const char* argument;  // null: none
+    const char* printed;
+    const char* movie;
+    const char* flashVars;
+};
+
+class VariantTest : public testing::TestWithParam<Variant> {};
+
+Lines CommandLine(const Variant& variant)
+{
+    return variant.argument ? Lines{ZV_STAGECRAFT, "first", variant.argument} : Lines{ZV_STAGECRAFT};
+}
+
+// The movie that the player would show is named by the runtime, which does not find it here.
+TEST_P(VariantTest, ChoosesTheMovie)
+{
+    Process host(CommandLine(GetParam()), {});
+    EXPECT_EQ(0, host.WaitForEnd());
+    EXPECT_EQ(std::string("[ZV_FLASH]ZV UI type = ") + GetParam().printed + " ", host.Output().at(0));
+    EXPECT_EQ(Lines{std::string("stagecraft: cannot read the movie /usr/share/zorvane/zvcesdk2_") + GetParam().movie +
+                    ".swf: No such file or directory"},
+              host.Errors());
+}
+
+TEST_P(VariantTest, ChoosesTheFlashVariables)
+{
+    const Folder folder;
+    const std::string movie = folder.Write("movie.js",
+                                           "var pairs = []; for (var name in flashvars) "
+                                           "pairs.push(name + '=' + flashvars[name]); trace(pairs.join('&'));");
+    Process usual(CommandLine(GetParam()), {{"STAGECRAFT_MOVIE", movie}});
+    EXPECT_TRUE(usual.WaitForLine(GetParam().flashVars));
+    EXPECT_EQ(0, usual.WaitForEnd());
+
+    Process replaced(CommandLine(GetParam()), {{"STAGECRAFT_MOVIE", movie}, {"ZV_FLASHVARS", "a=%31&b=x"}});
+    EXPECT_TRUE(replaced.WaitForLine("a=1&b=x"));
+    EXPECT_EQ(0, replaced.WaitForEnd());
+    EXPECT_EQ("** a=%31&b=x **", replaced.Output().at(0));
+}
+
+#define FILES(start) \
+    "configurationFile=/misc/zorvane/" start "credentials.xml&settingsFile=/misc/zorvane/" start "preference.xml"
+INSTANTIATE_TEST_SUITE_P(
+    Types, VariantTest,
+    testing::Values(Variant{"0", "0", "alpha", FILES("north/alpha") "&defaultCountryID=1&defaultRegionCode=00"},
+                    Variant{"1", "1", "alpha", FILES("south/alpha") "&defaultCountryID=41&defaultRegionCode=00"},
+                    Variant{"2", "2", "beta", FILES("beta")}, Variant{"3rest", "3", "gamma", FILES("gamma")},
+                    Variant{"4", "4", "delta", FILES("delta")}, Variant{"5", "5", "gen", FILES("gen")},
+                    Variant{"6", "6", "gen", FILES("gen")}, Variant{"/", "-1", "gen", FILES("gen")},
+                    Variant{"", "-48", "gen", FILES("gen")},
+                    // the program's path is the last argument then
+                    Variant{nullptr, "-1", "gen", FILES("gen")}));
+
+TEST(DrmTest, FailureStartsNothingElse)
+{
+    const Folder folder;
+    const Player player(folder.Path("player"));
+    Process host({ZV_STAGECRAFT, "5"}, {{"ZV_IPC_SOCKET", folder.Path("player")}, {"ZV_DRM_INIT_RESULT", "-7"}});
+    EXPECT_EQ(255, WEXITSTATUS(host.WaitForEnd()));
+    EXPECT_EQ((Lines{"[ZV_FLASH]ZV UI type = 5 ", "", "[ZV_FLASH] Ipriv_drm_Init fail.ret = -7 "}), host.Output());
+    EXPECT_FALSE(player.HasCaller());
+}
+
+TEST(DrmTest, FailureAtTheEndIsSaid)
+{
+    const Folder folder;
+    Process host({ZV_STAGECRAFT, "5"},
+                 {{"STAGECRAFT_MOVIE", folder.Write("movie.js", kEndsAtOnce)}, {"ZV_DRM_TERMINATE_RESULT", "0x1f"}});
+    EXPECT_EQ(0, host.WaitForEnd());
+    const Lines failure = {"", "[ZV_FLASH] Ipriv_drm_Terminate fail.ret = 31 "};
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"hello"}) + failure + ActiveExitLines(),
+                        ListenLines({InitMessage(), DoneMessage()})));
+}
+
+}  // namespace
