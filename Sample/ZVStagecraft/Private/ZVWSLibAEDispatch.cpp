@@ -24,6 +24,23 @@ bool ZVWSLibAE::State::IsBusy()
     return m_Thread != nullptr;
 }
 
+void ZVWSLibAE::State::RunThread(const char* name, void (*function)(void*), void* param, ASObject& object,
+                                 const ASValue& callback)
+{
+    const KernelLock lock(m_ThreadMutex);
+    m_CallbackObject = callback;
+    m_FlashIdle = false;
+    m_Thread = ZVThread::CreateThread();
+    ZV_ASSERT(m_Thread != 0);  // NOLINT(modernize-use-nullptr): the text of the failure
+    if (m_Thread->Run(name, function, param)) {
+        object.StartUpdates();
+        return;
+    }
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR, "Failed to launch worker thread: %s!\n", name);
+    ZVThread::DestroyThread(m_Thread);
+    m_Thread = nullptr;
+}
+
 namespace ZVWSLib {
 
 int LogAreaID()
@@ -42,23 +59,6 @@ bool ReadArguments(ASValueArray& arguments, ASValue& callback, ASValue& paramete
     ASObject& array = *arguments[0].GetObject();
     return array.IsInstanceOf("Array") && array.GetLength() == 2 && array.GetElement(0, callback) &&
            callback.IsObject() && array.GetElement(1, parameters) && parameters.IsObject();
-}
-
-void RunThread(ZVWSLibAE::State& state, const char* name, void (*function)(void*), void* param, ASObject& object,
-               const ASValue& callback)
-{
-    const KernelLock lock(state.m_ThreadMutex);
-    state.m_CallbackObject = callback;
-    state.m_FlashIdle = false;
-    state.m_Thread = ZVThread::CreateThread();
-    ZV_ASSERT(state.m_Thread != 0);
-    if (state.m_Thread->Run(name, function, param)) {
-        object.StartUpdates();
-        return;
-    }
-    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR, "Failed to launch worker thread: %s!\n", name);
-    ZVThread::DestroyThread(state.m_Thread);
-    state.m_Thread = nullptr;
 }
 
 }  // namespace ZVWSLib

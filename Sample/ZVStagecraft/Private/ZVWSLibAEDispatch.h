@@ -39,6 +39,11 @@ struct ZVWSLibAE::State {
     /// Whether a call has been started and not been delivered.
     bool IsBusy();
 
+    /// Starts the worker, which owns `param` from then on, and the update calls for `object`. A thread that cannot be
+    /// made is one line in the log: no "onComplete" follows, the callback stays set and `param` is not freed.
+    void RunThread(const char* name, void (*function)(void*), void* param, ae::stagecraft::ASObject& object,
+                   const ae::stagecraft::ASValue& callback);
+
     /// The worker's last act on the instance: hands the result over.
     template <class Output>
     void Publish(const Output& output, ZV_WS_Status status)
@@ -74,11 +79,6 @@ void Remember(ZVWSLibAE::State& state, const Param_init& param);
 bool ReadArguments(ae::stagecraft::ASValueArray& arguments, ae::stagecraft::ASValue& callback,
                    ae::stagecraft::ASValue& parameters);
 
-/// Starts the worker, which owns `param` from then on, and the update calls for `object`. A thread that cannot be made
-/// is one line in the log: no "onComplete" follows, the callback stays set and `param` is not freed.
-void RunThread(ZVWSLibAE::State& state, const char* name, void (*function)(void*), void* param,
-               ae::stagecraft::ASObject& object, const ae::stagecraft::ASValue& callback);
-
 /// Everything of an asynchronous call after the question whether the instance may make it now.
 template <class Param>
 ZVWSLibAE::ReturnCode StartCall(ZVWSLibAE& instance, const char* name, void (*worker)(void*), const Param& prototype,
@@ -97,7 +97,7 @@ ZVWSLibAE::ReturnCode StartCall(ZVWSLibAE& instance, const char* name, void (*wo
     if (state.IsBusy()) return ZVWSLibAE::kBusy;  // a getter of the script made a call of its own
 
     Remember(state, *param);
-    RunThread(state, name, worker, param.release(), object, callback);
+    state.RunThread(name, worker, param.release(), object, callback);
     return ZVWSLibAE::kStarted;
 }
 
@@ -142,8 +142,8 @@ void Work(const char* name, ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...),
     using Output = std::remove_pointer_t<OutputPointer>;
 
     const std::unique_ptr<Param> param(static_cast<Param*>(argument));
-    ZV_ASSERT(param != 0);
-    ZV_ASSERT(param->pZVWSLibAE != 0);
+    ZV_ASSERT(param != nullptr);
+    ZV_ASSERT(param->pZVWSLibAE != nullptr);
     ZVWSLibAE::State& state = param->pZVWSLibAE->GetState();
     Output output{};
     const ZV_WS_Status status = std::apply(

@@ -48,8 +48,8 @@ ZV_WS_SetupParams SetupOf(const Param_init& param)
 void init(void* argument)
 {
     const std::unique_ptr<Param_init> param(static_cast<Param_init*>(argument));
-    ZV_ASSERT(param != 0);
-    ZV_ASSERT(param->pZVWSLibAE != 0);
+    ZV_ASSERT(param != nullptr);
+    ZV_ASSERT(param->pZVWSLibAE != nullptr);
     ZVWSLibAE::State& state = param->pZVWSLibAE->GetState();
     const ZV_WS_SetupParams setup = SetupOf(*param);
     const ZV_WS_Status status = ZV_WS_initialize(&state.m_Session, &setup);
