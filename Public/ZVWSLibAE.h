@@ -111,6 +111,7 @@ public:
 
     /// The instance's insides, for its handlers and workers.
     struct State;
+    class PrefetchMgr;
     State& GetState() { return *m_State; }
 
 private:

@@ -14,8 +14,8 @@ void ZVWSLib::Remember(ZVWSLibAE::State& state, const Param_getWishlistItems& pa
     state.m_Listing.m_PrefetchTypeFilter = param.typefilter;
 }
 
-ZVWS_ASYNC(getMyVideos, Param_getMyVideos())
-ZVWS_ASYNC(getWishlistItems, Param_getWishlistItems())
+ZVWS_ASYNC_LISTING(getMyVideos, Param_getMyVideos())
+ZVWS_ASYNC_LISTING(getWishlistItems, Param_getWishlistItems())
 ZVWS_ASYNC(addItemToWishlist, Param_OneInteger("titleid"))
 ZVWS_ASYNC(removeItemFromWishlist, Param_OneInteger("titleid"))
 ZVWS_ASYNC(removeAllItemsFromWishlist, Param_base())

@@ -34,13 +34,13 @@ ZV_WS_Status UpdateLocalCache(ZV_WS_Session* session, int operations, bool* succ
 }  // namespace
 
 ZVWS_ASYNC(getNavigation, Param_base())
-ZVWS_ASYNC(getTitles, Param_getTitles())
+ZVWS_ASYNC_LISTING(getTitles, Param_getTitles())
 ZVWS_ASYNC(getTitleListing, Param_OneInteger("titleid"))
 ZVWS_ASYNC(searchForTitle, Param_searchForTitle())
 ZVWS_ASYNC(getRecommendedTitles, Param_OneInteger("titleid"))
 ZVWS_ASYNC(translateSkuID, Param_OneInteger("skuid"))
 ZVWS_ASYNC(getTvEpisodeListing, Param_OneInteger("episodeid"))
 ZVWS_ASYNC(getTvEpisodeListByTitleID, Param_OneInteger("titleid"))
-ZVWS_ASYNC(getAllTvEpisodeListings, Param_OneInteger("titleid"))
+ZVWS_ASYNC_LISTING(getAllTvEpisodeListings, Param_OneInteger("titleid"))
 ZVWS_ASYNC(getBoxArtImage, Param_getBoxArtImage())
 ZVWS_ASYNC_CALL(updateLocalCache, Param_OneInteger("operations"), UpdateLocalCache)

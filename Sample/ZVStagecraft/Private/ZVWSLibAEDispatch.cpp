@@ -8,14 +8,21 @@ ZV_LOG_AREA(ZVWSAELOG_AREA_NAME)
 
 ZVWSLibAE::State::~State()
 {
-    ZVThread* thread = nullptr;
+    m_StopPrefetch = true;
+    ZVThread* threads[3] = {};
     {
         const KernelLock lock(m_ThreadMutex);
-        std::swap(thread, m_Thread);
+        std::swap(threads[0], m_Thread);
+        std::swap(threads[1], m_PrefetchTitlesThread);
+        std::swap(threads[2], m_PrefetchBoxArtsThread);
     }
-    ZVThread::SafeDestroyThread(thread);
+    for (ZVThread* thread : threads)
+        ZVThread::SafeDestroyThread(thread);
     m_Result.Release();
-    ZV_WS_release(&m_Session);
+    for (ZV_WS_Session* session :
+         {&m_PrefetchUserDataSession, &m_PrefetchBoxArtsSession, &m_PrefetchTitlesSession, &m_Session}) {
+        ZV_WS_release(session);
+    }
 }
 
 bool ZVWSLibAE::State::IsBusy()
@@ -30,6 +37,7 @@ void ZVWSLibAE::State::RunThread(const char* name, void (*function)(void*), void
     const KernelLock lock(m_ThreadMutex);
     m_CallbackObject = callback;
     m_FlashIdle = false;
+    m_NeedPrefetchTitles = false;
     m_Thread = ZVThread::CreateThread();
     ZV_ASSERT(m_Thread != 0);  // NOLINT(modernize-use-nullptr): the text of the failure
     if (m_Thread->Run(name, function, param)) {
@@ -68,7 +76,10 @@ bool ReadArguments(ASValueArray& arguments, ASValue& callback, ASValue& paramete
 void ZVWSLibAE::OnUpdate(StageWindow* /*window*/, ASObject& object)
 {
     State& state = *m_State;
-    if (!state.m_NeedFireEvent) return;
+    if (!state.m_NeedFireEvent) {
+        ZVWSLib::FetchBoxArtWhenIdle(*this);
+        return;
+    }
     object.StopUpdates();
     state.m_NeedFireEvent = false;
     ZVThread::Sleep(10);  // movies rest on a result never coming at once
@@ -81,6 +92,7 @@ void ZVWSLibAE::OnUpdate(StageWindow* /*window*/, ASObject& object)
     }
     ASValueArray arguments;
     if (callback.IsObject()) {
+        ZVWSLib::SchedulePrefetch(*this);
         ASValue value;
         ZVWSLib::SetResult(state.m_Result, value, *callback.GetObject());
         arguments.Append(ASValue::Number(state.m_Result.retCode));

@@ -19,6 +19,7 @@
 #include "ZVWSAELog.h"
 #include "ZVWSLibAE.h"
 #include "ZVWSLibAEParams.h"
+#include "ZVWSLibAEPrefetch.h"
 #include "ZVWSLibAEResult.h"
 
 /// Main thread, unless a member says otherwise.
@@ -34,6 +35,7 @@ struct ZVWSLibAE::State {
         unsigned int m_CurrentCacheData = 0;
     };
 
+    State() { m_PrefetchMgr.SetMutex(&m_Mutex); }
     ~State();
 
     /// Whether a call has been started and not been delivered.
@@ -43,6 +45,10 @@ struct ZVWSLibAE::State {
     /// made is one line in the log: no "onComplete" follows, the callback stays set and `param` is not freed.
     void RunThread(const char* name, void (*function)(void*), void* param, ae::stagecraft::ASObject& object,
                    const ae::stagecraft::ASValue& callback);
+
+    /// Starts a worker that fetches ahead, in the slot of its kind: "prefetch_getTitles" for pages, else box art. The
+    /// one before in that slot must have ended. The worker owns `param`.
+    void RunPrefetchThread(const char* name, void (*function)(void*), void* param);
 
     /// The worker's last act on the instance: hands the result over.
     template <class Output>
@@ -56,11 +62,25 @@ struct ZVWSLibAE::State {
     ZV_WS_Session m_Session;  ///< The worker's while one runs.
     KernelMutex m_ThreadMutex;
     ZVThread* m_Thread ZV_GUARDED_BY(m_ThreadMutex) = nullptr;
+    ZVThread* m_PrefetchTitlesThread ZV_GUARDED_BY(m_ThreadMutex) = nullptr;
+    ZVThread* m_PrefetchBoxArtsThread ZV_GUARDED_BY(m_ThreadMutex) = nullptr;
     ae::stagecraft::ASValue m_CallbackObject ZV_GUARDED_BY(m_ThreadMutex);
     Listing m_Listing;
     std::atomic<bool> m_Init{false};           ///< Set by the worker of "init".
     std::atomic<bool> m_NeedFireEvent{false};  ///< Set by a worker, after the result.
     bool m_FlashIdle = false;
+
+    // ---- Fetching ahead. The sessions are their workers', empty where nothing is fetched.
+    ZV_WS_Session m_PrefetchTitlesSession;
+    ZV_WS_Session m_PrefetchBoxArtsSession;
+    ZV_WS_Session m_PrefetchUserDataSession;
+    std::atomic<bool> m_NeedPrefetchTitles{false};  ///< A listing was answered; set by its worker before the result.
+    std::atomic<bool> m_PrefetchTitlesIsRunning{false};
+    std::atomic<bool> m_PrefetchBoxArtsIsRunning{false};
+    std::atomic<bool> m_StopPrefetch{false};  ///< The instance ends.
+    KernelMutex m_Mutex;
+    AEArray<AEString> m_WaitingForDownloadBoxArts ZV_GUARDED_BY(m_Mutex);
+    PrefetchMgr m_PrefetchMgr;
 };
 
 namespace ZVWSLib {
@@ -134,8 +154,8 @@ inline std::tuple<const int*, unsigned int> Pass(const AEArray<int>& numbers)
 
 void LogStatus(const char* name, ZV_WS_Status status);
 
-/// A worker: owns its param. Worker thread.
-template <class Param, class... Parameters>
+/// A worker: owns its param. Worker thread. What comes around the answer of a listing is worth fetching ahead.
+template <class Param, bool isListing, class... Parameters>
 void Work(const char* name, ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), void* argument)
 {
     using OutputPointer = std::tuple_element_t<sizeof...(Parameters) - 1, std::tuple<Parameters...>>;
@@ -153,17 +173,18 @@ void Work(const char* name, ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...),
         },
         param->Arguments());
     LogStatus(name, status);
+    if (isListing && status == ZV_WS_Status_ok) state.m_NeedPrefetchTitles = true;
     state.Publish(output, status);
 }
 
 }  // namespace ZVWSLib
 
 /// A row whose worker calls `call`.
-#define ZVWS_ASYNC_CALL(name, prototype, call)                                                           \
+#define ZVWS_ASYNC_ROW(name, prototype, call, isListing)                                                 \
     namespace ZVWSLib {                                                                                  \
     void name(void* param)                                                                               \
     {                                                                                                    \
-        Work<decltype(prototype)>(#name, call, param);                                                   \
+        Work<decltype(prototype), isListing>(#name, call, param);                                        \
     }                                                                                                    \
     }                                                                                                    \
     void ZVWSLibAE::name(ae::stagecraft::StageWindow* /*window*/, ae::stagecraft::ASObject& object,      \
@@ -172,4 +193,6 @@ void Work(const char* name, ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...),
         returnValue = ZVWSLib::AsyncDispatch(*this, #name, ZVWSLib::name, prototype, object, arguments); \
     }
 
-#define ZVWS_ASYNC(name, prototype) ZVWS_ASYNC_CALL(name, prototype, ZV_WS_##name)
+#define ZVWS_ASYNC_CALL(name, prototype, call) ZVWS_ASYNC_ROW(name, prototype, call, false)
+#define ZVWS_ASYNC(name, prototype) ZVWS_ASYNC_ROW(name, prototype, ZV_WS_##name, false)
+#define ZVWS_ASYNC_LISTING(name, prototype) ZVWS_ASYNC_ROW(name, prototype, ZV_WS_##name, true)

@@ -56,6 +56,7 @@ void init(void* argument)
     LogStatus("init", status);
     const bool succeeded = status == ZV_WS_Status_ok;
     if (!succeeded) ZV_WS_release(&state.m_Session);  // one failure leaves something behind
+    if (succeeded) DuplicatePrefetchSessions(state);
     state.m_Init = succeeded;
     state.Publish(succeeded, status);
 }
@@ -99,6 +100,7 @@ ZVWSLibAE::ReturnCode Clone(ZVWSLibAE& self, ASValueArray& arguments)
         return ZVWSLibAE::kDuplicateFailed;
     }
     state.m_Listing = source->GetState().m_Listing;
+    ZVWSLib::DuplicatePrefetchSessions(state);
     state.m_Init = true;
     return ZVWSLibAE::kStarted;
 }
