@@ -235,6 +235,15 @@ TEST_F(Movies, ClonesWorkBesideTheirSource)
     EXPECT_EQ(4u, store->Log().size());  // one discovery
 }
 
+TEST_F(Movies, AnInitThatReadsACloneIntoBeingIsRefused)
+{
+    EXPECT_EQ("0\n-2\ngetCountryID 0\n",
+              Report("ready(function () {\n"
+                     "  var twin = new com.orvex.ZVWSLib();\n"
+                     "  report(twin.init([{}, {get APIKey() { report(twin.clone(ws)); }}]));\n"
+                     "  ws = twin; each([['getCountryID', {}]]); });\n"));
+}
+
 TEST_F(Movies, WhatASessionKnowsIsAnsweredAtOnce)
 {
     EXPECT_EQ("[]-1\nZVSDK: F|A ZVMODEL:M\n2\n0 apistg,1 stg,2 production!,3 default\n",
