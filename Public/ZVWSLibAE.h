@@ -10,7 +10,27 @@
 //
 // Calling convention of the asynchronous methods: one argument, an Array of the callback object and the parameter
 // object. They return a code at once, and only after ReturnCode::kStarted the callback's "onComplete"(status, result)
-// is called, once. The status is a ZV_WS_Status; the result is built also when it is a failure.
+// is called, once. The status is a ZV_WS_Status; the result is built also when it is a failure. "init" on an instance
+// that is initialised returns kStarted, too, and does nothing: no "onComplete" follows.
+//
+// Methods that answer at once, with arguments of their own:
+//   clone(instance)             a session like that of another instance; ReturnCode
+//   idle()                      0; updates go on until the next result or "quitFlash"
+//   quitFlash()                 0; ends the movie
+//   getUserAgent()              text, empty before "init"
+//   getDeviceEnv()              environment number, -1 before "init"
+//   getAvailableEnvLists()      Array of {endpoint, envNum}, with isDefault where the service says so: blocks while it
+//   is
+//                               asked, and does not ask before "init" or while a worker runs
+//   getSysInfo(value)           the value's text
+//   fileExist(path)             boolean
+//   clearLocalCache(folder)     ZV_WS_Status
+//   checkZVSWFmd5sum(path, sum) boolean: whether the file has that MD5 sum, in hexadecimal digits
+//   setLogAreaIDsAndTargetConfig({LogAreaIDs, LogTarget, SettingsFile, PreferenceFile})
+//                               bits of areas and target, as numbers or texts in any base of C; the log file stands
+//                               beside the first file given with a folder. ZV_LOG_AREAS and ZV_LOG_TARGET in the
+//                               environment override. 0; 1 no target, 2 file cannot be opened, -3 no object
+//   trace(value)                prints the value's text
 #pragma once
 
 #include <memory>

@@ -4,9 +4,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <fstream>
-#include <regex>
-#include <sstream>
 
 #include "MovieRun.h"
 #include "ZVWSAELog.h"
@@ -34,9 +33,11 @@ protected:
     std::string File()
     {
         ZVWSAELog::InitWSLogs(0, ZVWSAELog::kConsole);
-        std::stringstream text;
-        text << std::ifstream(m_Folder + "log.txt").rdbuf();
-        return std::regex_replace(text.str(), std::regex("\\[[0-9:.]{12}-"), "[");
+        std::ifstream file(m_Folder + "log.txt");
+        std::string text;
+        for (std::string line; std::getline(file, line);)
+            text += "[" + line.substr(std::min(line.size(), sizeof "[HH:MM:SS.mmm-" - 1)) + "\n";
+        return text;
     }
 
     std::string m_Folder;

@@ -221,18 +221,27 @@ TEST_F(Movies, AStoreThatCannotBeTrustedIsAStatusOfInit)
 TEST_F(Movies, ClonesWorkBesideTheirSource)
 {
     store->SetLatency(50);
-    EXPECT_EQ(
-        "0\n-4\n-4\n-5\nsource 0\nclone 0\nlate 0\n",
-        Report("ready(function () {\n"
-               "  var twin = new com.orvex.ZVWSLib(), late = new com.orvex.ZVWSLib();\n"
-               "  report(twin.clone(ws)); report(twin.clone(ws)); report(ws.clone(twin));\n"
-               "  call(ws, 'getCountryID', {}, function (status) { report('source ' + status); ws = null; });\n"
-               "  call(twin, 'getCountryID', {}, function (status) { report('clone ' + status);\n"
-               "    setTimeout(function () {\n"
-               "      if (late.clone(twin) !== 0) return report('late clone failed');\n"
-               "      call(late, 'getCountryID', {}, function (status) { report('late ' + status); }); }, 1); });\n"
-               "  report(late.clone(ws)); });\n"));
+    EXPECT_EQ("0\n-4\n-4\n-5\nclone 0,late 0,source 0\n",
+              Report("ready(function () {\n"
+                     "  var twin = new com.orvex.ZVWSLib(), late = new com.orvex.ZVWSLib(), done = [];\n"
+                     "  function finished(name) { return function (status) { done.push(name + ' ' + status);\n"
+                     "    if (done.length === 3) report(done.sort()); }; }\n"
+                     "  report(twin.clone(ws)); report(twin.clone(ws)); report(ws.clone(twin));\n"
+                     "  call(ws, 'getCountryID', {}, function (status) { ws = null; finished('source')(status); });\n"
+                     "  call(twin, 'getCountryID', {}, function (status) {\n"
+                     "    if (late.clone(twin) !== 0) report('late clone failed');\n"
+                     "    call(late, 'getCountryID', {}, finished('late')); finished('clone')(status); });\n"
+                     "  report(late.clone(ws)); });\n"));
     EXPECT_EQ(4u, store->Log().size());  // one discovery
+}
+
+TEST_F(Movies, AnInitThatReadsACloneIntoBeingIsRefused)
+{
+    EXPECT_EQ("0\n-2\ngetCountryID 0\n",
+              Report("ready(function () {\n"
+                     "  var twin = new com.orvex.ZVWSLib();\n"
+                     "  report(twin.init([{}, {get APIKey() { report(twin.clone(ws)); }}]));\n"
+                     "  ws = twin; each([['getCountryID', {}]]); });\n"));
 }
 
 TEST_F(Movies, WhatASessionKnowsIsAnsweredAtOnce)

@@ -106,6 +106,7 @@ ZVWSLibAE::ReturnCode StartCall(ZVWSLibAE& instance, const char* name, void (*wo
 {
     ZVWSLibAE::State& state = instance.GetState();
     if (state.IsBusy()) return ZVWSLibAE::kBusy;
+    const bool wasInitialized = state.m_Init;
     ae::stagecraft::ASValue callback, parameters;
     if (!ReadArguments(arguments, callback, parameters)) return ZVWSLibAE::kWrongArguments;
 
@@ -114,7 +115,8 @@ ZVWSLibAE::ReturnCode StartCall(ZVWSLibAE& instance, const char* name, void (*wo
     PropertyReader reader(*parameters.GetObject());
     param->ReadWith(reader);
     if (!reader.Succeeded()) return ZVWSLibAE::kWrongArguments;
-    if (state.IsBusy()) return ZVWSLibAE::kBusy;  // a getter of the script made a call of its own
+    // A getter of the script may have made a call of its own.
+    if (state.IsBusy() || state.m_Init != wasInitialized) return ZVWSLibAE::kBusy;
 
     Remember(state, *param);
     state.RunThread(name, worker, param.release(), object, callback);
