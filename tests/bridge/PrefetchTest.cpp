@@ -1,0 +1,201 @@
+// Fetching ahead, seen from the store: which pages are asked for after one was shown, in which order, and when not.
+#include <gtest/gtest.h>
+#include <stdlib.h>
+
+#include <filesystem>
+#include <fstream>
+#include <thread>
+
+#include "MovieRun.h"
+#include "Storefront.h"
+
+namespace {
+
+class Prefetch : public testing::Test {
+protected:
+    void SetUp() override
+    {
+        std::string error;
+        store = Storefront::Start(StorefrontOptions(), error);
+        ASSERT_TRUE(store) << error;
+        setenv("ZV_DEPLOYMENT", store->DeploymentFile().c_str(), 1);
+        go = store->DataFolder() + "/go";
+    }
+
+    // Runs the script in a movie whose "init" has succeeded with a file cache for `data`. until(then) goes on when the
+    // store has seen `requests` of them.
+    std::string Run(int data, size_t requests, const std::string& script)
+    {
+        std::thread opener([&] {
+            if (store->WaitForRequests(requests)) std::ofstream(go) << "go";
+        });
+        const MovieRun run = RunMovie("var go = '" + go + "', folder = '" + store->DataFolder() +
+                                      "/cache', data = " + std::to_string(data) + ";" + R"(
+var ws = new com.orvex.ZVWSLib();
+function call(method, parameters, then) {
+    var code = ws[method]([{onComplete: function (status, result) {
+        if (status !== 0) report(method + ' ' + status);
+        then(result);
+    }}, parameters]);
+    if (code !== 0) report(method + ' refused ' + code);
+}
+function until(then) {
+    var timer = setInterval(function () {
+        if (!ws.fileExist(go)) return;
+        clearInterval(timer);
+        then();
+    }, 10);
+}
+function titles(page, then) {
+    call('getTitles', {genreid: 1, CurrentPageNumber: page, ItemsPerPage: perPage, purchasetype: 2}, then);
+}
+)" + script);
+        store->ClearFaults();
+        EXPECT_TRUE(run.succeeded);
+        opener.join();
+        return run.Text();
+    }
+
+    static std::string Init(const std::string& then)
+    {
+        return "call('init', {APIKey: 'desktop', UserName: 'customer', Password: 'secret', DestinationUniqueID: 'd', "
+               "DestinationTypeID: 1, AccessType: 2, EnvNum: 2, CacheType: 2, CacheData: data, CachePath: folder}, "
+               "function () {" +
+               then + "});";
+    }
+
+    // The pages asked for, in order.
+    std::vector<std::string> Pages(const std::string& operation) const
+    {
+        std::vector<std::string> pages;
+        for (const LoggedRequest& request : store->Log()) {
+            for (const auto& child : request.children) {
+                if (request.operation == operation && child.first == "CurrentPageNumber") pages.push_back(child.second);
+            }
+        }
+        return pages;
+    }
+
+    // So many items on a page that genre 1 has that many pages.
+    std::string PerPage(int pages) const
+    {
+        const int total = atoi(store->Query("SELECT COUNT(*) FROM title_genre WHERE genre = 1").c_str());
+        return "var perPage = " + std::to_string((total + pages - 1) / pages) + ";";
+    }
+
+    using Strings = std::vector<std::string>;
+    std::unique_ptr<Storefront> store;
+    std::string go;
+};
+
+TEST_F(Prefetch, PagesAroundTheOneShownNearestFirst)
+{
+    const struct {
+        int pages;
+        int shown;
+        Strings asked;
+    } rows[] = {
+        {10, 10, {"10", "1", "9", "2", "8", "3", "7", "4", "6"}},
+        {10, 5, {"5", "6", "4", "7", "3", "8", "2", "9", "1"}},
+        {3, 1, {"1", "2", "3"}},
+        {2, 2, {"2", "1"}},
+    };
+    for (const auto& row : rows) {
+        store->ClearLog();
+        std::filesystem::remove_all(store->DataFolder() + "/cache");
+        std::filesystem::remove(go);
+        // The load time comes first.
+        EXPECT_EQ("", Run(1, row.asked.size() + 1,
+                          PerPage(row.pages) +
+                              Init("titles(" + std::to_string(row.shown) + ", function () { until(quit); });")));
+        EXPECT_EQ(row.asked, Pages("getTitlesByNavigation"));
+    }
+}
+
+TEST_F(Prefetch, ThePageTurnedToIsThere)
+{
+    EXPECT_EQ(
+        "2\n3\n",
+        Run(1, 10,
+            PerPage(10) + Init("titles(1, function () { until(function () {"
+                               "titles(2, function (page) { report(page.CurrentPageNumber);"
+                               "titles(3, function (page) { report(page.CurrentPageNumber); quit(); }); }); }); });")) +
+            "\n");
+    const Strings pages = Pages("getTitlesByNavigation");
+    EXPECT_EQ(1, std::count(pages.begin(), pages.end(), "2"));
+    EXPECT_EQ(1, std::count(pages.begin(), pages.end(), "3"));
+}
+
+TEST_F(Prefetch, TheUsersListsAreTheirOwnKind)
+{
+    EXPECT_EQ("",
+              Run(4, 4,
+                  Init("call('getMyVideos', {CurrentPageNumber: 1, ItemsPerPage: 1, purchasetype: 2, typefilter: 0, "
+                       "watchstatus: 3}, function () { until(quit); });")));
+    EXPECT_EQ((Strings{"1", "2", "3"}), Pages("getMyStreamingVideos"));
+}
+
+TEST_F(Prefetch, NothingIsFetchedAheadWithoutNeed)
+{
+    // A search is no listing; a failed page has no neighbours; another kind of data is cached; one page is all.
+    const struct {
+        int data;
+        const char* script;
+        const char* fault;
+        size_t requests;
+    } rows[] = {
+        {1,
+         "call('searchForTitle', {CurrentPageNumber: 1, ItemsPerPage: 2, purchasetype: 2, typefilter: 0, query: "
+         "'the'}, quit)",
+         "", 2},
+        {1, "var perPage = 10; titles(1, quit)", "getTitlesByNavigation=code:3", 2},
+        {2, "var perPage = 10; titles(1, quit)", "", 1},
+        {1, "var perPage = 10000; titles(1, quit)", "", 2},
+    };
+    for (const auto& row : rows) {
+        std::string error;
+        if (*row.fault) store->AddFault(row.fault, error);
+        store->ClearLog();
+        std::filesystem::remove_all(store->DataFolder() + "/cache");
+        Run(row.data, row.requests, Init(row.script));
+        EXPECT_EQ(row.requests, store->Log().size()) << row.script;
+    }
+}
+
+TEST_F(Prefetch, BoxArtComesWhileTheScriptIsIdle)
+{
+    const std::string season =
+        store->Query("SELECT season FROM title WHERE season > 0 GROUP BY season ORDER BY season LIMIT 1");
+    const int episodes = atoi(store->Query("SELECT COUNT(*) FROM title WHERE season = " + season).c_str());
+    // Load time, listings, and the images of all episodes but the first.
+    EXPECT_EQ("", Run(3, static_cast<size_t>(2 + episodes - 1),
+                      Init("call('getAllTvEpisodeListings', {titleid: " + season +
+                           "}, function () { ws.idle(); until(quit); });")));
+    std::vector<std::string> prefixes;
+    for (const LoggedRequest& request : store->Log()) {
+        if (request.service == "boxart") prefixes.push_back(request.operation);
+    }
+    std::vector<std::string> wanted;
+    for (const auto& row : store->Rows("SELECT prefix FROM title WHERE season = " + season + " ORDER BY episode")) {
+        wanted.push_back(row[0]);
+    }
+    wanted.erase(wanted.begin());
+    EXPECT_EQ(wanted, prefixes);
+}
+
+// A page that nobody waits for may hang: the customer's own call does not.
+TEST_F(Prefetch, AForegroundCallWins)
+{
+    std::string error;
+    ASSERT_TRUE(store->AddFault("getTitlesByNavigation=ok", error));
+    ASSERT_TRUE(store->AddFault("getTitlesByNavigation=ok,delay=1500", error));
+    EXPECT_EQ("answered",
+              Run(1, 3,
+                  PerPage(10) +
+                      Init("titles(1, function () { until(function () {"
+                           "var asked = new Date().getTime();"
+                           "call('getTitleListing', {titleid: 12}, function () {"
+                           "report(new Date().getTime() - asked < 1000 ? 'answered' : 'late'); quit(); }); }); });")));
+}
+
+}  // namespace
