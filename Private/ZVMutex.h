@@ -1,6 +1,7 @@
 // The mutex that all code here uses: std::mutex with the annotations that let Clang check who may touch what.
 #pragma once
 
+#include <chrono>
 #include <condition_variable>
 #include <mutex>
 
@@ -44,6 +45,11 @@ private:
 class ZVCondition {
 public:
     void Wait(ZVMutex& mutex) ZV_REQUIRES(mutex) { m_Condition.wait(mutex); }
+    /// false when the time has come.
+    bool WaitUntil(ZVMutex& mutex, std::chrono::steady_clock::time_point time) ZV_REQUIRES(mutex)
+    {
+        return m_Condition.wait_until(mutex, time) == std::cv_status::no_timeout;
+    }
     void NotifyAll() { m_Condition.notify_all(); }
 
 private:

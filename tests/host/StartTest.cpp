@@ -55,7 +55,8 @@ INSTANTIATE_TEST_SUITE_P(
                     Variant{"6", "6", "gen", FILES("gen")}, Variant{"/", "-1", "gen", FILES("gen")},
                     Variant{"", "-48", "gen", FILES("gen")},
                     // the program's path is the last argument then
-                    Variant{nullptr, "-1", "gen", FILES("gen")}));
+                    Variant{nullptr, "-1", "gen", FILES("gen")}),
+    [](const testing::TestParamInfo<Variant>& info) { return "Row" + std::to_string(info.index); });
 
 TEST(DrmTest, FailureStartsNothingElse)
 {

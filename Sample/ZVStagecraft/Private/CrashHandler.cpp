@@ -186,6 +186,8 @@ void sighandler(int signal, siginfo_t* info, void* context)
 void zv_dbg_init()
 {
     ProvideSignalStack();
+    void* frame;
+    backtrace(&frame, 1);  // its first call loads a library, which a handler had better not
     struct sigaction action = {};
     sigemptyset(&action.sa_mask);
     action.sa_sigaction = sighandler;

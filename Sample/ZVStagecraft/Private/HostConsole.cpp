@@ -2,17 +2,21 @@
 
 #include <stdarg.h>
 #include <stdio.h>
-#include <string.h>
+
+#include <string>
 
 void HostPrint(const char* format, ...)
 {
-    const size_t length = strlen(format);
     va_list arguments;
     va_start(arguments, format);
-    flockfile(stdout);
-    vfprintf(stdout, format, arguments);
-    if (length == 0 || format[length - 1] != '\n') putc_unlocked('\n', stdout);
-    fflush(stdout);
-    funlockfile(stdout);
+    va_list again;
+    va_copy(again, arguments);
+    const int length = vsnprintf(nullptr, 0, format, arguments);
     va_end(arguments);
+    std::string text(length > 0 ? static_cast<size_t>(length) : 0, '\0');
+    vsnprintf(&text[0], text.size() + 1, format, again);
+    va_end(again);
+    if (text.empty() || text.back() != '\n') text += '\n';
+    fwrite(text.data(), 1, text.size(), stdout);  // one call, one text
+    fflush(stdout);
 }

@@ -2,23 +2,38 @@
 
 #include <pthread.h>
 #include <signal.h>
-#include <time.h>
 
 #include <atomic>
+#include <chrono>
 
 #include "Host.h"
 #include "HostConsole.h"
+#include "ZVMutex.h"
 #include "player/NetworkStub.h"
 
 namespace {
 
-constexpr int kLastMessageSeconds = 5;
+// Beyond it a player system does not answer any more.
+constexpr std::chrono::seconds kLastMessageTime{5};
 
 // Set by the listen thread alone, when it is about to end.
 std::atomic<bool> s_quit{false};
 std::atomic<bool> s_closeRequested{false};
-pthread_t s_listenThread;  // main thread's
+
+pthread_t s_listenThread;  // main thread's, like the next
 bool s_listenThreadCreated = false;
+
+// Never destructed: the listen thread can outlive main.
+struct ListenEnd {
+    ZVMutex mutex;
+    ZVCondition changed;
+    bool ended ZV_GUARDED_BY(mutex) = false;
+};
+ListenEnd& TheListenEnd()
+{
+    static ListenEnd& end = *new ListenEnd;
+    return end;
+}
 
 // Error-checking: an unlock by someone who holds nothing, which zv_stagecraft_lock invites, then does nothing.
 pthread_mutex_t s_processMutex = PTHREAD_ERRORCHECK_MUTEX_INITIALIZER_NP;
@@ -75,6 +90,10 @@ void* _zv_stagecraft_ipc_listen_thread_main(void*)
         Dispatch(message.type);
     }
     HostPrint("<ZV_FLASH> ipc listener thread main has exit!");
+    ListenEnd& end = TheListenEnd();
+    const ZVMutexLock lock(end.mutex);
+    end.ended = true;
+    end.changed.NotifyAll();
     return reinterpret_cast<void*>(1);
 }
 
@@ -129,10 +148,15 @@ int stop_zv_stagecraft_ipc_listen_thread()
 void WaitForIpcListenThread()
 {
     if (!s_listenThreadCreated) return;
-    timespec deadline;
-    clock_gettime(CLOCK_MONOTONIC, &deadline);
-    deadline.tv_sec += kLastMessageSeconds;
-    pthread_clockjoin_np(s_listenThread, nullptr, CLOCK_MONOTONIC, &deadline);
+    {
+        const auto deadline = std::chrono::steady_clock::now() + kLastMessageTime;
+        ListenEnd& end = TheListenEnd();
+        const ZVMutexLock lock(end.mutex);
+        while (!end.ended && end.changed.WaitUntil(end.mutex, deadline)) {
+        }
+        if (!end.ended) return;
+    }
+    pthread_join(s_listenThread, nullptr);
     s_listenThreadCreated = false;
 }
 
