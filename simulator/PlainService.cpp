@@ -87,7 +87,7 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
     if (service == "boxart") return BoxArt(request, fault, log);
     HttpResponse response;
     if (service == "clock") {
-        response.body = fault.Is("body") ? fault.value : Clock();
+        response.body = Clock();
     } else {
         response.contentType = "application/octet-stream";
         response.body.assign(kBandwidthFile, 'b');
@@ -106,6 +106,8 @@ HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLo
             response.status = 400;
             response.body += error + "\n";
         }
+    } else if (what == "GET /control/faults") {
+        response.body = faults.Pending();
     } else if (what == "DELETE /control/faults") {
         faults.Clear();
     } else if (what == "GET /control/log") {

@@ -77,3 +77,6 @@ struct ServiceRow {
     std::vector<const Operations*> operations;
 };
 const std::vector<ServiceRow>& Services();
+
+/// The row of the service's operation, or null.
+const OperationRow* FindOperation(const ServiceRow& service, const std::string& name);

@@ -67,6 +67,16 @@ const std::vector<ServiceRow>& Services()
     return services;
 }
 
+const OperationRow* FindOperation(const ServiceRow& service, const std::string& name)
+{
+    for (const Operations* rows : service.operations) {
+        for (const OperationRow& row : *rows) {
+            if (name == row.name) return &row;
+        }
+    }
+    return nullptr;
+}
+
 const ServiceRow* SoapService::Find(const std::string& path)
 {
     for (const ServiceRow& service : Services()) {
@@ -90,7 +100,7 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
     } else {
         checked.operation->handle(call);
     }
-    if (!fault.Is("code")) return xml.Text();
+    if (!fault.Is("code") || checked.operation->bare) return xml.Text();
     XmlWriter refusal;
     Call refused{m_Database, checked.arguments, refusal, m_PlainAddress};
     refused.Standard(fault.Number(1), "refused as asked");
