@@ -94,7 +94,7 @@ private:
     void Serve(int descriptor, bool tls, unsigned long number);
     bool Handshake(Connection& connection);
     void NoteMalformed(const Connection& connection);
-    void NoteConnection(const Connection& connection, const std::string& fault, const std::string& violation);
+    void NoteConnection(const Connection& connection, const std::string& fault);
     double Now() const { return std::chrono::duration<double>(Clock::now() - m_Start).count(); }
     void ServeRequests(Connection& connection);
     bool ServeOne(Connection& connection, const HttpRequest& request);
@@ -312,7 +312,7 @@ bool Simulator::Handshake(Connection& connection)
 {
     const Fault fault = m_Faults.Take("connect");
     Channel& channel = connection.channel;
-    if (!fault.kind.empty() || fault.delay) NoteConnection(connection, fault.Text(), "");
+    if (!fault.kind.empty() || fault.delay) NoteConnection(connection, fault.Text());
     if (!Pause(fault.delay)) return false;
     if (!fault.kind.empty()) {
         // A handshake record of 74 bytes, of which the first two come.
@@ -330,11 +330,10 @@ bool Simulator::Handshake(Connection& connection)
     }
     const bool done = channel.Handshake(context);
     SSL_CTX_free(context);
-    if (!done) NoteConnection(connection, "", "the TLS handshake failed");
     return done;
 }
 
-void Simulator::NoteConnection(const Connection& connection, const std::string& fault, const std::string& violation)
+void Simulator::NoteConnection(const Connection& connection, const std::string& fault)
 {
     LoggedRequest log;
     log.service = log.operation = "connect";
@@ -342,7 +341,6 @@ void Simulator::NoteConnection(const Connection& connection, const std::string& 
     log.tls = connection.tls;
     log.time = Now();
     log.fault = fault;
-    log.violation = violation;
     m_Log.Add(std::move(log));
 }
 

@@ -58,14 +58,10 @@ TEST_F(ServerTest, OnlyTheGoodCertificatePassesACarefulClient)
     Begin();
     for (const auto& row : rows) {
         SCOPED_TRACE(static_cast<int>(row.kind));
-        store->ClearLog();
         store->SetCertificate(row.kind);
         RawClient client(store->HttpsPort(), CaFile());
         EXPECT_FALSE(client.Connect());
         EXPECT_EQ(row.result, client.verify_result) << X509_verify_cert_error_string(client.verify_result);
-        client.Close();
-        ASSERT_TRUE(store->WaitForRequests(1));
-        EXPECT_EQ("the TLS handshake failed", LastLogged().violation);
     }
     store->SetCertificate(CertificateKind::Good);
     EXPECT_EQ(200, Ask("StreamAPI", "getConfig").status);
