@@ -353,6 +353,26 @@ TEST_F(ContractTest, EveryAnswerIsOneOfTheContract)
     }
 }
 
+TEST_F(ContractTest, SearchesLookAwayFromCase)
+{
+    Begin();
+    const auto found = [&](const char* text) {
+        return atoi(Ask(kBrowse, "searchForTitle",
+                        Children({{"Query", text},
+                                  {"ItemsPerPage", "1"},
+                                  {"CurrentPageNumber", "1"},
+                                  {"PurchaseType", "any"},
+                                  {"TitleType", "any"}}))
+                        .Element("TotalItems")
+                        .c_str());
+    };
+    EXPECT_GT(found("harbour"), 0);
+    EXPECT_EQ(found("harbour"), found("HARBOUR"));
+    EXPECT_GT(found("Caf\u00e9"), 0);
+    EXPECT_EQ(found("Caf\u00e9"), found("cAF\u00c9"));
+    EXPECT_EQ(found("&lt;%&gt;"), 0) << "no pattern";
+}
+
 // Pages add up to the whole, each title once, positions counted through.
 TEST_F(ContractTest, PagesAddUp)
 {
