@@ -21,8 +21,8 @@ std::string AccountText(Call& call, const char* column)
 void authorizeDevice(Call& call)
 {
     const std::string pin = call.Text("PIN");
-    if (pin == "000000") return call.Standard(2, "device locked out");
-    if (pin != StorefrontAccount::kActivationPin) return call.Standard(1, "invalid PIN");
+    if (pin == "000000") return call.Refuse(2, "device locked out");
+    if (pin != StorefrontAccount::kActivationPin) return call.Refuse(1, "invalid PIN");
     const std::string token = "token-" + std::to_string(AccountInt(call, "active") + 1);
     call.database.Run("UPDATE account SET token = ?, active = active + 1", {token});
     call.Standard();
@@ -80,7 +80,7 @@ void addItemToWishlist(Call& call)
 {
     const int title = call.Int("TitleID");
     if (call.database.Int("SELECT COUNT(*) FROM title WHERE id = ?", {title}) == 0)
-        return call.Standard(1, "no such title");
+        return call.Refuse(1, "no such title");
     call.database.Run("INSERT OR IGNORE INTO wish SELECT ?, COALESCE(MAX(added), 0) + 1 FROM wish", {title});
     call.Standard();
 }
@@ -102,10 +102,11 @@ void getWishlistItems(Call& call)
     static const char* const kOrders[] = {"added", "name", "rating", "stars DESC"};
     static const char* const kByType[] = {"", " WHERE is_tv = 1", " WHERE is_tv = 0"};
     const int order = call.Int("sortOrder");
-    if (order < 0 || order > 3) return call.Standard(2, "no such order");
-    WritePurchaseList(call, "wish JOIN title ON title.id = wish.title" + std::string(kByType[call.Int("TitleType")]),
-                      "wish.title", "0", std::string(kOrders[order]) + ", wish.title");
-    call.xml.Element("SortOrder", order);
+    if (order < 0 || order > 3) return call.Refuse(2, "no such order");
+    const bool written = WritePurchaseList(
+        call, "wish JOIN title ON title.id = wish.title" + std::string(kByType[call.Int("TitleType")]), "wish.title",
+        "0", std::string(kOrders[order]) + ", wish.title");
+    if (written) call.xml.Element("SortOrder", order);
 }
 
 // ---- Money
@@ -118,7 +119,7 @@ void getEmailAddress(Call& call)
 
 void getBillingInfo(Call& call)
 {
-    if (AccountText(call, "card").empty()) return call.Standard(2, "no card on file");
+    if (AccountText(call, "card").empty()) return call.Refuse(2, "no card on file");
     call.Standard();
     call.xml.Element("CCLastFour", AccountText(call, "card")).Element("CCTypeId", AccountInt(call, "card_type"));
     call.xml.Element("CCType", AccountText(call, "card_name"));
@@ -133,9 +134,9 @@ void showPrePaidCardBalance(Call& call)
 void assignGiftCertificateToUser(Call& call)
 {
     const std::string code = call.Text("GiftCertificateCode");
-    if (code.empty()) return call.Standard(2, "no code");
+    if (code.empty()) return call.Refuse(2, "no code");
     const int amount = call.database.Int("SELECT amount FROM gift WHERE code = ? AND used = 0", {code});
-    if (amount == 0) return call.Standard(1, "unknown or used code");
+    if (amount == 0) return call.Refuse(1, "unknown or used code");
     call.database.Run("UPDATE gift SET used = 1 WHERE code = ?", {code});
     call.database.Run("UPDATE account SET prepaid = prepaid + ?", {amount});
     call.Standard();
@@ -152,16 +153,16 @@ void doPurchaseSavedbilling(Call& call)
 {
     const int sku = call.Int("SkuID");
     // The first refusals can be asked for by product: 9001 answers 1, 9002 answers 2 ... 9022 answers 22.
-    if (sku > 9000 && sku <= 9022) return call.Standard(sku - 9000, "refused as asked");
+    if (sku > 9000 && sku <= 9022) return call.Refuse(sku - 9000, "refused as asked");
     const std::string funds = call.Text("UsePrePaidFunds");
     const std::string price = call.database.Text("SELECT price FROM product WHERE sku = ?", {sku});
-    if (price.empty()) return call.Standard(1, "no such product");
-    if (funds != "yes" && funds != "no") return call.Standard(7, "neither yes nor no");
+    if (price.empty()) return call.Refuse(1, "no such product");
+    if (funds != "yes" && funds != "no") return call.Refuse(7, "neither yes nor no");
     if (funds == "yes") {
-        if (AccountInt(call, "prepaid") < Cents(price)) return call.Standard(12, "not enough prepaid money");
+        if (AccountInt(call, "prepaid") < Cents(price)) return call.Refuse(12, "not enough prepaid money");
         call.database.Run("UPDATE account SET prepaid = prepaid - ?", {Cents(price)});
     } else if (AccountText(call, "card").empty()) {
-        return call.Standard(11, "no card on file");
+        return call.Refuse(11, "no card on file");
     }
     call.database.Run(
         "INSERT INTO pass (title, sku, type, watch, status, position, hours, stream) SELECT title, sku, type, 0, 1, 0, "
@@ -178,8 +179,7 @@ void doPurchaseSavedbilling(Call& call)
 void checkRentalExpiration(Call& call)
 {
     const int pass = call.Int("PassId");
-    if (call.database.Int("SELECT COUNT(*) FROM pass WHERE id = ?", {pass}) == 0)
-        return call.Standard(1, "no such pass");
+    if (call.database.Int("SELECT COUNT(*) FROM pass WHERE id = ?", {pass}) == 0) return call.Refuse(1, "no such pass");
     const int hours = call.database.Int("SELECT hours FROM pass WHERE id = ?", {pass});
     call.Standard();
     call.xml.Flag("ShouldDisplay", hours > 0 && hours < 48).Element("HoursRemaining", hours);
@@ -218,25 +218,41 @@ const Operations& SharedOperations()
 {
     using T = ChildType;
     static const Operations operations = {
-        {"checkRentalExpiration", {{"PassId", T::Int}}, checkRentalExpiration},
+        {"checkRentalExpiration",
+         {{"PassId", T::Int}},
+         checkRentalExpiration,
+         false,
+         "|<ShouldDisplay>false</ShouldDisplay><HoursRemaining>0</HoursRemaining>"},
         {"GetCountryID", {}, GetCountryID, true},
         {"getConfig", {}, getConfig},
-        {"checkAdultVerificationPin", {{"Pin", T::Text}}, checkAdultVerificationPin},
+        {"checkAdultVerificationPin",
+         {{"Pin", T::Text}},
+         checkAdultVerificationPin,
+         false,
+         "|<IsPinVerified>false</IsPinVerified>"},
         {"checkAdultVerificationEnabled", {}, checkAdultVerificationEnabled},
         {"addItemToWishlist", {{"TitleID", T::Int}}, addItemToWishlist},
         {"removeAllItemsFromWishList", {}, removeAllItemsFromWishList},
         {"removeItemFromWishList", {{"TitleID", T::Int}}, removeItemFromWishList},
         {"getWishlistItems",
          {{"sortOrder", T::Int}, {"CurrentPageNumber", T::Int}, {"ItemsPerPage", T::Int}, {"TitleType", T::TitleType}},
-         getWishlistItems},
-        {"assignGiftCertificateToUser", {{"GiftCertificateCode", T::Text}}, assignGiftCertificateToUser},
+         getWishlistItems,
+         false,
+         kRefusedWishes},
+        {"assignGiftCertificateToUser",
+         {{"GiftCertificateCode", T::Text}},
+         assignGiftCertificateToUser,
+         false,
+         "|<Balance>0</Balance>"},
         {"getSettingsPageInfo", {}, getSettingsPageInfo},
         {"getEmailAddress", {}, getEmailAddress},
-        {"showPrePaidCardBalance", {}, showPrePaidCardBalance},
-        {"getBillingInfo", {}, getBillingInfo},
+        {"showPrePaidCardBalance", {}, showPrePaidCardBalance, false, "|<Balance>0</Balance>"},
+        {"getBillingInfo", {}, getBillingInfo, false, "|<CCTypeId>0</CCTypeId>"},
         {"doPurchaseSavedbilling",
          {{"SkuID", T::Int}, {"IPAddress", T::Text}, {"UsePrePaidFunds", T::Text}},
-         doPurchaseSavedbilling},
+         doPurchaseSavedbilling,
+         false,
+         "|<PassID>0</PassID><TransactionId>0</TransactionId>"},
         {"authorizeDevice", {{"PIN", T::Text}}, authorizeDevice},
         {"deactivateDevice", {}, deactivateDevice},
         {"checkAuthToken", {{"AuthToken", T::Text}}, checkAuthToken, true},
@@ -248,7 +264,7 @@ const Operations& AccountOperations()
 {
     static const Operations operations = {
         {"checkForPurchasedTitle", {{"TitleID", ChildType::Int}}, checkForPurchasedTitle, true},
-        {"getMyVideos", MyVideosChildren(), getMyVideos},
+        {"getMyVideos", MyVideosChildren(), getMyVideos, false, kRefusedVideos},
     };
     return operations;
 }

@@ -10,7 +10,7 @@ void WriteTitles(Call& call, const std::string& where, const Database::Values& v
 {
     const int page = call.Int("CurrentPageNumber");
     const int perPage = std::min(call.Int("ItemsPerPage"), kMostPerPage);
-    if (page < 1 || perPage < 1) return call.Standard(2, "pages start at 1 and hold an item");
+    if (page < 1 || perPage < 1 || page > kHighestPage) return call.Refuse(2, "pages start at 1 and hold an item");
     std::string sql = " FROM title WHERE " + where;
     const int type = call.Int("PurchaseType");
     if (type != 2) sql += " AND id IN (SELECT title FROM product WHERE type = " + std::to_string(type) + ")";
@@ -31,7 +31,7 @@ void WriteTitles(Call& call, const std::string& where, const Database::Values& v
 void WriteGenreTitles(Call& call, int genre)
 {
     if (call.database.Int("SELECT COUNT(*) FROM genre WHERE id = ?", {genre}) == 0) {
-        return call.Standard(1, "no such genre");
+        return call.Refuse(1, "no such genre");
     }
     WriteTitles(call, "id IN (SELECT title FROM title_genre WHERE genre = ?)", {genre}, genre);
 }
@@ -52,7 +52,7 @@ void getNavigation(Call& call)
 void getGenreLabel(Call& call)
 {
     const std::string label = call.database.Text("SELECT label FROM genre WHERE id = ?", {call.Int("GenreID")});
-    if (label.empty()) return call.Standard(1, "no such genre");
+    if (label.empty()) return call.Refuse(1, "no such genre");
     call.Standard();
     call.xml.Element("Label", label).Element("LabelMessage", "All of " + label);
 }
@@ -73,7 +73,7 @@ void Search(Call& call, const char* columns)
 {
     static const char* const kByType[] = {"", " AND is_tv = 1", " AND is_tv = 0 AND season = 0"};
     const std::string where =
-        std::string("instr(lower(") + columns + "), lower(?)) > 0" + kByType[call.Int("TitleType")];
+        std::string("instr(fold(") + columns + "), fold(?)) > 0" + kByType[call.Int("TitleType")];
     WriteTitles(call, where, {call.Text("Query")}, 0);
 }
 
@@ -102,7 +102,7 @@ void getTvEpisodeListByTitleID(Call& call)
 {
     const int season = call.Int("TitleID");
     if (call.database.Int("SELECT is_tv FROM title WHERE id = ?", {season}) == 0)
-        return call.Standard(1, "no such series");
+        return call.Refuse(1, "no such series");
     call.Standard();
     call.xml.Group("Episodes", [&] {
         call.database.Each("SELECT id, name, episode FROM title WHERE season = ? ORDER BY episode", {season},
@@ -126,7 +126,7 @@ void getAllTvEpisodeListings(Call& call)
 void translateSkuId(Call& call)
 {
     const int title = call.database.Int("SELECT title FROM product WHERE sku = ?", {call.Int("SkuId")});
-    if (title == 0) return call.Standard(1, "no such product");
+    if (title == 0) return call.Refuse(1, "no such product");
     call.Standard();
     call.xml.Element("TitleId", title);
 }
@@ -135,7 +135,7 @@ void translateTivoExternalId(Call& call)
 {
     const std::string external = call.Text("TivoExternalId");
     const int title = call.database.Int("SELECT id FROM title WHERE external = ?", {external});
-    if (title == 0) return call.Standard(1, "no such title");
+    if (title == 0) return call.Refuse(1, "no such title");
     call.Standard();
     call.xml.Element("TivoExternalId", external).Element("TitleId", title);
 }
@@ -144,7 +144,7 @@ void getRecommendedTitles(Call& call)
 {
     const int title = call.Int("TitleId");
     if (call.database.Int("SELECT COUNT(*) FROM title WHERE id = ?", {title}) == 0)
-        return call.Standard(1, "no such title");
+        return call.Refuse(1, "no such title");
     call.Standard();
     call.xml.Group("Titles", [&] {
         int position = 0;
@@ -191,20 +191,29 @@ const Operations& BrowseOperations()
         {"shouldUpdateCache", {{"UTCTime", T::Text}}, shouldUpdateCache, true},
         {"getRecommendedTitles", {{"TitleId", T::Int}}, getRecommendedTitles},
         {"getLastCacheLoadTimeUTC", {}, getLastCacheLoadTimeUTC, true},
-        {"translateSkuId", {{"SkuId", T::Int}}, translateSkuId},
-        {"translateTivoExternalId", {{"TivoExternalId", T::Text}}, translateTivoExternalId},
+        {"translateSkuId", {{"SkuId", T::Int}}, translateSkuId, false, "|<TitleId>0</TitleId>"},
+        {"translateTivoExternalId",
+         {{"TivoExternalId", T::Text}},
+         translateTivoExternalId,
+         false,
+         "|<TitleId>0</TitleId>"},
         {"getAllTvEpisodeListings", {{"TitleID", T::Int}}, getAllTvEpisodeListings, true},
-        {"getTvEpisodeListing", {{"EpisodeID", T::Int}}, getTvEpisodeListing},
+        {"getTvEpisodeListing", {{"EpisodeID", T::Int}}, getTvEpisodeListing, false, kRefusedTitle},
         {"getTvEpisodeListByTitleID", {{"TitleID", T::Int}}, getTvEpisodeListByTitleID},
-        {"getTitleListing", {{"TitleID", T::Int}}, getTitleListing},
+        {"getTitleListing", {{"TitleID", T::Int}}, getTitleListing, false, kRefusedTitle},
         {"getTitlesByGenreArray",
          {{"GenreIDs", T::IntArray}, paging[1], paging[0], paging[2]},
          getTitlesByGenreArray,
-         true},
-        {"getTitlesByNavigation", {{"GenreID", T::Int}, paging[1], paging[0], paging[2]}, getTitlesByNavigation},
+         true,
+         kRefusedPage},
+        {"getTitlesByNavigation",
+         {{"GenreID", T::Int}, paging[1], paging[0], paging[2]},
+         getTitlesByNavigation,
+         false,
+         kRefusedPage},
         {"getGenreLabel", {{"GenreID", T::Int}}, getGenreLabel},
-        {"searchForTitleDetail", search, searchForTitleDetail},
-        {"searchForTitle", search, searchForTitle},
+        {"searchForTitleDetail", search, searchForTitleDetail, false, kRefusedPage},
+        {"searchForTitle", search, searchForTitle, false, kRefusedPage},
         {"getNavigation", {}, getNavigation, true},
     };
     return operations;

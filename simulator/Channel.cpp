@@ -1,6 +1,7 @@
 #include "Channel.h"
 
 #include <openssl/err.h>
+#include <poll.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
@@ -53,6 +54,19 @@ bool Channel::Write(const std::string& bytes)
     return true;
 }
 
+void Channel::Stall()
+{
+    // Ends with the peer's close, and with the shutdown that the simulator's end brings.
+    pollfd entry = {m_Descriptor, POLLRDHUP, 0};
+    while (poll(&entry, 1, -1) < 0 && errno == EINTR) {
+    }
+}
+
+bool Channel::WriteBare(const std::string& bytes)
+{
+    return send(m_Descriptor, bytes.data(), bytes.size(), MSG_NOSIGNAL) == static_cast<ssize_t>(bytes.size());
+}
+
 void Channel::Close()
 {
     if (m_Tls) SSL_shutdown(m_Tls.get());
@@ -65,6 +79,4 @@ void Channel::Reset()
     const linger now = {1, 0};
     setsockopt(m_Descriptor, SOL_SOCKET, SO_LINGER, &now, sizeof now);
     m_Tls.reset();
-    close(m_Descriptor);
-    m_Descriptor = -1;
 }

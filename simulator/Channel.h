@@ -23,11 +23,15 @@ public:
     size_t Read(char* buffer, size_t size);
     /// False when the peer is gone.
     bool Write(const std::string& bytes);
+    /// Past TLS; for a few bytes.
+    bool WriteBare(const std::string& bytes);
 
     /// Ends the connection in order, with TLS's own goodbye.
     void Close();
-    /// Ends it by a reset, which the peer sees as a broken connection.
+    /// Makes the end, which comes with the destructor, a reset: the peer sees a broken connection.
     void Reset();
+    /// Says nothing until the peer has closed.
+    void Stall();
 
     int Descriptor() const { return m_Descriptor; }
 

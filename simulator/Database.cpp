@@ -1,5 +1,34 @@
 #include "Database.h"
 
+namespace {
+
+// Small letters for capital ones in ASCII, Latin-1, Greek and Cyrillic; SQLite's own lower() knows ASCII alone.
+std::string Fold(const unsigned char* text, int size)
+{
+    std::string folded(reinterpret_cast<const char*>(text), static_cast<size_t>(size));
+    for (size_t i = 0; i < folded.size(); ++i) {
+        const unsigned char lead = text[i];
+        if (lead >= 'A' && lead <= 'Z') folded[i] = static_cast<char>(lead + 0x20);
+        if (lead < 0xC3 || lead > 0xD0 || i + 1 == folded.size()) continue;
+        unsigned int code = (lead & 0x1Fu) << 6 | (text[i + 1] & 0x3Fu);
+        const bool capital = (code >= 0xC0 && code <= 0xDE && code != 0xD7) || (code >= 0x391 && code <= 0x3A9) ||
+                             (code >= 0x410 && code <= 0x42F);
+        if (capital) code += 0x20;
+        folded[i] = static_cast<char>(0xC0 | code >> 6);
+        folded[++i] = static_cast<char>(0x80 | (code & 0x3F));
+    }
+    return folded;
+}
+
+void FoldFunction(sqlite3_context* context, int, sqlite3_value** values)
+{
+    const unsigned char* text = sqlite3_value_text(values[0]);
+    const std::string folded = text ? Fold(text, sqlite3_value_bytes(values[0])) : std::string();
+    sqlite3_result_text(context, folded.data(), static_cast<int>(folded.size()), SQLITE_TRANSIENT);
+}
+
+}  // namespace
+
 std::string Database::Row::Text(int column) const
 {
     const auto* text = reinterpret_cast<const char*>(sqlite3_column_text(m_Statement, column));
@@ -14,6 +43,8 @@ std::unique_ptr<Database> Database::Open(const std::string& file, std::string& e
     database->m_Database.reset(opened);
     if (result == SQLITE_OK) {
         sqlite3_busy_timeout(opened, 5000);
+        sqlite3_create_function(opened, "fold", 1, SQLITE_UTF8 | SQLITE_DETERMINISTIC, nullptr, FoldFunction, nullptr,
+                                nullptr);
         if (database->Run("PRAGMA synchronous = OFF") >= 0 && database->Run("PRAGMA user_version = 1") >= 0) {
             return database;
         }

@@ -5,48 +5,118 @@
 #include <sstream>
 #include <vector>
 
+#include "Service.h"
+
 namespace {
 
+// Where a kind makes sense.
+enum Place : unsigned { kSoap = 1, kPlain = 2, kBoxArt = 4, kConnect = 8 };
+constexpr unsigned kAnswers = kSoap | kPlain | kBoxArt;
+
 const struct {
-    const char* kind;
+    const char* kind;  // ":N" behind it takes a number, ":TEXT" any text
+    unsigned places;
     const char* help;
 } kKinds[] = {
-    {"ok", "no fault: the request passes (to let some requests through first)"},
-    {"code:N", "the service refuses with response code N"},
-    {"fault11", "a SOAP 1.1 fault"},
-    {"fault12", "a SOAP 1.2 fault"},
-    {"soap12", "the right answer in a SOAP 1.2 envelope"},
-    {"http:N", "HTTP status N (302 with a Location)"},
-    {"cut", "the connection is closed before the answer"},
-    {"cut-header", "closed in the middle of the HTTP header"},
-    {"cut-body", "closed in the middle of the body"},
-    {"reset", "the connection is reset"},
-    {"stall", "no answer, as long as the client waits"},
-    {"stall-body", "half of the body, and then nothing"},
-    {"drip:N", "the answer in single bytes, N milliseconds (100) apart"},
-    {"split:N", "header and body in two writes, N milliseconds (50) apart"},
-    {"garbage", "200, and a body that is no XML"},
-    {"short", "less body than its length announces"},
-    {"long", "bytes left over behind the announced length"},
-    {"no-length", "no Content-Length"},
-    {"zero-length", "Content-Length 0"},
-    {"empty", "200 with an empty body"},
-    {"endless", "a body that never ends"},
-    {"bomb", "a compressed body of N MiB (256) of blanks"},
-    {"damaged-gzip", "a compressed body with wrong bytes in it"},
-    {"missing-result", "an answer without its result element"},
-    {"must-understand", "an unknown header block that must be understood"},
-    {"extra-header", "an unknown header block that need not be"},
-    {"unknown-enum", "an enumeration text that no contract knows (in answers that hold one)"},
-    {"not-modified", "304, for box art"},
-    {"modified", "box art that is newer than the client's"},
-    {"body:TEXT", "another body, for the clock"},
-    {"close", "list \"connect\" only: closed before the TLS handshake"},
+    {"ok", kAnswers | kConnect, "no fault: the request passes (to let some requests through first)"},
+    {"code:N", kSoap, "the service refuses with response code N (answers that have one)"},
+    {"fault11", kSoap, "a SOAP 1.1 fault"},
+    {"fault12", kSoap, "a SOAP 1.2 fault"},
+    {"soap12", kSoap, "the right answer in a SOAP 1.2 envelope"},
+    {"http:N", kAnswers, "HTTP status N (302 with a Location)"},
+    {"cut", kAnswers, "the connection is closed before the answer"},
+    {"cut-header", kAnswers, "closed in the middle of the HTTP header"},
+    {"cut-body", kAnswers, "closed in the middle of the body"},
+    {"reset", kAnswers | kConnect, "the connection is reset"},
+    {"stall", kAnswers | kConnect, "no answer (connect: no handshake), as long as the client waits"},
+    {"stall-body", kAnswers, "half of the body, and then nothing"},
+    {"stall-handshake", kConnect, "the beginning of a handshake record, and then nothing"},
+    {"drip:N", kAnswers, "the answer in single bytes, N milliseconds (100) apart"},
+    {"split:N", kAnswers, "header and body in two writes, N milliseconds (50) apart"},
+    {"garbage", kAnswers, "200, and a body that is no XML"},
+    {"no-http", kAnswers | kConnect, "bytes that are no HTTP (connect: no TLS)"},
+    {"short", kAnswers, "less body than its length announces"},
+    {"long", kAnswers, "bytes left over behind the announced length"},
+    {"no-length", kAnswers, "no Content-Length"},
+    {"zero-length", kAnswers, "Content-Length 0"},
+    {"empty", kAnswers, "200 with an empty body"},
+    {"endless", kAnswers, "a body that never ends"},
+    {"bomb:N", kAnswers, "a compressed body of N MiB (256) of blanks"},
+    {"damaged-gzip", kAnswers, "a compressed body with wrong bytes in it"},
+    {"wrong-checksum", kAnswers, "a compressed body whose checksum is wrong"},
+    {"missing-result", kSoap, "an answer without its result element"},
+    {"must-understand", kSoap, "an unknown header block that must be understood"},
+    {"extra-header", kSoap, "an unknown header block that need not be"},
+    {"unknown-enum", kSoap, "an enumeration text that no contract knows (in answers that hold one)"},
+    {"not-modified", kBoxArt, "304"},
+    {"modified", kBoxArt, "box art that is newer than the client's"},
+    {"body:TEXT", kPlain, "another body"},
+    {"close", kConnect, "closed before the TLS handshake"},
 };
 
 std::string Name(const std::string& kind)
 {
     return kind.substr(0, kind.find(':'));
+}
+
+// Where the faults of a list go; 0 when there is no such list.
+unsigned PlacesOf(const std::string& operation)
+{
+    if (operation == "any") return kAnswers;
+    if (operation == "connect") return kConnect;
+    if (operation == "boxart") return kBoxArt;
+    if (operation == "discovery" || operation == "clock" || operation == "bandwidth") return kPlain;
+    for (const ServiceRow& service : Services()) {
+        if (FindOperation(service, operation)) return kSoap;
+    }
+    return 0;
+}
+
+bool IsBare(const std::string& operation)
+{
+    for (const ServiceRow& service : Services()) {
+        const OperationRow* row = FindOperation(service, operation);
+        if (row) return row->bare;
+    }
+    return false;
+}
+
+// A decimal number of at most an hour's milliseconds.
+bool ReadNumber(const std::string& text, int least, int& number)
+{
+    constexpr int kMost = 3600000;
+    if (text.empty() || text.size() > 7 || text.find_first_not_of("0123456789") != std::string::npos) return false;
+    number = atoi(text.c_str());
+    return number >= least && number <= kMost;
+}
+
+std::string ReadKind(const std::string& operation, unsigned places, const std::string& text, Fault& fault)
+{
+    fault.kind = Name(text);
+    if (fault.kind.size() < text.size()) fault.value = text.substr(fault.kind.size() + 1);
+    const auto* row = std::find_if(std::begin(kKinds), std::end(kKinds),
+                                   [&](const auto& known) { return Name(known.kind) == fault.kind; });
+    if (row == std::end(kKinds)) return "\"" + text + "\" is no kind of fault; --help lists them";
+    if ((row->places & places) == 0) return fault.kind + " cannot happen to " + operation;
+    const std::string shape = row->kind;
+    int number = 0;
+    if (shape == fault.kind && !fault.value.empty()) return fault.kind + " takes no value";
+    if (shape.back() == 'N' && !fault.value.empty() && !ReadNumber(fault.value, 0, number)) {
+        return "\"" + fault.value + "\" is no number";
+    }
+    if (fault.kind == "http" && !fault.value.empty() && (number < 200 || number > 599)) {
+        return "an HTTP status goes from 200 to 599";
+    }
+    if (fault.kind == "code" && IsBare(operation)) return "the answer of " + operation + " has no response code";
+    return "";
+}
+
+// One of "after", "delay=MS", "count=N".
+bool ReadCondition(const std::string& text, Fault& fault)
+{
+    if (text == "after") return fault.afterEffect = true;
+    if (text.rfind("delay=", 0) == 0) return ReadNumber(text.substr(6), 0, fault.delay);
+    return text.rfind("count=", 0) == 0 && ReadNumber(text.substr(6), 1, fault.count);
 }
 
 }  // namespace
@@ -59,35 +129,29 @@ int Fault::Number(int standard) const
 bool Faults::Add(const std::string& text, std::string& error)
 {
     const size_t equals = text.find('=');
-    error = "\"" + text + "\" is no fault: OPERATION=KIND[:VALUE][,delay=MS][,count=N][,after] expected";
-    if (equals == std::string::npos || equals == 0) return false;
+    const std::string operation = text.substr(0, equals);
+    const unsigned places = PlacesOf(operation);
     std::vector<std::string> parts;
-    std::istringstream rest(text.substr(equals + 1));
+    std::istringstream rest(equals == std::string::npos ? std::string() : text.substr(equals + 1));
     for (std::string part; std::getline(rest, part, ',');)
         parts.push_back(part);
+    error = "\"" + text + "\" is no fault: OPERATION=KIND[:VALUE][,delay=MS][,count=N][,after] expected";
     if (parts.empty()) return false;
+    if (places == 0) {
+        error = "\"" + text + "\": there is no operation " + operation + "; --help names what is none of a service's";
+        return false;
+    }
     Fault fault;
-    fault.kind = Name(parts[0]);
-    if (fault.kind.size() < parts[0].size()) fault.value = parts[0].substr(fault.kind.size() + 1);
-    const bool known = std::any_of(std::begin(kKinds), std::end(kKinds),
-                                   [&](const auto& row) { return Name(row.kind) == fault.kind; });
-    if (!known) {
-        error = "\"" + parts[0] + "\" is no kind of fault; --help lists them";
+    const std::string wrong = ReadKind(operation, places, parts[0], fault);
+    if (!wrong.empty()) {
+        error = "\"" + text + "\": " + wrong;
         return false;
     }
     for (size_t i = 1; i < parts.size(); ++i) {
-        if (parts[i] == "after") {
-            fault.afterEffect = true;
-        } else if (parts[i].rfind("delay=", 0) == 0) {
-            fault.delay = atoi(parts[i].c_str() + 6);
-        } else if (parts[i].rfind("count=", 0) == 0) {
-            fault.count = atoi(parts[i].c_str() + 6);
-        } else {
-            return false;
-        }
+        if (!ReadCondition(parts[i], fault)) return false;
     }
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    m_Lists[text.substr(0, equals)].push_back(fault);
+    m_Lists[operation].push_back(fault);
     return true;
 }
 
@@ -110,6 +174,17 @@ void Faults::Clear()
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
     m_Lists.clear();
+}
+
+std::string Faults::Pending() const
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    std::string lines;
+    for (const auto& [operation, list] : m_Lists) {
+        for (const Fault& fault : list)
+            lines += operation + "=" + fault.Text() + ",count=" + std::to_string(fault.count) + "\n";
+    }
+    return lines;
 }
 
 std::string Faults::Help()

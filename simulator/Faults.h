@@ -26,10 +26,12 @@ public:
     /// one.
     Fault Take(const std::string& operation);
     void Clear();
+    /// What still waits, a list entry a line.
+    std::string Pending() const;
 
     static std::string Help();
 
 private:
-    std::mutex m_Mutex;
+    mutable std::mutex m_Mutex;
     std::map<std::string, std::deque<Fault>> m_Lists;
 };

@@ -6,6 +6,7 @@
 
 namespace {
 
+const char kBoxArt[] = "/images/boxart/";
 constexpr size_t kBandwidthFile = 1000000;
 const char kLastModified[] = "Mon, 02 Nov 2026 06:00:00 GMT";
 const char kLaterModified[] = "Tue, 03 Nov 2026 06:00:00 GMT";
@@ -32,14 +33,28 @@ HttpResponse NotFound()
     return response;
 }
 
-// "/images/boxart/SIZE/PREFIXSIZE.jpg".
+// "/images/boxart/FOLDER/PREFIXSIZE.jpg"; the folder and the size in the name belong together. Null when they are none
+// of the store's.
+const char* SizeOf(const std::string& folder)
+{
+    static const char* const kSizes[] = {"95",  "175", "65",  "77",  "102", "126",
+                                         "137", "153", "177", "203", "269", "321"};
+    if (folder == "135s") return "135";
+    for (const char* size : kSizes) {
+        if (folder == size) return size;
+    }
+    return nullptr;
+}
+
 HttpResponse BoxArt(const HttpRequest& request, const Fault& fault, LoggedRequest& log)
 {
     const std::string path = UrlDecode(request.Path());
-    const size_t folder = path.find('/', 15);
-    const std::string size = folder == std::string::npos ? "" : path.substr(15, folder - 15);
-    std::string name = folder == std::string::npos ? "" : path.substr(folder + 1);
-    const std::string end = std::to_string(atoi(size.c_str())) + ".jpg";
+    const size_t start = sizeof kBoxArt - 1;
+    const size_t slash = path.find('/', start);
+    const char* size = slash == std::string::npos ? nullptr : SizeOf(path.substr(start, slash - start));
+    if (!size) return NotFound();
+    const std::string end = std::string(size) + ".jpg";
+    std::string name = path.substr(slash + 1);
     if (name.size() <= end.size() || name.compare(name.size() - end.size(), end.size(), end) != 0) return NotFound();
     name.resize(name.size() - end.size());
     log.operation = name;
@@ -53,7 +68,7 @@ HttpResponse BoxArt(const HttpRequest& request, const Fault& fault, LoggedReques
     // Prefixes of the catalogue: "ZV" and digits.
     if (name.compare(0, 2, "ZV") != 0) return NotFound();
     response.contentType = "image/jpeg";
-    response.body = MakeBoxArt(name, atoi(size.c_str()));
+    response.body = MakeBoxArt(name, atoi(size));
     return response;
 }
 
@@ -74,7 +89,7 @@ std::string PlainServiceName(const std::string& path)
     if (path == "/device/env/") return "discovery";
     if (path == "/device/time/") return "clock";
     if (path == "/bandwidth/test.bin") return "bandwidth";
-    if (path.rfind("/images/boxart/", 0) == 0) return "boxart";
+    if (path.rfind(kBoxArt, 0) == 0) return "boxart";
     return "";
 }
 
@@ -87,7 +102,7 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
     if (service == "boxart") return BoxArt(request, fault, log);
     HttpResponse response;
     if (service == "clock") {
-        response.body = fault.Is("body") ? fault.value : Clock();
+        response.body = Clock();
     } else {
         response.contentType = "application/octet-stream";
         response.body.assign(kBandwidthFile, 'b');
@@ -106,6 +121,8 @@ HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLo
             response.status = 400;
             response.body += error + "\n";
         }
+    } else if (what == "GET /control/faults") {
+        response.body = faults.Pending();
     } else if (what == "DELETE /control/faults") {
         faults.Clear();
     } else if (what == "GET /control/log") {

@@ -3,8 +3,8 @@
 
 #include "TitleXml.h"
 
-/// Writes a page of the rows of `from`: standard response, titles, and where the page stands.
-void WritePurchaseList(Call& call, const std::string& from, const std::string& titleColumn,
+/// Writes a page of the rows of `from`: standard response, titles, and where the page stands. False after a refusal.
+bool WritePurchaseList(Call& call, const std::string& from, const std::string& titleColumn,
                        const std::string& passColumn, const std::string& order);
 
 /// The account's purchases, narrowed by the request's three filters.

@@ -18,6 +18,8 @@ const char kUtility[] = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss
 const char kService[] = "http://api.zorvane.example/api/";
 const char kDigestType[] =
     "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-username-token-profile-1.0#PasswordDigest";
+const char kNonceType[] =
+    "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-soap-message-security-1.0#Base64Binary";
 constexpr int kFreshSeconds = 300;
 
 const char* Text(const xmlChar* text)
@@ -55,6 +57,15 @@ public:
         if (!m_Node) return "";
         const std::unique_ptr<xmlChar, void (*)(void*)> content(xmlNodeGetContent(m_Node), xmlFree);
         return content ? Text(content.get()) : "";
+    }
+    // Text of its own beside its elements.
+    bool HasText() const
+    {
+        for (xmlNodePtr child = m_Node ? m_Node->children : nullptr; child; child = child->next) {
+            if (child->type != XML_ELEMENT_NODE && child->type != XML_COMMENT_NODE && !xmlIsBlankNode(child))
+                return true;
+        }
+        return false;
     }
     std::string Attribute(const char* name, const char* space) const
     {
@@ -182,6 +193,7 @@ std::string CheckValue(const Child& wanted, const Node& child, Arguments& argume
 
 std::string CheckChildren(const Node& body, const OperationRow& operation, Arguments& arguments)
 {
+    if (body.HasText()) return body.Name() + " holds text beside its children";
     const std::vector<Node> children = body.Children();
     size_t at = 0;
     for (const Child& wanted : operation.children) {
@@ -202,14 +214,45 @@ bool IsSecret(const std::string& name)
     return name == "password" || name == "PIN" || name == "Pin" || name == "AuthToken" || name == "GiftCertificateCode";
 }
 
-const OperationRow* FindOperation(const ServiceRow& service, const std::string& name)
+// What the log tells of a header, right or wrong.
+void NoteHeader(const Node& header, LoggedRequest& log)
 {
-    for (const Operations* rows : service.operations) {
-        for (const OperationRow& row : *rows) {
-            if (name == row.name) return &row;
+    for (const Node& block : header.Children()) {
+        if (block.Is(kSecurity, "Security")) {
+            const Node token = block.Child(kSecurity, "UsernameToken");
+            log.soap.emplace_back("user", token.Child(kSecurity, "Username").Content());
+        } else if (block.Is(kAddressing, "MessageID")) {
+            log.soap.emplace_back("messageID", block.Content());
+        } else if (block.Is(kAddressing, "To")) {
+            log.soap.emplace_back("to", block.Content());
+        } else if (block.Namespace() == kService) {
+            log.soap.emplace_back("settings", block.Name());
+            for (const Node& child : block.Children()) {
+                const bool token = child.Name() == "AuthToken" && !child.Content().empty();
+                log.soap.emplace_back(child.Name(), token ? "***" : child.Content());
+            }
         }
     }
-    return nullptr;
+}
+
+std::string CheckToken(const Node& security)
+{
+    static const std::pair<const char*, const char*> kOrder[] = {
+        {kSecurity, "Username"}, {kSecurity, "Password"}, {kSecurity, "Nonce"}, {kUtility, "Created"}};
+    const Node token = security.Child(kSecurity, "UsernameToken");
+    const std::vector<Node> children = token.Children();
+    if (security.Children().size() != 1 || children.size() != 4) return "no complete user-name token";
+    for (size_t i = 0; i < 4; ++i) {
+        if (!children[i].Is(kOrder[i].first, kOrder[i].second)) {
+            return std::string("the token has no ") + kOrder[i].second + " in its place";
+        }
+    }
+    if (token.Attribute("Id", kUtility) != "User") return "wsu:Id of the token is not User";
+    if (children[1].Attribute("Type", nullptr) != kDigestType) return "the password is no digest";
+    if (children[2].Attribute("EncodingType", nullptr) != kNonceType) return "the nonce is no Base64Binary";
+    if (Unbase64(children[2].Content()).empty()) return "the nonce is no base64 text";
+    if (!IsFresh(children[3].Content())) return "the token is not fresh";
+    return "";
 }
 
 std::string CheckHttp(const HttpRequest& request)
@@ -237,6 +280,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
                       XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING),
         xmlFreeDoc);
     const Node envelope(document ? xmlDocGetRootElement(document.get()) : nullptr);
+    NoteHeader(envelope.Child(kEnvelope, "Header"), log);
     const std::vector<Node> bodies = envelope.Child(kEnvelope, "Body").Children();
     const Node body = bodies.empty() ? Node() : bodies[0];
     log.operation = body.Name();
@@ -247,6 +291,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     std::string wrong = CheckHttp(request);
     if (!wrong.empty()) return wrong;
     if (!document) return "the body is no XML";
+    if (document->intSubset) return "the body has a document type declaration";
     if (!envelope.Is(kEnvelope, "Envelope")) return "the body is no SOAP 1.1 envelope";
     if (bodies.size() != 1 || body.Namespace() != kService)
         return "the SOAP body holds no single element of the service";
@@ -270,14 +315,12 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     if (blocks[3].Content() != endpoint) return "wsa:To is not " + endpoint;
     if (blocks[4].Content() != action) return "wsa:Action is not " + action;
 
+    wrong = CheckToken(blocks[0]);
+    if (!wrong.empty()) return wrong;
     const Node token = blocks[0].Child(kSecurity, "UsernameToken");
     const Node password = token.Child(kSecurity, "Password");
     const std::string nonce = Unbase64(token.Child(kSecurity, "Nonce").Content());
     const std::string created = token.Child(kUtility, "Created").Content();
-    if (!token || !password || nonce.empty()) return "no complete user-name token";
-    if (token.Attribute("Id", kUtility) != "User") return "wsu:Id of the token is not User";
-    if (password.Attribute("Type", nullptr) != kDigestType) return "the password is no digest";
-    if (!IsFresh(created)) return "the token is not fresh";
     const std::string secret =
         m_Database.Text("SELECT password FROM account WHERE user = ?", {token.Child(kSecurity, "Username").Content()});
     if (secret.empty() || password.Content() != Sha1(nonce + created + secret)) return "authentication failed";

@@ -38,8 +38,9 @@ std::string Line(const LoggedRequest& request)
              request.connection, request.tls ? "true" : "false", request.resumed ? "true" : "false", request.time);
     return "{\"number\": " + std::to_string(request.number) + ", \"service\": " + Quoted(request.service) +
            ", \"operation\": " + Quoted(request.operation) + ", " + numbers +
-           ", \"headers\": " + Pairs(request.headers) + ", \"children\": " + Pairs(request.children) +
-           ", \"fault\": " + Quoted(request.fault) + ", \"violation\": " + Quoted(request.violation) + "}\n";
+           ", \"headers\": " + Pairs(request.headers) + ", \"soap\": " + Pairs(request.soap) +
+           ", \"children\": " + Pairs(request.children) + ", \"fault\": " + Quoted(request.fault) +
+           ", \"violation\": " + Quoted(request.violation) + "}\n";
 }
 
 }  // namespace

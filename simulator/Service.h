@@ -45,6 +45,7 @@ struct Call {
     Database& database;
     const Arguments& arguments;
     XmlWriter& xml;
+    const char* refusal;  ///< The operation's.
     std::string address;  ///< "host:port" of the plain HTTP side, for addresses in answers.
 
     int Int(const char* name) const { return arguments.Int(name); }
@@ -54,13 +55,37 @@ struct Call {
     {
         xml.Element("ResponseCode", code).Optional("ResponseMessage", message);
     }
+    /// The whole of a result that says no.
+    void Refuse(int code, const std::string& message) const;
 };
+
+inline constexpr char kRefusedPage[] =
+    "|<GenreID>0</GenreID><CurrentPageNumber>0</CurrentPageNumber><ItemsPerPage>0</ItemsPerPage><TotalPages>0</"
+    "TotalPages>"
+    "<TotalItems>0</TotalItems>";
+inline constexpr char kRefusedVideos[] =
+    "|<CurrentPageNumber>0</CurrentPageNumber><ItemsPerPage>0</ItemsPerPage><TotalPages>0</TotalPages>"
+    "<TotalItems>0</TotalItems>";
+inline constexpr char kRefusedWishes[] =
+    "|<CurrentPageNumber>0</CurrentPageNumber><ItemsPerPage>0</ItemsPerPage><TotalPages>0</TotalPages>"
+    "<TotalItems>0</TotalItems><SortOrder>0</SortOrder>";
+inline constexpr char kRefusedTitle[] =
+    "<TitleID>0</TitleID><TitlePosition>0</TitlePosition><EpisodeNumber>0</EpisodeNumber><IsTvListing>false</"
+    "IsTvListing>"
+    "<IsTHXMediaDirectorEnabled>false</IsTHXMediaDirectorEnabled><IsTHXMediaDirectorEnabledForTrailer>false"
+    "</IsTHXMediaDirectorEnabledForTrailer>|<UserRating>0</UserRating><IsAvailInUserWishList>false</"
+    "IsAvailInUserWishList>";
+inline constexpr char kRefusedLocation[] =
+    "|<AssetID>0</AssetID><Status>stopped</Status><StartTimeSeconds>0</StartTimeSeconds>"
+    "<HeartbeatPollInSeconds>0</HeartbeatPollInSeconds>";
 
 struct OperationRow {
     const char* name;
     std::vector<Child> children;
     void (*handle)(Call& call);
     bool bare = false;  ///< The result is no record: it has no response code.
+    /// What a refusal says beside code and message, which stand at the "|": the children that are never left out.
+    const char* refusal = "|";
 };
 using Operations = std::vector<OperationRow>;
 
@@ -77,3 +102,6 @@ struct ServiceRow {
     std::vector<const Operations*> operations;
 };
 const std::vector<ServiceRow>& Services();
+
+/// The row of the service's operation, or null.
+const OperationRow* FindOperation(const ServiceRow& service, const std::string& name);

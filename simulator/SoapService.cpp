@@ -67,6 +67,25 @@ const std::vector<ServiceRow>& Services()
     return services;
 }
 
+void Call::Refuse(int code, const std::string& message) const
+{
+    const std::string text = refusal;
+    const size_t bar = text.find('|');
+    xml.Raw(text.substr(0, bar));
+    Standard(code, message);
+    xml.Raw(text.substr(bar + 1));
+}
+
+const OperationRow* FindOperation(const ServiceRow& service, const std::string& name)
+{
+    for (const Operations* rows : service.operations) {
+        for (const OperationRow& row : *rows) {
+            if (name == row.name) return &row;
+        }
+    }
+    return nullptr;
+}
+
 const ServiceRow* SoapService::Find(const std::string& path)
 {
     for (const ServiceRow& service : Services()) {
@@ -80,7 +99,7 @@ const ServiceRow* SoapService::Find(const std::string& path)
 std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& fault)
 {
     XmlWriter xml;
-    Call call{m_Database, checked.arguments, xml, m_PlainAddress};
+    Call call{m_Database, checked.arguments, xml, checked.operation->refusal, m_PlainAddress};
     const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
     if (ClaimsFailure(fault)) {
         m_Database.Run("SAVEPOINT request");
@@ -90,10 +109,10 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
     } else {
         checked.operation->handle(call);
     }
-    if (!fault.Is("code")) return xml.Text();
+    if (!fault.Is("code") || checked.operation->bare) return xml.Text();
     XmlWriter refusal;
-    Call refused{m_Database, checked.arguments, refusal, m_PlainAddress};
-    refused.Standard(fault.Number(1), "refused as asked");
+    Call refused{m_Database, checked.arguments, refusal, checked.operation->refusal, m_PlainAddress};
+    refused.Refuse(fault.Number(1), "refused as asked");
     return refusal.Text();
 }
 

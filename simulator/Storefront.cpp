@@ -81,11 +81,21 @@ private:
         bool tls;
     };
 
+    struct Worker {
+        std::thread thread;
+        bool done = false;
+    };
+
     bool OpenFolder(std::string& error);
     bool OpenPorts(std::string& error);
     bool WriteFiles(std::string& error);
     void Accept(int listener, bool tls);
+    void Reap();
     void Serve(int descriptor, bool tls, unsigned long number);
+    bool Handshake(Connection& connection);
+    void NoteMalformed(const Connection& connection);
+    void NoteConnection(const Connection& connection, const std::string& fault);
+    double Now() const { return std::chrono::duration<double>(Clock::now() - m_Start).count(); }
     void ServeRequests(Connection& connection);
     bool ServeOne(Connection& connection, const HttpRequest& request);
     HttpResponse Answer(const HttpRequest& request, Connection& connection, LoggedRequest& log, Fault& fault);
@@ -95,7 +105,6 @@ private:
     bool SendDrip(Channel& channel, const std::string& bytes, int pause);
     // False when the simulator ends meanwhile.
     bool Pause(int milliseconds);
-    void PauseForGood();
 
     const StorefrontOptions m_Options;
     std::string m_Folder;
@@ -118,7 +127,8 @@ private:
     bool m_Ended = false;
     SSL_CTX* m_Tls = nullptr;
     std::set<int> m_Open;  // descriptors of the connections being served
-    std::list<std::thread> m_Threads;
+    std::list<std::thread> m_Acceptors;
+    std::list<Worker> m_Workers;
     unsigned long m_Connections = 0;
 };
 
@@ -134,9 +144,11 @@ Simulator::~Simulator()
     for (const int listener : {m_HttpsListener, m_HttpListener}) {
         if (listener >= 0) shutdown(listener, SHUT_RDWR);
     }
-    // Acceptors come first in the list; once they are joined no thread is added.
-    for (std::thread& thread : m_Threads)
+    for (std::thread& thread : m_Acceptors)
         thread.join();
+    // No worker is added from here on.
+    for (Worker& worker : m_Workers)
+        worker.thread.join();
     for (const int listener : {m_HttpsListener, m_HttpListener}) {
         if (listener >= 0) close(listener);
     }
@@ -224,8 +236,8 @@ bool Simulator::Begin(std::string& error)
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.oldTls);
     if (!WriteFiles(error)) return false;
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    m_Threads.emplace_back([this] { Accept(m_HttpsListener, true); });
-    m_Threads.emplace_back([this] { Accept(m_HttpListener, false); });
+    m_Acceptors.emplace_back([this] { Accept(m_HttpsListener, true); });
+    m_Acceptors.emplace_back([this] { Accept(m_HttpListener, false); });
     return true;
 }
 
@@ -262,7 +274,22 @@ void Simulator::Accept(int listener, bool tls)
         if (descriptor < 0) continue;
         const unsigned long number = ++m_Connections;
         m_Open.insert(descriptor);
-        m_Threads.emplace_back([=] { Serve(descriptor, tls, number); });
+        Reap();
+        Worker& worker = m_Workers.emplace_back();
+        worker.thread = std::thread([this, &worker, descriptor, tls, number] {
+            Serve(descriptor, tls, number);
+            const std::lock_guard<std::mutex> ending(m_Mutex);
+            worker.done = true;
+        });
+    }
+}
+
+// Joins the threads whose connections have ended; with the mutex held.
+void Simulator::Reap()
+{
+    for (auto worker = m_Workers.begin(); worker != m_Workers.end();) {
+        if (worker->done) worker->thread.join();
+        worker = worker->done ? m_Workers.erase(worker) : std::next(worker);
     }
 }
 
@@ -273,27 +300,48 @@ void Simulator::Serve(int descriptor, bool tls, unsigned long number)
     sigemptyset(&broken);
     sigaddset(&broken, SIGPIPE);
     pthread_sigmask(SIG_BLOCK, &broken, nullptr);
-    {
-        Connection connection{Channel(descriptor), number, tls};
-        const Fault fault = tls ? m_Faults.Take("connect") : Fault();
-        bool usable = Pause(fault.delay);
-        if (fault.Is("stall")) PauseForGood();
-        if (!fault.kind.empty()) usable = false;
-        if (fault.Is("reset")) connection.channel.Reset();
-        if (usable && tls) {
-            SSL_CTX* context;
-            {
-                const std::lock_guard<std::mutex> lock(m_Mutex);
-                context = m_Tls;
-                SSL_CTX_up_ref(context);
-            }
-            usable = connection.channel.Handshake(context);
-            SSL_CTX_free(context);
-        }
-        if (usable) ServeRequests(connection);
-        const std::lock_guard<std::mutex> lock(m_Mutex);
-        m_Open.erase(descriptor);
+    Connection connection{Channel(descriptor), number, tls};
+    if (!tls || Handshake(connection)) ServeRequests(connection);
+    // Not open any more before the descriptor is closed and its number given out again.
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    m_Open.erase(descriptor);
+}
+
+// False when the connection has come to its end.
+bool Simulator::Handshake(Connection& connection)
+{
+    const Fault fault = m_Faults.Take("connect");
+    Channel& channel = connection.channel;
+    if (!fault.kind.empty() || fault.delay) NoteConnection(connection, fault.Text());
+    if (!Pause(fault.delay)) return false;
+    if (!fault.kind.empty()) {
+        // A handshake record of 74 bytes, of which the first two come.
+        if (fault.Is("stall-handshake")) channel.WriteBare(std::string("\x16\x03\x03\x00\x4a\x02\x00", 7));
+        if (fault.Is("no-http")) channel.WriteBare("no handshake that anyone speaks\r\n");
+        if (fault.Is("stall") || fault.Is("stall-handshake")) channel.Stall();
+        if (fault.Is("reset")) channel.Reset();
+        return false;
     }
+    SSL_CTX* context;
+    {
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        context = m_Tls;
+        SSL_CTX_up_ref(context);
+    }
+    const bool done = channel.Handshake(context);
+    SSL_CTX_free(context);
+    return done;
+}
+
+void Simulator::NoteConnection(const Connection& connection, const std::string& fault)
+{
+    LoggedRequest log;
+    log.service = log.operation = "connect";
+    log.connection = connection.number;
+    log.tls = connection.tls;
+    log.time = Now();
+    log.fault = fault;
+    m_Log.Add(std::move(log));
 }
 
 void Simulator::ServeRequests(Connection& connection)
@@ -304,7 +352,19 @@ void Simulator::ServeRequests(Connection& connection)
         if (!ServeOne(connection, request)) return;
         request = HttpRequest();
     }
+    if (!rest.empty()) NoteMalformed(connection);
     connection.channel.Close();
+}
+
+// What came is no request, or not all of one.
+void Simulator::NoteMalformed(const Connection& connection)
+{
+    LoggedRequest log;
+    log.connection = connection.number;
+    log.tls = connection.tls;
+    log.time = Now();
+    log.violation = "no whole HTTP request";
+    m_Log.Add(std::move(log));
 }
 
 bool Simulator::ServeOne(Connection& connection, const HttpRequest& request)
@@ -317,7 +377,7 @@ bool Simulator::ServeOne(Connection& connection, const HttpRequest& request)
     log.connection = connection.number;
     log.tls = connection.tls;
     log.resumed = connection.channel.IsResumed();
-    log.time = std::chrono::duration<double>(Clock::now() - m_Start).count();
+    log.time = Now();
     Fault fault;
     HttpResponse response = Answer(request, connection, log, fault);
     log.fault = fault.Text();
@@ -336,7 +396,7 @@ HttpResponse Simulator::Answer(const HttpRequest& request, Connection& connectio
         return m_Soap->Answer(request, *service, endpoint, log, take);
     }
     const std::string plain = PlainServiceName(path);
-    if (!plain.empty() && connection.tls == (plain == "discovery")) {
+    if (!plain.empty() && (plain == "bandwidth" || connection.tls == (plain == "discovery"))) {
         return AnswerPlain(plain, request, m_Options.environment, take(plain), log);
     }
     log.violation = "nothing is at " + path;
@@ -354,6 +414,8 @@ bool Simulator::Send(Connection& connection, const HttpRequest& request, HttpRes
         response.status = fault.Number(503);
         response.body.clear();
         if (response.status == 302) response.headers.emplace_back("Location", "https://localhost/elsewhere");
+    } else if (fault.Is("body")) {
+        response.body = fault.value;
     } else if (fault.Is("garbage")) {
         response.body = "\x01\x02 this is no answer <<<";
     } else if (fault.Is("empty")) {
@@ -362,9 +424,11 @@ bool Simulator::Send(Connection& connection, const HttpRequest& request, HttpRes
         response.headers.emplace_back("Content-Encoding", "gzip");
         response.body = Gzip(response.body + std::string(static_cast<size_t>(fault.Number(256)) << 20, ' '));
     } else if ((m_Options.gzip && request.Header("accept-encoding").find("gzip") != std::string::npos) ||
-               fault.Is("damaged-gzip")) {
+               fault.Is("damaged-gzip") || fault.Is("wrong-checksum")) {
         response.headers.emplace_back("Content-Encoding", "gzip");
         response.body = Gzip(response.body);
+        // The last eight bytes are the checksum and the length.
+        if (fault.Is("wrong-checksum")) response.body[response.body.size() - 8] ^= 0x55;
         if (fault.Is("damaged-gzip")) {
             for (size_t i = response.body.size() / 2; i < response.body.size(); i += 3)
                 response.body[i] ^= 0x55;
@@ -387,6 +451,7 @@ bool Simulator::SendFaulty(Channel& channel, const std::string& head, const std:
     const std::string half = body.substr(0, body.size() / 2);
     if (fault.Is("cut")) return channel.Close(), false;
     if (fault.Is("reset")) return channel.Reset(), false;
+    if (fault.Is("no-http")) return channel.Write("no protocol that anyone speaks\r\n\r\n"), channel.Close(), false;
     if (fault.Is("cut-header")) return channel.Write(head.substr(0, head.size() / 2)), channel.Close(), false;
     if (fault.Is("cut-body")) return channel.Write(head + half), channel.Close(), false;
     if (fault.Is("short")) return channel.Write(head + body), channel.Close(), false;
@@ -396,7 +461,7 @@ bool Simulator::SendFaulty(Channel& channel, const std::string& head, const std:
     if (fault.Is("split")) return channel.Write(head) && Pause(fault.Number(50)) && channel.Write(body);
     if (fault.Is("stall") || fault.Is("stall-body")) {
         if (fault.Is("stall-body")) channel.Write(head + half);
-        PauseForGood();
+        channel.Stall();
         return false;
     }
     if (fault.Is("no-length")) {
@@ -429,12 +494,6 @@ bool Simulator::Pause(int milliseconds)
 {
     std::unique_lock<std::mutex> lock(m_Mutex);
     return !m_Ending.wait_for(lock, std::chrono::milliseconds(milliseconds), [this] { return m_Ended; });
-}
-
-void Simulator::PauseForGood()
-{
-    std::unique_lock<std::mutex> lock(m_Mutex);
-    m_Ending.wait(lock, [this] { return m_Ended; });
 }
 
 }  // namespace

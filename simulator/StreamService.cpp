@@ -45,7 +45,7 @@ void checkForPurchasedStreamByTitleID(Call& call)
 void removeAllMyPurchases(Call& call)
 {
     if (call.Text("password") != call.database.Text("SELECT password FROM account"))
-        return call.Standard(1, "wrong password");
+        return call.Refuse(1, "wrong password");
     call.database.Run("DELETE FROM pass");
     call.Standard();
 }
@@ -75,7 +75,7 @@ void LocatePass(Call& call, bool resume)
         WriteLocation(call, row.Text(0) + "-" + profile + ".mp4", pass * 100 + call.Int("FileProfile"), stream,
                       row.Int(1), resume ? row.Int(2) : 0);
     });
-    if (!found) return call.Standard(2, "no such pass");
+    if (!found) return call.Refuse(2, "no such pass");
     call.database.Run("UPDATE pass SET stream = 'stream-' || id WHERE id = ?", {pass});
 }
 
@@ -92,7 +92,7 @@ void getBonusAssetLocation(Call& call)
 {
     const int bonus = call.Int("BonusAssetID");
     if (call.database.Int("SELECT COUNT(*) FROM bonus WHERE id = ?", {bonus}) == 0)
-        return call.Standard(2, "no such trailer");
+        return call.Refuse(2, "no such trailer");
     WriteLocation(call, "trailer-" + std::to_string(bonus) + ".mp4", bonus, "trailer-" + std::to_string(bonus), 0, 0);
 }
 
@@ -108,7 +108,7 @@ void manageStreamInstanceStatus(Call& call)
 void getTHXMediaDirector(Call& call)
 {
     if (call.database.Int("SELECT COUNT(*) FROM pass WHERE id = ?", {call.Int("PassID")}) == 0) {
-        return call.Standard(2, "no such pass");
+        return call.Refuse(2, "no such pass");
     }
     call.Standard();
     call.xml.Element("LongFormat", "THX-LONG-" + call.Text("AudioSetting")).Element("ShortFormat", "THX-S");
@@ -117,7 +117,7 @@ void getTHXMediaDirector(Call& call)
 void getTHXMediaDirectorBonusAsset(Call& call)
 {
     if (call.database.Int("SELECT COUNT(*) FROM bonus WHERE id = ?", {call.Int("BonusAssetID")}) == 0) {
-        return call.Standard(2, "no such trailer");
+        return call.Refuse(2, "no such trailer");
     }
     call.Standard();
     call.xml.Element("LongFormat", "THX-LONG-" + call.Text("BonusAssetType")).Element("ShortFormat", "THX-S");
@@ -138,8 +138,11 @@ void getAudioDefaultProperty(Call& call)
 
 void calcOrderTax(Call& call)
 {
-    const std::string price = call.database.Text("SELECT price FROM product WHERE sku = ?", {call.Int("SKUID")});
-    if (price.empty()) return call.Standard(1, "no such product");
+    const int sku = call.Int("SKUID");
+    // Like the purchase's: 9101 answers 1 ... 9122 answers 22.
+    if (sku > 9100 && sku <= 9122) return call.Refuse(sku - 9100, "refused as asked");
+    const std::string price = call.database.Text("SELECT price FROM product WHERE sku = ?", {sku});
+    if (price.empty()) return call.Refuse(1, "no such product");
     call.Standard();
     call.xml.Element("SubTotal", price).Element("TotalPrice", price).Element("Tax", "0.00");
 }
@@ -175,12 +178,15 @@ void ReturnError(Call& call)
 
 }  // namespace
 
-void WritePurchaseList(Call& call, const std::string& from, const std::string& titleColumn,
+bool WritePurchaseList(Call& call, const std::string& from, const std::string& titleColumn,
                        const std::string& passColumn, const std::string& order)
 {
     const int page = call.Int("CurrentPageNumber");
     const int perPage = call.Int("ItemsPerPage");
-    if (page < 1 || perPage < 1) return call.Standard(2, "pages start at 1 and hold an item");
+    if (page < 1 || perPage < 1 || page > kHighestPage || perPage > kHighestPage) {
+        call.Refuse(2, "pages start at 1 and hold an item");
+        return false;
+    }
     int position = (page - 1) * perPage;
     call.Standard();
     call.xml.Group("Titles", [&] {
@@ -192,6 +198,7 @@ void WritePurchaseList(Call& call, const std::string& from, const std::string& t
                            });
     });
     WritePage(call, page, perPage, call.database.Int("SELECT COUNT(*) FROM " + from));
+    return true;
 }
 
 void WriteMyVideos(Call& call)
@@ -231,9 +238,10 @@ const Operations& StreamOperations()
         {"ReturnTimeout", {}, ReturnTimeout},
         {"ReturnError", {}, ReturnError},
         {"removeAllMyPurchases", {{"password", T::Text}}, removeAllMyPurchases},
-        {"loadLastStreamingAssetLocationForPass", passAndProfile, loadLastStreamingAssetLocationForPass},
-        {"getBonusAssetLocation", {{"BonusAssetID", T::Int}}, getBonusAssetLocation},
-        {"getStreamingAssetLocation", passAndProfile, getStreamingAssetLocation},
+        {"loadLastStreamingAssetLocationForPass", passAndProfile, loadLastStreamingAssetLocationForPass, false,
+         kRefusedLocation},
+        {"getBonusAssetLocation", {{"BonusAssetID", T::Int}}, getBonusAssetLocation, false, kRefusedLocation},
+        {"getStreamingAssetLocation", passAndProfile, getStreamingAssetLocation, false, kRefusedLocation},
         {"manageStreamInstanceStatus",
          {{"StreamID", T::Text}, {"Status", T::StreamStatus}, {"StopTimeSeconds", T::Int}},
          manageStreamInstanceStatus},
@@ -241,7 +249,7 @@ const Operations& StreamOperations()
         {"checkForPurchasedStream", {{"SkuID", T::Int}}, checkForPurchasedStream, true},
         {"checkForPurchasedStreamByTitleID", {{"TitleID", T::Int}}, checkForPurchasedStreamByTitleID, true},
         {"getTitleListingsPurchasedForPasses", {{"Passes", T::IntArray}}, getTitleListingsPurchasedForPasses, true},
-        {"getMyStreamingVideos", MyVideosChildren(), getMyStreamingVideos},
+        {"getMyStreamingVideos", MyVideosChildren(), getMyStreamingVideos, false, kRefusedVideos},
     };
     return operations;
 }

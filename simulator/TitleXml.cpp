@@ -66,8 +66,7 @@ void WriteTitle(Call& call, int title, int position)
 void WriteTitleDetails(Call& call, int title)
 {
     if (call.database.Int("SELECT COUNT(*) FROM title WHERE id = ?", {title}) == 0) {
-        call.xml.Element("TitleID", 0);
-        return call.Standard(1, "no such title");
+        return call.Refuse(1, "no such title");
     }
     WriteTitle(call, title, 1);
     call.Standard();

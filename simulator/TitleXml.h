@@ -3,6 +3,9 @@
 
 #include "Service.h"
 
+/// Page numbers come back as xsd:short.
+constexpr int kHighestPage = 32767;
+
 /// The children of a title listing. `position` is its place on the page, from 1.
 void WriteTitle(Call& call, int title, int position);
 /// The same with the details after it; a refusal when there is no such title.

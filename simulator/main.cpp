@@ -74,12 +74,13 @@ void PrintHelp()
     printf(
         "Account: user \"%s\", password \"%s\", API key \"%s\", adult PIN %s, activation PIN %s (000000 locks out), "
         "gift\n"
-        "codes GIFT1 to GIFT5. Products 9001 to 9022 refuse to be bought with response code 1 to 22.\n\n",
+        "codes GIFT1 to GIFT5. Products 9001 to 9022 refuse to be bought with response code 1 to 22, 9101 to 9122 to "
+        "be taxed.\n\n",
         StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey,
         StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin);
     printf("%s\n", Storefront::HelpOnFaults().c_str());
     printf(
-        "Control, on the plain HTTP port: POST /control/faults (a fault a line), DELETE /control/faults,\n"
+        "Control, on the plain HTTP port: POST /control/faults (a fault a line), GET and DELETE /control/faults,\n"
         "GET /control/log (a JSON object a line), DELETE /control/log.\n\n"
         "Not checked: whether a device is activated before it buys, the value of AuthToken in the device settings, the "
         "user\n"

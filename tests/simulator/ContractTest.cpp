@@ -1,0 +1,403 @@
+// Every operation's answer against the contract's records: children, their order, those that are never left out, their
+// types.
+#include <libxml/parser.h>
+
+#include <algorithm>
+#include <map>
+#include <set>
+#include <sstream>
+
+#include "RawClient.h"
+
+namespace {
+
+// A child as "Name:type" with "*" behind one that may be left out and "+" behind one that repeats from zero. Types: i
+// int, h short, b boolean, s text, d decimal, else an enumeration or a record below.
+const std::map<std::string, std::string> kRecords = {
+    {"StandardResponse", "ResponseCode:i ResponseMessage:s*"},
+    {"Genre", "ID:i Name:s* Visible:b ParentId:i"},
+    {"ArrayOfGenre", "Genre:Genre+"},
+    {"GenreRequest", "Genres:ArrayOfGenre*"},
+    {"GetGenreLabelResponse", "ResponseCode:i ResponseMessage:s* Label:s* LabelMessage:s*"},
+    {"TitleListing",
+     "TitleID:i TitleName:s* BoxArtPrefix:s* TitlePosition:h EpisodeNumber:i BonusAssets:ArrayOfBonusAsset* "
+     "IsTvListing:b "
+     "MPAARating:s* AvailableProducts:ArrayOfProductListing* IsTHXMediaDirectorEnabled:b "
+     "IsTHXMediaDirectorEnabledForTrailer:b CHVRSRating:s* LoyaltyPointsForBuy:s* LoyaltyPointsForRent:s*"},
+    {"ArrayOfTitleListing", "TitleListing:TitleListing+"},
+    {"TitleListingResponse",
+     "<TitleListing ResponseCode:i ResponseMessage:s* Synopsys:s* UserRating:i Directors:s* Actors:s* Writers:s* "
+     "Producers:s* "
+     "Copyright:s* RunTime:s* IsAvailInUserWishList:b RatingReason:s*"},
+    {"ArrayOfTitleListingResponse", "TitleListingResponse:TitleListingResponse+"},
+    {"TitleListingPurchased",
+     "<TitleListing EpisodeID:i TvListingTitleID:i PurchaseType:PurchaseType Status:WatchStatus RentalPeriod:s* "
+     "PassID:i "
+     "PlayStatus:StreamStatus StartTimeSeconds:i"},
+    {"ArrayOfTitleListingPurchased", "TitleListingPurchased:TitleListingPurchased+"},
+    {"TitleListingPurchasedForPass", "<TitleListingPurchased ResponseCode:i ResponseMessage:s*"},
+    {"ArrayOfTitleListingPurchasedForPass", "TitleListingPurchasedForPass:TitleListingPurchasedForPass+"},
+    {"BonusAsset", ""},
+    {"ArrayOfBonusAsset", "BonusAsset:BonusAsset+"},
+    {"ProductListing",
+     "SkuID:i PurchaseType:PurchaseType Price:d* AvailableAssets:ArrayOfFileProfile* ExpireDate:s* "
+     "AvailableAudioProfiles:ArrayOfAudioFile* RentalPeriod:i"},
+    {"ArrayOfProductListing", "ProductListing:ProductListing+"},
+    {"ArrayOfFileProfile", "FileProfile:FileProfile+"},
+    {"AudioFile", "AssetAudioID:i FileLocation:s* ContainsVideo:b AudioAssetProfile:AudioProfile"},
+    {"ArrayOfAudioFile", "AudioFile:AudioFile+"},
+    {"GetTitlesResponse",
+     "ResponseCode:i ResponseMessage:s* GenreID:i CurrentPageNumber:h ItemsPerPage:h TotalPages:h TotalItems:h "
+     "Titles:ArrayOfTitleListing*"},
+    {"ArrayOfGetTitlesResponse", "GetTitlesResponse:GetTitlesResponse+"},
+    {"TvEpisode", "EpisodeID:i EpisodeName:s* EpisodeNumber:i"},
+    {"ArrayOfTvEpisode", "TvEpisode:TvEpisode+"},
+    {"TvEpisodeList", "ResponseCode:i ResponseMessage:s* Episodes:ArrayOfTvEpisode*"},
+    {"RecommendedTitlesResponse", "ResponseCode:i ResponseMessage:s* Titles:ArrayOfTitleListing*"},
+    {"TranslateSkuIdResponse", "ResponseCode:i ResponseMessage:s* TitleId:i"},
+    {"TranslatedTivoExternalIdResponse", "ResponseCode:i ResponseMessage:s* TivoExternalId:s* TitleId:i"},
+    {"FileTypeRecord",
+     "File_DRMProvider:DRMProvider File_AccessType:AccessType File_FileProfile:FileProfile "
+     "File_VideoFormat:VideoFormat "
+     "File_FileExtension:FileExtension"},
+    {"GetMyVideosResponse",
+     "ResponseCode:i ResponseMessage:s* Titles:ArrayOfTitleListingPurchased* CurrentPageNumber:h ItemsPerPage:h "
+     "TotalPages:h "
+     "TotalItems:h"},
+    {"GetWishlistItemsResponse", "<GetMyVideosResponse SortOrder:i"},
+    {"Configuration", "Value:s*"},
+    {"ArrayOfConfiguration", "Configuration:Configuration+"},
+    {"GetConfigResponse", "ResponseCode:i ResponseMessage:s* ConfigurationSet:ArrayOfConfiguration*"},
+    {"SettingsPageInfo", "ResponseCode:i ResponseMessage:s* Account:s* DeviceID:s* DeviceName:s*"},
+    {"GetEmailAddressResponse", "ResponseCode:i ResponseMessage:s* EmailAddress:s*"},
+    {"BillingInfoResponse", "ResponseCode:i ResponseMessage:s* CCLastFour:s* CCTypeId:i CCType:s*"},
+    {"BalanceResponse", "ResponseCode:i ResponseMessage:s* Balance:i"},
+    {"BillingInfoAndPPCBalanceResponse", "BillingInfo:BillingInfoResponse* PPCardBalance:BalanceResponse*"},
+    {"CalcOrderTaxResponse", "ResponseCode:i ResponseMessage:s* SubTotal:d* TotalPrice:d* Tax:d*"},
+    {"PurchaseResponse", "ResponseCode:i ResponseMessage:s* PassID:i TransactionId:i TransactionAuthNum:s*"},
+    {"CheckRentalExpirationResponse", "ResponseCode:i ResponseMessage:s* ShouldDisplay:b HoursRemaining:i"},
+    {"CheckAdultVerificationEnabledResponse", "ResponseCode:i ResponseMessage:s* IsAdultVerificationEnabled:s*"},
+    {"CheckAdultVerificationPinResponse", "ResponseCode:i ResponseMessage:s* IsPinVerified:b"},
+    {"GetStreamingAssetLocationResponse",
+     "ResponseCode:i ResponseMessage:s* StreamingAssetLocation:s* AssetID:i StreamID:s* DRMServerURL:s* "
+     "DRMACKServerURL:s* "
+     "Status:StreamStatus StartTimeSeconds:i HeartbeatURL:s* HeartbeatPollInSeconds:i"},
+    {"THXMediaDirectorResponse", "ResponseCode:i ResponseMessage:s* LongFormat:s* ShortFormat:s*"},
+    {"AuthorizeDeviceResponse", "ResponseCode:i ResponseMessage:s* AuthToken:s*"},
+};
+
+const std::map<std::string, std::set<std::string>> kEnumerations = {
+    {"PurchaseType", {"rent", "buy", "any"}},
+    {"WatchStatus", {"WatchNow", "RentAgain", "NotAvailable", "Undefined"}},
+    {"StreamStatus", {"play", "stopped", "paused", "resumeplay", "errorinplayback"}},
+    {"AudioProfile",
+     {"Stereo_Standard", "Dolby_Stereo_AC3", "Dolby_Digital_Plus_Stereo", "Dolby_Digital_Plus_51", "DTS_Express_Stereo",
+      "DTS_Express_51"}},
+    {"FileProfile",
+     {"UNKNOWN", "STANDARD", "HIGH_DEFINITION", "PORTABLE", "PORTABLE_STANDARD", "TEMP5", "PORTABLE_WIDE",
+      "STANDARD_DEFINITION_3D", "HIGH_DEFINITION_3D", "STANDARD_DEFINITION_REALD_3D", "HIGH_DEFINITION_REALD_3D"}},
+    {"AccessType", {"UNKNOWN", "DOWNLOAD", "STREAM"}},
+    {"DRMProvider",
+     {"UNKNOWN", "WMDRM_10", "TIVO_DRM", "WIDEVINE", "WMDRM_7", "WMDRM_9", "FLUX", "DIVX", "Intel_MV", "RTMPE",
+      "FLASH_ACCESS", "PLAY_READY"}},
+    {"VideoFormat", {"UNKNOWN", "WMV9", "MPEG2_TIVO", "MPEG2_Standard", "VC1", "DIVX", "H264", "FLUX"}},
+    {"FileExtension", {"AUTOPOPULATE", "UNKNOWN", "WMV", "MPEG", "MP4", "FLUX", "AVI", "QT", "FLV", "RM", "DIVX"}},
+};
+
+struct ChildRule {
+    std::string name, type;
+    bool optional, repeated;
+};
+
+std::vector<ChildRule> RulesOf(const std::string& record)
+{
+    std::vector<ChildRule> rules;
+    std::istringstream words(kRecords.at(record));
+    for (std::string word; words >> word;) {
+        if (word[0] == '<') {
+            rules = RulesOf(word.substr(1));
+            continue;
+        }
+        const size_t colon = word.find(':');
+        ChildRule rule{word.substr(0, colon), word.substr(colon + 1), word.back() == '*', word.back() == '+'};
+        if (rule.optional || rule.repeated) rule.type.pop_back();
+        rules.push_back(rule);
+    }
+    return rules;
+}
+
+std::string NameOf(const xmlNode* node)
+{
+    return reinterpret_cast<const char*>(node->name);
+}
+
+std::string TextOf(const xmlNode* node)
+{
+    xmlChar* text = xmlNodeGetContent(node);
+    const std::string copy = reinterpret_cast<const char*>(text);
+    xmlFree(text);
+    return copy;
+}
+
+bool FitsScalar(const std::string& type, const std::string& text)
+{
+    if (type == "s") return true;
+    if (type == "b") return text == "true" || text == "false" || text == "0" || text == "1";
+    const auto enumeration = kEnumerations.find(type);
+    if (enumeration != kEnumerations.end()) return enumeration->second.count(text) == 1;
+    char* end = nullptr;
+    const double number = strtod(text.c_str(), &end);
+    if (text.empty() || *end) return false;
+    if (type == "d") return text.find_first_not_of("0123456789.") == std::string::npos;
+    return text.find('.') == std::string::npos && (type == "i" || (number >= -32768 && number <= 32767));
+}
+
+// What is wrong with the element as a value of the type; empty when nothing is.
+std::string Check(const xmlNode* element, const std::string& type)
+{
+    const std::string here = NameOf(element) + ": ";
+    if (!kRecords.count(type))
+        return FitsScalar(type, TextOf(element)) ? "" : here + "no " + type + ": " + TextOf(element);
+    const std::vector<ChildRule> rules = RulesOf(type);
+    size_t next = 0;
+    bool repeating = false;
+    for (const xmlNode* child = xmlFirstElementChild(const_cast<xmlNode*>(element)); child;
+         child = xmlNextElementSibling(const_cast<xmlNode*>(child))) {
+        if (!repeating || NameOf(child) != rules[next].name) {
+            while (next < rules.size() && rules[next].name != NameOf(child)) {
+                if (!rules[next].optional && !rules[next].repeated) return here + "no " + rules[next].name;
+                ++next;
+            }
+        }
+        if (next == rules.size()) return here + NameOf(child) + " is unknown or out of order";
+        if (std::string("http://api.zorvane.example/api/") != reinterpret_cast<const char*>(child->ns->href)) {
+            return here + NameOf(child) + " is of another namespace";
+        }
+        const std::string wrong = Check(child, rules[next].type);
+        if (!wrong.empty()) return here + wrong;
+        repeating = rules[next].repeated;
+        if (!repeating) ++next;
+    }
+    for (; next < rules.size(); ++next) {
+        if (!rules[next].optional && !rules[next].repeated) return here + "no " + rules[next].name;
+    }
+    return "";
+}
+
+// What is wrong with an answer whose result is of the type.
+std::string CheckAnswer(const Reply& reply, const std::string& operation, const std::string& type)
+{
+    if (reply.status != 200) return "HTTP status " + std::to_string(reply.status) + ": " + reply.body;
+    const std::unique_ptr<xmlDoc, void (*)(xmlDoc*)> document(
+        xmlReadMemory(reply.body.data(), static_cast<int>(reply.body.size()), nullptr, nullptr, XML_PARSE_NONET),
+        xmlFreeDoc);
+    if (!document) return "no XML";
+    const xmlNode* body = xmlLastElementChild(xmlDocGetRootElement(document.get()));
+    const xmlNode* response = xmlFirstElementChild(const_cast<xmlNode*>(body));
+    if (!response || NameOf(response) != operation + "Response") return "no " + operation + "Response";
+    const xmlNode* result = xmlFirstElementChild(const_cast<xmlNode*>(response));
+    if (!result || NameOf(result) != operation + "Result") return "no " + operation + "Result";
+    return Check(result, type);
+}
+
+const char kBrowse[] = "RealTimeBrowse";
+const char kAccount[] = "DownloadAPI";
+const char kStream[] = "StreamAPI";
+const char kBoth[] = "";
+
+struct Row {
+    const char* service;
+    const char* operation;
+    const char* type;
+    std::string children;  // of a request that is answered well
+    std::string refused;   // of one that is not; empty when the operation refuses nothing
+    int code = 1;          // of that refusal
+};
+
+std::string Paged(const std::string& before, int page, const std::string& after, bool sizeFirst = false)
+{
+    const std::string size = "<z:ItemsPerPage>3</z:ItemsPerPage>";
+    const std::string number = "<z:CurrentPageNumber>" + std::to_string(page) + "</z:CurrentPageNumber>";
+    return before + (sizeFirst ? size + number : number + size) + after;
+}
+
+std::vector<Row> Rows()
+{
+    const auto one = [](const char* name, const std::string& value) { return Children({{name, value}}); };
+    const std::string any = one("PurchaseType", "any");
+    const std::string anyAny = any + one("TitleType", "any");
+    const std::string all = anyAny + one("WatchStatusFilter", "Undefined");
+    const std::string pass = one("PassID", "1") + one("FileProfile", "STANDARD");
+    const std::string noPass = one("PassID", "999") + one("FileProfile", "STANDARD");
+    const std::string loud = one("AudioSetting", "Stereo_Standard");
+    const std::string bonus = one("FileProfile", "STANDARD") + one("BonusAssetType", "Trailer");
+    const std::string buy = one("IPAddress", "10.0.0.1") + one("UsePrePaidFunds", "yes");
+    const std::string ints = "<z:int>1</z:int><z:int>2</z:int>";
+    return {
+        {kBrowse, "getFileType", "FileTypeRecord", "", ""},
+        {kBrowse, "shouldUpdateCache", "i", one("UTCTime", "then"), ""},
+        {kBrowse, "getRecommendedTitles", "RecommendedTitlesResponse", one("TitleId", "12"), one("TitleId", "0")},
+        {kBrowse, "getLastCacheLoadTimeUTC", "s", "", ""},
+        {kBrowse, "translateSkuId", "TranslateSkuIdResponse", one("SkuId", "SKU"), one("SkuId", "1")},
+        {kBrowse, "translateTivoExternalId", "TranslatedTivoExternalIdResponse", one("TivoExternalId", "EXT12"),
+         one("TivoExternalId", "none")},
+        {kBrowse, "getAllTvEpisodeListings", "ArrayOfTitleListingResponse", one("TitleID", "SEASON"), ""},
+        {kBrowse, "getTvEpisodeListing", "TitleListingResponse", one("EpisodeID", "EPISODE"), one("EpisodeID", "12")},
+        {kBrowse, "getTvEpisodeListByTitleID", "TvEpisodeList", one("TitleID", "SEASON"), one("TitleID", "12")},
+        {kBrowse, "getTitleListing", "TitleListingResponse", one("TitleID", "12"), one("TitleID", "0")},
+        {kBrowse, "getTitlesByGenreArray", "ArrayOfGetTitlesResponse",
+         Paged("<z:GenreIDs>" + ints + "</z:GenreIDs>", 1, any), ""},
+        {kBrowse, "getTitlesByNavigation", "GetTitlesResponse", Paged(one("GenreID", "1"), 2, any),
+         Paged(one("GenreID", "77"), 1, any)},
+        {kBrowse, "getTitlesByNavigation", "GetTitlesResponse", Paged(one("GenreID", "1"), 9999, any),
+         Paged(one("GenreID", "1"), 0, any), 2},
+        {kBrowse, "getGenreLabel", "GetGenreLabelResponse", one("GenreID", "1"), one("GenreID", "77")},
+        {kBrowse, "searchForTitle", "GetTitlesResponse", Paged(one("Query", "the"), 1, anyAny, true),
+         Paged(one("Query", "the"), 32768, anyAny, true), 2},
+        {kBrowse, "searchForTitleDetail", "GetTitlesResponse", Paged(one("Query", "the"), 1, anyAny, true), ""},
+        {kBrowse, "getNavigation", "GenreRequest", "", ""},
+        {kBoth, "checkRentalExpiration", "CheckRentalExpirationResponse", one("PassId", "1"), one("PassId", "999")},
+        {kBoth, "GetCountryID", "i", "", ""},
+        {kBoth, "getConfig", "GetConfigResponse", "", ""},
+        {kBoth, "checkAdultVerificationPin", "CheckAdultVerificationPinResponse", one("Pin", "0042"), ""},
+        {kBoth, "checkAdultVerificationEnabled", "CheckAdultVerificationEnabledResponse", "", ""},
+        {kBoth, "addItemToWishlist", "StandardResponse", one("TitleID", "12"), one("TitleID", "0")},
+        {kBoth, "getWishlistItems", "GetWishlistItemsResponse",
+         Paged(one("sortOrder", "1"), 1, one("TitleType", "any")),
+         Paged(one("sortOrder", "1"), 0, one("TitleType", "any")), 2},
+        {kBoth, "getWishlistItems", "GetWishlistItemsResponse",
+         Paged(one("sortOrder", "3"), 1, one("TitleType", "movies")),
+         Paged(one("sortOrder", "4"), 1, one("TitleType", "any")), 2},
+        {kStream, "removeItemFromWishList", "StandardResponse", one("TitleID", "12"), one("TitleID", "12")},
+        {kBoth, "removeAllItemsFromWishList", "StandardResponse", "", ""},
+        {kStream, "assignGiftCertificateToUser", "BalanceResponse", one("GiftCertificateCode", "GIFT1"),
+         one("GiftCertificateCode", "GIFT1")},
+        {kBoth, "getSettingsPageInfo", "SettingsPageInfo", "", ""},
+        {kBoth, "getEmailAddress", "GetEmailAddressResponse", "", ""},
+        {kBoth, "showPrePaidCardBalance", "BalanceResponse", "", ""},
+        {kBoth, "getBillingInfo", "BillingInfoResponse", "", ""},
+        {kAccount, "checkForPurchasedTitle", "b", one("TitleID", "12"), ""},
+        {kAccount, "getMyVideos", "GetMyVideosResponse", Paged("", 1, all), Paged("", 0, all), 2},
+        {kStream, "getMyStreamingVideos", "GetMyVideosResponse", Paged("", 1, all), Paged("", 0, all), 2},
+        {kBoth, "doPurchaseSavedbilling", "PurchaseResponse", one("SkuID", "SKU") + buy, one("SkuID", "9022") + buy,
+         22},
+        {kBoth, "deactivateDevice", "StandardResponse", "", ""},
+        {kBoth, "authorizeDevice", "AuthorizeDeviceResponse", one("PIN", "123456"), one("PIN", "000000"), 2},
+        {kBoth, "checkAuthToken", "b", one("AuthToken", "x"), ""},
+        {kStream, "getTHXMediaDirectorBonusAsset", "THXMediaDirectorResponse", one("BonusAssetID", "BONUS") + bonus,
+         one("BonusAssetID", "1") + bonus, 2},
+        {kStream, "getTHXMediaDirector", "THXMediaDirectorResponse", pass + loud, noPass + loud, 2},
+        {kStream, "setAudioDefaultProperty", "StandardResponse", loud, ""},
+        {kStream, "getAudioDefaultProperty", "AudioProfile", "", ""},
+        {kStream, "calcOrderTax", "CalcOrderTaxResponse", one("SKUID", "SKU"), one("SKUID", "9111"), 11},
+        {kStream, "ReturnTimeout", "StandardResponse", "", ""},
+        {kStream, "ReturnError", "StandardResponse", "", ""},
+        {kStream, "getStreamingAssetLocation", "GetStreamingAssetLocationResponse", pass, noPass, 2},
+        {kStream, "loadLastStreamingAssetLocationForPass", "GetStreamingAssetLocationResponse", pass, noPass, 2},
+        {kStream, "getBonusAssetLocation", "GetStreamingAssetLocationResponse", one("BonusAssetID", "BONUS"),
+         one("BonusAssetID", "1"), 2},
+        {kStream, "manageStreamInstanceStatus", "StandardResponse",
+         Children({{"StreamID", "stream-1"}, {"Status", "paused"}, {"StopTimeSeconds", "90"}}),
+         Children({{"StreamID", "none"}, {"Status", "paused"}, {"StopTimeSeconds", "90"}})},
+        {kStream, "getBillingInfoAndPPCBalance", "BillingInfoAndPPCBalanceResponse", "", ""},
+        {kStream, "checkForPurchasedStream", "b", one("SkuID", "SKU"), ""},
+        {kStream, "checkForPurchasedStreamByTitleID", "b", one("TitleID", "12"), ""},
+        {kStream, "getTitleListingsPurchasedForPasses", "ArrayOfTitleListingPurchasedForPass",
+         "<z:Passes>" + ints + "</z:Passes>", ""},
+        {kStream, "removeAllMyPurchases", "StandardResponse", one("password", "secret"), one("password", "guess")},
+    };
+}
+
+class ContractTest : public StorefrontTest {
+protected:
+    // The children with the database's ids in the places of their names.
+    std::string WithIds(std::string children)
+    {
+        const std::pair<const char*, const char*> ids[] = {{"SKU<", "SELECT MIN(sku) FROM product WHERE price < 5"},
+                                                           {"SEASON<", "SELECT MIN(id) FROM title WHERE is_tv = 1"},
+                                                           {"EPISODE<", "SELECT MIN(id) FROM title WHERE season <> 0"},
+                                                           {"BONUS<", "SELECT MIN(id) FROM bonus"}};
+        for (const auto& id : ids) {
+            const size_t place = children.find(std::string(">") + id.first);
+            if (place != std::string::npos) children.replace(place + 1, strlen(id.first) - 1, store->Query(id.second));
+        }
+        return children;
+    }
+    void CheckRow(const std::string& service, const Row& row)
+    {
+        SCOPED_TRACE(service + " " + row.operation);
+        const Reply good = Ask(service, row.operation, WithIds(row.children));
+        EXPECT_EQ("", CheckAnswer(good, row.operation, row.type));
+        const std::string code = good.Element("ResponseCode");
+        EXPECT_TRUE(code.empty() || code == "0") << good.body;
+        if (!row.refused.empty()) {
+            const Reply refused = Ask(service, row.operation, WithIds(row.refused));
+            EXPECT_EQ("", CheckAnswer(refused, row.operation, row.type));
+            EXPECT_EQ(std::to_string(row.code), refused.Element("ResponseCode")) << refused.body;
+        }
+        std::string error;
+        if (!store->AddFault(std::string(row.operation) + "=code:19", error)) return;
+        const Reply ordered = Ask(service, row.operation, WithIds(row.children));
+        EXPECT_EQ("", CheckAnswer(ordered, row.operation, row.type));
+        EXPECT_EQ("19", ordered.Element("ResponseCode"));
+    }
+};
+
+TEST_F(ContractTest, EveryAnswerIsOneOfTheContract)
+{
+    Begin();
+    for (const Row& row : Rows()) {
+        for (const char* service : {kBrowse, kAccount, kStream}) {
+            if (row.service == kBoth ? service != kBrowse : row.service == service) CheckRow(service, row);
+        }
+    }
+}
+
+TEST_F(ContractTest, SearchesLookAwayFromCase)
+{
+    Begin();
+    const auto found = [&](const char* text) {
+        return atoi(Ask(kBrowse, "searchForTitle",
+                        Children({{"Query", text},
+                                  {"ItemsPerPage", "1"},
+                                  {"CurrentPageNumber", "1"},
+                                  {"PurchaseType", "any"},
+                                  {"TitleType", "any"}}))
+                        .Element("TotalItems")
+                        .c_str());
+    };
+    EXPECT_GT(found("harbour"), 0);
+    EXPECT_EQ(found("harbour"), found("HARBOUR"));
+    EXPECT_GT(found("Caf\u00e9"), 0);
+    EXPECT_EQ(found("Caf\u00e9"), found("cAF\u00c9"));
+    EXPECT_EQ(found("&lt;%&gt;"), 0) << "no pattern";
+}
+
+// Pages add up to the whole, each title once, positions counted through.
+TEST_F(ContractTest, PagesAddUp)
+{
+    Begin();
+    std::set<std::string> ids;
+    int pages = 1;
+    int position = 0;
+    for (int page = 1; page <= pages; ++page) {
+        const Reply reply = Ask(kBrowse, "getTitlesByNavigation",
+                                Children({{"GenreID", "101"},
+                                          {"CurrentPageNumber", std::to_string(page)},
+                                          {"ItemsPerPage", "7"},
+                                          {"PurchaseType", "rent"}}));
+        pages = std::min(50, atoi(reply.Element("TotalPages").c_str()));
+        for (size_t at = 0; (at = reply.body.find("<TitleID>", at)) != std::string::npos; ++at) {
+            EXPECT_TRUE(ids.insert(reply.body.substr(at + 9, reply.body.find('<', at + 9) - at - 9)).second);
+            const size_t place = reply.body.find("<TitlePosition>", at) + 15;
+            EXPECT_EQ(++position, atoi(reply.body.c_str() + place));
+        }
+        EXPECT_EQ(std::to_string(page), reply.Element("CurrentPageNumber"));
+        if (page == pages) {
+            EXPECT_EQ(std::to_string(position), reply.Element("TotalItems"));
+        }
+    }
+    EXPECT_GT(ids.size(), 7u);
+}
+
+}  // namespace
