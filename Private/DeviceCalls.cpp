@@ -12,8 +12,11 @@ ZV_WS_Status ZV_WS_authorizeDevice(ZV_WS_Session* handle, const char* pin, ZV_WS
     if (!call.Accepts(pin && *pin)) return call.Refusal();
     call->PIN = Text(pin);
     const ZV_WS_Status status = call.Into(answer);
-    if (status == ZV_WS_Status_ok && answer->AuthToken) call.session().m_Params.AuthToken = answer->AuthToken;
-    return status;
+    if (status != ZV_WS_Status_ok || !answer->AuthToken) return status;
+    return GuardCall([&] {
+        call.session().m_Params.AuthToken = answer->AuthToken;
+        return status;
+    });
 }
 
 ZV_WS_Status ZV_WS_deactivateDevice(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer)

@@ -26,7 +26,7 @@ namespace ZVUtilities {
 const char* QueryServiceBaseURL(ContentType type, soap* context, const char* destinationUniqueID, int destinationTypeID,
                                 ZV_WS_EnvNum envNum, ZV_WS_EnvID& envID)
 {
-    const Deployment& deployment = Deployment::Current();
+    const Deployment& deployment = context ? Transport::Of(context).deployment() : Deployment::Current();
     if (envNum >= ENVNUM_APISTG && envNum <= ENVNUM_PRODUCTION) {
         envID = static_cast<ZV_WS_EnvID>(envNum);
         const char* url = deployment.BaseUrl(type, envID);

@@ -63,6 +63,8 @@ bool RawHttp::ReceiveHead()
 {
     m_HeadLength = Receive(m_Head, sizeof m_Head - 1);
     m_Head[m_HeadLength] = '\0';
+    SecretFilter filter;
+    TrafficLog::Received(filter, m_Head, m_HeadLength);
     return m_HeadLength != 0;
 }
 

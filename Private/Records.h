@@ -17,13 +17,12 @@ void Tag(R& record);
 
 namespace detail {
 
-// Zeroes every member and tags the records embedded in the record, so that each can be released whatever happens next.
+// Zeroes every member, of embedded records too.
 struct Emptier {
     template <class T>
     void Member(const char*, T& value)
     {
         value = T();
-        if constexpr (kIsRecord<T>) Tag(value);
     }
     template <class T>
     void Elements(const char*, unsigned int& size, T*& elements)
@@ -31,6 +30,18 @@ struct Emptier {
         size = 0;
         elements = nullptr;
     }
+};
+
+// Tags the embedded records.
+struct Tagger {
+    template <class T>
+    void Member(const char*, T& value)
+    {
+        if constexpr (kIsRecord<T>) Tag(value);
+    }
+    template <class T>
+    void Elements(const char*, unsigned int&, T*&)
+    {}
 };
 
 struct Freer {
@@ -68,22 +79,30 @@ void VisitAll(R& record, Visitor& visitor)
 
 }  // namespace detail
 
-/// Empties the record without looking at what it held, and tags it and the records embedded in it.
-template <class R>
-void Tag(R& record)
-{
-    record._pImpl = nullptr;
-    detail::Emptier emptier;
-    detail::VisitAll(record, emptier);
-    record._pImpl = new unsigned int(ZV_WS_RecordTraits<R>::kTag);
-}
-
 /// Frees what the members own and zeroes them; the tag stays.
 template <class R>
 void FreeMembers(R& record)
 {
     detail::Freer freer;
     detail::VisitAll(record, freer);
+}
+
+/// Empties the record without looking at what it held, and tags it and the records embedded in it. When memory runs out
+/// in the middle the record is left empty.
+template <class R>
+void Tag(R& record)
+{
+    record._pImpl = nullptr;
+    detail::Emptier emptier;
+    detail::VisitAll(record, emptier);
+    try {
+        detail::Tagger tagger;
+        detail::VisitAll(record, tagger);
+        record._pImpl = new unsigned int(ZV_WS_RecordTraits<R>::kTag);
+    } catch (const std::bad_alloc&) {
+        FreeMembers(record);
+        throw;
+    }
 }
 
 /// Gives an array record `count` zeroed elements; records among them get their tags. The record can be released at any

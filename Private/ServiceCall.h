@@ -56,7 +56,11 @@ public:
     template <class... Arguments>
     void CacheAs(ZV_WS_CacheParam::CacheData kind, const char* table, const Arguments&... arguments)
     {
-        m_Entry = {kind, table, arguments...};
+        // Without memory for the key the answer is not cached.
+        GuardCall([&] {
+            m_Entry = {kind, table, arguments...};
+            return ZV_WS_Status_ok;
+        });
     }
 
     /// Only when the call can be made.

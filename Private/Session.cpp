@@ -119,10 +119,11 @@ ZVString MakeUserAgent(const ZV_WS_SetupParams2& params)
     return agent;
 }
 
-bool LoadAuthorities(SessionImpl& session)
+bool LoadAuthorities(SessionImpl& session, const Deployment& deployment)
 {
-    return session.m_Browse.transport().LoadAuthorities() && session.m_Stream.transport().LoadAuthorities() &&
-           session.m_Download.transport().LoadAuthorities();
+    return session.m_Browse.transport().LoadAuthorities(deployment) &&
+           session.m_Stream.transport().LoadAuthorities(deployment) &&
+           session.m_Download.transport().LoadAuthorities(deployment);
 }
 
 void SetParams(SessionImpl& session)
@@ -159,6 +160,7 @@ bool OpenCache(SessionImpl& session, bool mayReplace)
 
 void MakeEmptySession(ZV_WS_Session& handle)
 {
+    handle._pImpl = nullptr;
     handle._pSessionImpl = nullptr;
     handle._pImpl = new unsigned int(SessionImpl::kTag);
     handle._pSessionImpl = new SessionImpl;
@@ -178,7 +180,8 @@ ZV_WS_AccessType AccessTypeOf(ZV_WS_Session* handle, ZV_WS_AccessType given)
 ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
 {
     if (!AreValid(params)) return ZV_WS_Status_invalid_param;
-    if (!Deployment::Load()) return ZV_WS_Status_file_operation_error;
+    const Deployment* deployment = Deployment::Load();
+    if (!deployment) return ZV_WS_Status_file_operation_error;
     if (params.CacheParam.Type == CacheType_File) {
         const ZVString folder = CacheFolder(params.CacheParam.Path);
         if (!ZVFile::FolderExist(folder.c_str()) && !ZVFile::CreateFolder(folder.c_str())) {
@@ -191,7 +194,7 @@ ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
     CopyProxy(own, params.ProxyParam);
     CopyCache(own, params.CacheParam);
 
-    if (!LoadAuthorities(session)) return ZV_WS_Status_ssl_error;
+    if (!LoadAuthorities(session, *deployment)) return ZV_WS_Status_ssl_error;
     own.ServiceBaseURL =
         ZVUtilities::QueryServiceBaseURL(params.Type, &session.m_Stream, own.DestinationUniqueID.c_str(),
                                          own.DestinationTypeID, params.EnvNum, own.EnvID);
@@ -236,12 +239,12 @@ ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* pa
 {
     ZV_ASSERT(handle != 0);
     ZV_ASSERT(params != 0);
-    return GuardCall([&] {
+    const ZV_WS_Status status = GuardCall([&] {
         MakeEmptySession(*handle);
-        const ZV_WS_Status status = Initialize(handle, *params);
-        if (status != ZV_WS_Status_ok && status != ZV_WS_Status_ssl_error) ZV_WS_release(handle);
-        return status;
+        return Initialize(handle, *params);
     });
+    if (status != ZV_WS_Status_ok && status != ZV_WS_Status_ssl_error) ZV_WS_release(handle);
+    return status;
 }
 
 ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* source)
@@ -253,7 +256,8 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
     return GuardCall([&] {
         MakeEmptySession(*newHandle);
         SessionImpl& session = *newHandle->_pSessionImpl;
-        if (!LoadAuthorities(session)) return ZV_WS_Status_ssl_error;
+        const Deployment& deployment = source->_pSessionImpl->m_Browse.transport().deployment();
+        if (!LoadAuthorities(session, deployment)) return ZV_WS_Status_ssl_error;
         session.m_Params = source->_pSessionImpl->m_Params;
         SetParams(session);
         InitFacade(session);

@@ -5,9 +5,12 @@
 #include <sys/socket.h>
 #include <time.h>
 
+#include <algorithm>
+
 #include "Namespaces.h"
 #include "ReadLimits.h"
 #include "Tls.h"
+#include "ZVUtilities.h"
 
 namespace {
 
@@ -59,7 +62,6 @@ SigpipeGuard::~SigpipeGuard()
 
 Transport::Transport(soap& context)
     : m_Soap(context),
-      m_Deployment(&Deployment::Current()),
       m_Open(context.fopen),
       m_Send(context.fsend),
       m_Receive(context.frecv),
@@ -71,6 +73,7 @@ Transport::Transport(soap& context)
     context.fopen = OpenHook;
     context.fsend = SendHook;
     context.frecv = ReceiveHook;
+    context.fpreparerecv = PreparedHook;
     context.fposthdr = HeaderHook;
     context.fshutdownsocket = ShutdownHook;
     context.cookie_max = 0;
@@ -85,10 +88,10 @@ Transport::~Transport()
     ForgetTls();
 }
 
-bool Transport::LoadAuthorities()
+bool Transport::LoadAuthorities(const Deployment& deployment)
 {
-    m_Deployment = &Deployment::Current();
-    return Tls::LoadAuthorities(m_Deployment->ca_file);
+    m_Deployment = &deployment;
+    return Tls::LoadAuthorities(deployment.ca_file);
 }
 
 bool Transport::UseHost(const char* url)
@@ -98,7 +101,7 @@ bool Transport::UseHost(const char* url)
     if (m_Soap.ctx && host == m_TlsHost) return true;
     Close();
     ForgetTls();
-    m_Soap.ctx = Tls::ContextFor(m_Deployment->ca_file, host);
+    m_Soap.ctx = Tls::ContextFor(deployment().ca_file, host);
     m_TlsHost = host;
     return m_Soap.ctx != nullptr;
 }
@@ -121,11 +124,19 @@ void Transport::SetTimeouts(int sendSeconds, int receiveSeconds)
 
 void Transport::BeginExchange()
 {
+    m_Begun = ZVUtilities::MillisecondTime();
     m_Connected = false;
     m_Received = 0;
     m_Soap.start = static_cast<ULONG64>(time(nullptr));  // of transfer_timeout; the runtime sets it for SOAP alone
     m_SentSecrets.Restart();
     m_ReceivedSecrets.Restart();
+}
+
+bool Transport::KeptConnectionDied() const
+{
+    const uint64_t shortestTimeout =
+        1000ull * static_cast<unsigned int>(std::min(m_Soap.send_timeout, m_Soap.recv_timeout));
+    return !m_Connected && m_Received == 0 && ZVUtilities::MillisecondTime() - m_Begun < shortestTimeout;
 }
 
 void Transport::EndExchange(int result)
@@ -166,8 +177,13 @@ size_t Transport::ReceiveHook(soap* context, char* buffer, size_t size)
     Transport& self = Of(context);
     const size_t received = self.m_Receive(context, buffer, size);
     self.m_Received += received;
-    TrafficLog::Received(self.m_ReceivedSecrets, buffer, received);
     return received;
+}
+
+int Transport::PreparedHook(soap* context, const char* data, size_t length)
+{
+    TrafficLog::Received(Of(context).m_ReceivedSecrets, data, length);
+    return SOAP_OK;
 }
 
 int Transport::HeaderHook(soap* context, const char* key, const char* value)

@@ -5,6 +5,7 @@
 #pragma once
 
 #include <signal.h>
+#include <stdint.h>
 #include <stdsoap2.h>
 
 #include "Deployment.h"
@@ -35,8 +36,9 @@ public:
 
     static Transport& Of(soap* context) { return *static_cast<Transport*>(context->user); }
 
-    /// Loads the certificate authorities of the current deployment. False when they cannot be loaded.
-    bool LoadAuthorities();
+    /// Loads the certificate authorities of the deployment, which lives as long as the process. False when they cannot
+    /// be loaded.
+    bool LoadAuthorities(const Deployment& deployment);
 
     /// Gets the context ready for connections to the URL's host: its TLS context for "https:". False when there is
     /// none.
@@ -50,7 +52,7 @@ public:
 
     /// True when the exchange went over a connection kept from an earlier one and no byte of an answer came: the peer
     /// may have closed it before it saw the request.
-    bool KeptConnectionDied() const { return !m_Connected && m_Received == 0; }
+    bool KeptConnectionDied() const;
 
     /// After an exchange with the SOAP runtime's result: keeps the connection only when the answer was whole and
     /// nothing is left over.
@@ -59,22 +61,25 @@ public:
     /// Closes the connection at once, without waiting for the peer.
     void Close();
 
-    const Deployment& deployment() const { return *m_Deployment; }
+    /// The one whose authorities were loaded; the current one before.
+    const Deployment& deployment() const { return m_Deployment ? *m_Deployment : Deployment::Current(); }
     soap& context() { return m_Soap; }
 
 private:
     static SOAP_SOCKET OpenHook(soap* context, const char* endpoint, const char* host, int port);
     static int SendHook(soap* context, const char* data, size_t length);
     static size_t ReceiveHook(soap* context, char* buffer, size_t size);
+    static int PreparedHook(soap* context, const char* data, size_t length);
     static int HeaderHook(soap* context, const char* key, const char* value);
     static int ShutdownHook(soap* context, SOAP_SOCKET socket, int how);
 
     void ForgetTls();
 
     soap& m_Soap;
-    const Deployment* m_Deployment;
+    const Deployment* m_Deployment = nullptr;
     ZVString m_TlsHost;
     ZVString m_UserAgent;
+    uint64_t m_Begun = 0;  // of the exchange, by ZVUtilities::MillisecondTime
     bool m_Connected = false;
     size_t m_Received = 0;
     SecretFilter m_SentSecrets;

@@ -35,11 +35,18 @@ bool ReadFlags(const SessionImpl& session, const int* titleIDs, ZV_WS_TitlesInWi
     return true;
 }
 
-void WriteFlags(const SessionImpl& session, const int* titleIDs, const ZV_WS_TitlesInWishlist& answers)
+// Keeps what was found out. A list narrowed to a type tells nothing of the titles that it leaves out.
+void WriteFlags(const SessionImpl& session, const int* titleIDs, const ZV_WS_TitlesInWishlist& answers,
+                bool isWholeList)
 {
-    const bool* flags = answers.IsAvailInUserWishlist;
-    session.m_Cache->WriteWishlistFlags(ZVWS_IntVector(titleIDs, titleIDs + answers.size),
-                                        ZVWS_BoolVector(flags, flags + answers.size));
+    ZVWS_IntVector titles;
+    ZVWS_BoolVector flags;
+    for (unsigned int i = 0; i < answers.size; ++i) {
+        if (!isWholeList && !answers.IsAvailInUserWishlist[i]) continue;
+        titles.push_back(titleIDs[i]);
+        flags.push_back(answers.IsAvailInUserWishlist[i]);
+    }
+    session.m_Cache->WriteWishlistFlags(titles, flags);
 }
 
 // The titles of the whole list.
@@ -118,7 +125,7 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
         if (!handle || !handle->_pSessionImpl || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
         const SessionImpl& session = *handle->_pSessionImpl;
         Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
-        if (session.m_Cache && ReadFlags(session, titleIDs, *answers)) return ZV_WS_Status_ok;
+        if (count == 0 || (session.m_Cache && ReadFlags(session, titleIDs, *answers))) return ZV_WS_Status_ok;
         std::set<int> wished;
         const ZV_WS_Status status = ReadList(handle, typeFilter, wished);
         if (status != ZV_WS_Status_ok) {
@@ -127,7 +134,7 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
         }
         std::transform(titleIDs, titleIDs + count, answers->IsAvailInUserWishlist,
                        [&](int titleID) { return wished.count(titleID) != 0; });
-        if (session.m_Cache) WriteFlags(session, titleIDs, *answers);
+        if (session.m_Cache) WriteFlags(session, titleIDs, *answers, typeFilter == TITLE_TYPE_FILTER_ANY);
         return ZV_WS_Status_ok;
     });
 }

@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <new>
 
 #include "ZV_LogImpl.h"
 
@@ -90,17 +91,25 @@ void ZV_Log::Emit(const ZVString& line, unsigned int length)
     if (m_Target) m_Target(line.c_str(), length, m_User);
 }
 
+// A line for which there is no memory is dropped, like every line that cannot be written.
 void ZV_Log::Output(int id, int severity, const char* text)
 {
-    if (WouldOutput(id, severity)) Emit(LineStart(id) + text, 0);
+    if (!WouldOutput(id, severity)) return;
+    try {
+        Emit(LineStart(id) + text, 0);
+    } catch (const std::bad_alloc&) {
+    }
 }
 
 void ZV_Log::Output(int id, int severity, const char* text, unsigned int length)
 {
     if (!WouldOutput(id, severity)) return;
-    ZVString line = LineStart(id);
-    line.append(text, length);
-    Emit(line, static_cast<unsigned int>(line.length()));
+    try {
+        ZVString line = LineStart(id);
+        line.append(text, length);
+        Emit(line, static_cast<unsigned int>(line.length()));
+    } catch (const std::bad_alloc&) {
+    }
 }
 
 // ---- Targets

@@ -690,7 +690,7 @@ ZV_WS_Status ZV_WS_getTHXMediaDirectorBonusAsset(ZV_WS_Session* handle, int bonu
                                                  ZV_WS_BonusAssetType bonusAssetType,
                                                  ZV_WS_THXMediaDirectorResponse* data);
 
-/// Tell the service of a timeout or an error that the device has met.
+/// Diagnostic: ask the service to answer with a timeout, or with an error, to see a client's own way with it.
 ZV_WS_Status ZV_WS_returnTimeout(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
 ZV_WS_Status ZV_WS_returnError(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
 
@@ -733,7 +733,7 @@ ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime);
 
 /// The download rate in bits per second, measured on at most 200 KiB; 0 on failure. The file's address is asked once
 /// per session (ZV_WS_getConfig, whose failures are returned). Others: connection_error; net_error;
-/// bandwidth_file_not_found (404); bandwidth_url_not_found and invalid_bandwidth_url for the address.
+/// file_not_found_on_server; failed_to_get_bandwidth_check_url and invalid_bandwidth_check_url for the address.
 ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSecond);
 
 /// The device's IPv4 address as text: its only one, or that of a connection to the service.
