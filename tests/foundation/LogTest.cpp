@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <regex>
 #include <string>
 #include <thread>
 #include <vector>
@@ -43,8 +42,11 @@ TEST_F(LogTest, ALineHasTimeAndArea)
     ZV_LogOutput(id, ZV_LOG_TRACE, "%s-%d\n", "text", 5);
     ZV_LogOutputwithLen(id, ZV_LOG_TRACE, "a\0b??", 3);
     ASSERT_EQ(2u, m_Lines.size());
-    EXPECT_TRUE(std::regex_match(m_Lines[0].text, std::regex("\\[\\d\\d:\\d\\d:\\d\\d\\.\\d{3}-form\\] text-5\n")))
-        << m_Lines[0].text;
+    std::string form = m_Lines[0].text;
+    for (char& c : form) {
+        if (isdigit(static_cast<unsigned char>(c))) c = '9';
+    }
+    EXPECT_EQ("[99:99:99.999-form] text-9\n", form);
     EXPECT_EQ(0u, m_Lines[0].length) << "a text that ends at its NUL";
     EXPECT_EQ(std::string("-form] a\0b", 10), m_Lines[1].text.substr(m_Lines[1].text.size() - 10));
     EXPECT_EQ(m_Lines[1].text.size(), m_Lines[1].length);
