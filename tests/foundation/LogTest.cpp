@@ -71,13 +71,12 @@ TEST_F(LogTest, PrintsWhatTheAreaLetsThrough)
 {
     const int id = Register("filter");
     const struct {
-        bool active;
         int mask, severity;
-        bool prints;
+        bool active, prints;
     } rows[] = {
-        {true, -1, ZV_LOG_VERBOSE, true},         {true, 5, ZV_LOG_TRACE, true},  {true, 5, ZV_LOG_ERROR, true},
-        {true, 5, ZV_LOG_VERBOSE, false},         {true, 0, ZV_LOG_ERROR, false}, {false, -1, ZV_LOG_ERROR, false},
-        {true, ZV_LOG_VERBOSE, 0x7fffffff, true}, {true, -1, 0, false},
+        {-1, ZV_LOG_VERBOSE, true, true},         {5, ZV_LOG_TRACE, true, true},  {5, ZV_LOG_ERROR, true, true},
+        {5, ZV_LOG_VERBOSE, true, false},         {0, ZV_LOG_ERROR, true, false}, {-1, ZV_LOG_ERROR, false, false},
+        {ZV_LOG_VERBOSE, 0x7fffffff, true, true}, {-1, 0, true, false},
     };
     for (const auto& row : rows) {
         ZV_LogActivateArea(id, row.active);
@@ -159,6 +158,7 @@ TEST_F(LogTest, LinesOfSeveralThreadsStayWhole)
 {
     constexpr int kThreads = 4, kLines = 200;
     std::vector<std::thread> threads;
+    threads.reserve(kThreads);
     for (int t = 0; t < kThreads; ++t) {
         threads.emplace_back([t] {
             const int id = Register(t % 2 ? "threads1" : "threads0");
