@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <regex>
 #include <string>
 #include <thread>
 #include <vector>
@@ -43,8 +42,11 @@ TEST_F(LogTest, ALineHasTimeAndArea)
     ZV_LogOutput(id, ZV_LOG_TRACE, "%s-%d\n", "text", 5);
     ZV_LogOutputwithLen(id, ZV_LOG_TRACE, "a\0b??", 3);
     ASSERT_EQ(2u, m_Lines.size());
-    EXPECT_TRUE(std::regex_match(m_Lines[0].text, std::regex("\\[\\d\\d:\\d\\d:\\d\\d\\.\\d{3}-form\\] text-5\n")))
-        << m_Lines[0].text;
+    std::string form = m_Lines[0].text;
+    for (char& c : form) {
+        if (isdigit(static_cast<unsigned char>(c))) c = '9';
+    }
+    EXPECT_EQ("[99:99:99.999-form] text-9\n", form);
     EXPECT_EQ(0u, m_Lines[0].length) << "a text that ends at its NUL";
     EXPECT_EQ(std::string("-form] a\0b", 10), m_Lines[1].text.substr(m_Lines[1].text.size() - 10));
     EXPECT_EQ(m_Lines[1].text.size(), m_Lines[1].length);
@@ -69,13 +71,12 @@ TEST_F(LogTest, PrintsWhatTheAreaLetsThrough)
 {
     const int id = Register("filter");
     const struct {
-        bool active;
         int mask, severity;
-        bool prints;
+        bool active, prints;
     } rows[] = {
-        {true, -1, ZV_LOG_VERBOSE, true},         {true, 5, ZV_LOG_TRACE, true},  {true, 5, ZV_LOG_ERROR, true},
-        {true, 5, ZV_LOG_VERBOSE, false},         {true, 0, ZV_LOG_ERROR, false}, {false, -1, ZV_LOG_ERROR, false},
-        {true, ZV_LOG_VERBOSE, 0x7fffffff, true}, {true, -1, 0, false},
+        {-1, ZV_LOG_VERBOSE, true, true},         {5, ZV_LOG_TRACE, true, true},  {5, ZV_LOG_ERROR, true, true},
+        {5, ZV_LOG_VERBOSE, true, false},         {0, ZV_LOG_ERROR, true, false}, {-1, ZV_LOG_ERROR, false, false},
+        {ZV_LOG_VERBOSE, 0x7fffffff, true, true}, {-1, 0, true, false},
     };
     for (const auto& row : rows) {
         ZV_LogActivateArea(id, row.active);
@@ -157,6 +158,7 @@ TEST_F(LogTest, LinesOfSeveralThreadsStayWhole)
 {
     constexpr int kThreads = 4, kLines = 200;
     std::vector<std::thread> threads;
+    threads.reserve(kThreads);
     for (int t = 0; t < kThreads; ++t) {
         threads.emplace_back([t] {
             const int id = Register(t % 2 ? "threads1" : "threads0");

@@ -223,6 +223,7 @@ TEST(SerializerTest, RefusesWhatGrowsWithoutEnd)
             all += text;
         return all;
     };
+    const std::string useless = "<a>" + std::string(1020, 'x') + "</a>";
     const auto products = [&](size_t count) {
         return "<ZV1:AvailableProducts>" + repeated("<ZV1:ProductListing/>", count) + "</ZV1:AvailableProducts>";
     };
@@ -233,9 +234,9 @@ TEST(SerializerTest, RefusesWhatGrowsWithoutEnd)
     } rows[] = {
         {"as many products as an array may have", products(4096), true},
         {"one more", products(4097), false},
-        {"3 MiB of elements in each other", repeated("<a>", 1 << 19) + repeated("</a>", 1 << 19), true},
-        {"3 MiB of elements without use", repeated("<a/>", 3 << 18), true},
-        {"5 MiB of elements without use", repeated("<a/>", 5 << 18), false},
+        {"elements deep in each other", repeated("<a>", 100000) + repeated("</a>", 100000), true},
+        {"3 MiB of elements without use", repeated(useless.c_str(), 3 << 10), true},
+        {"5 MiB of elements without use", repeated(useless.c_str(), 5 << 10), false},
         {"3 MiB of blanks", std::string(3 << 20, ' '), true},
         {"5 MiB of blanks", std::string(5 << 20, ' '), false},
     };
