@@ -27,15 +27,13 @@ ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_P
 template <class Op>
 ZV_WS_Status IsTitlePurchased(const char* function, ZV_WS_Session* handle, int titleID, bool* isPurchased)
 {
-    ServiceCall<Op> call(function, handle, isPurchased);
-    if (!call.Accepts()) return call.Refusal();
-    call->TitleID = titleID;
-    return LogAnswer(function, call.Into(isPurchased), *isPurchased);
+    return LogAnswer(function, AskAbout<Op>(&Op::Request::TitleID, titleID, function, handle, isPurchased),
+                     *isPurchased);
 }
 
 bool Downloads(const ZV_WS_Session* handle)
 {
-    return handle && handle->_pSessionImpl && handle->_pSessionImpl->m_Params.AccessType == ACCESS_TYPE_DOWNLOAD;
+    return SessionOf(handle) && SessionOf(handle)->m_Params.AccessType == ACCESS_TYPE_DOWNLOAD;
 }
 
 }  // namespace
@@ -67,18 +65,14 @@ ZV_WS_Status ZV_WS_checkForPurchasedTitle(ZV_WS_Session* handle, int titleID, bo
 
 ZV_WS_Status ZV_WS_checkForPurchasedSku(ZV_WS_Session* handle, int skuID, bool* isPurchased)
 {
-    ServiceCall<Operation::checkForPurchasedStream> call(__func__, handle, isPurchased);
-    if (!call.Accepts()) return call.Refusal();
-    call->SkuID = skuID;
-    return LogAnswer(__func__, call.Into(isPurchased), *isPurchased);
+    using Op = Operation::checkForPurchasedStream;
+    return LogAnswer(__func__, AskAbout<Op>(&Op::Request::SkuID, skuID, __func__, handle, isPurchased), *isPurchased);
 }
 
 ZV_WS_Status ZV_WS_checkRentalExpiration(ZV_WS_Session* handle, int passID, ZV_WS_RentalExpirationResponse* expiration)
 {
-    ServiceCall<Operation::checkRentalExpiration> call(__func__, handle, expiration);
-    if (!call.Accepts()) return call.Refusal();
-    call->PassId = passID;
-    return call.Into(expiration);
+    return AskAbout<Operation::checkRentalExpiration>(&_ZV1__checkRentalExpiration::PassId, passID, __func__, handle,
+                                                      expiration);
 }
 
 ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* password, ZV_WS_StandardResponse* answer)
@@ -150,8 +144,5 @@ ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, cons
 
 ZV_WS_Status ZV_WS_calcOrderTax(ZV_WS_Session* handle, int skuID, ZV_WS_CalcOrderTaxResponse* tax)
 {
-    ServiceCall<Operation::calcOrderTax> call(__func__, handle, tax);
-    if (!call.Accepts()) return call.Refusal();
-    call->SKUID = skuID;
-    return call.Into(tax);
+    return AskAbout<Operation::calcOrderTax>(&_ZV1__calcOrderTax::SKUID, skuID, __func__, handle, tax);
 }

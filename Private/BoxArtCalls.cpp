@@ -145,7 +145,7 @@ ZV_WS_Status ZV_WS_getBoxArtImageData(ZV_WS_Session* handle, ZV_WS_BoxArtSize si
     ZV_ASSERT(image != 0);
     return GuardCall([&] {
         Records::Tag(*image);
-        if (!handle || !handle->_pSessionImpl || !IsPlainName(prefix)) return ZV_WS_Status_invalid_param;
+        if (!SessionOf(handle) || !IsPlainName(prefix)) return ZV_WS_Status_invalid_param;
         ZVString bytes;
         const ZV_WS_Status status = BoxArt(*handle->_pSessionImpl, size, prefix).BringBytes(bytes);
         if (status == ZV_WS_Status_ok) SetImageByData(*image, bytes);
@@ -158,7 +158,7 @@ ZV_WS_Status ZV_WS_getBoxArtImage(ZV_WS_Session* handle, ZV_WS_BoxArtSize size, 
     ZV_ASSERT(place != 0);
     return GuardCall([&] {
         Records::Tag(*place);
-        if (!handle || !handle->_pSessionImpl || !IsPlainName(prefix)) return ZV_WS_Status_invalid_param;
+        if (!SessionOf(handle) || !IsPlainName(prefix)) return ZV_WS_Status_invalid_param;
         SessionImpl& session = *handle->_pSessionImpl;
         BoxArt image(session, size, prefix);
         if (!image.HasFile()) {

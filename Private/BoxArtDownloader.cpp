@@ -94,10 +94,11 @@ ZV_WS_Status BoxArtDownloader::Fetch(const ZVString& path, const ZVString& ifMod
     const ZVString& host = m_Transport.deployment().image_host;
     RawHttp http(m_Transport);
     if (!http.Connect(ZVString("http://") + host + path)) return ZV_WS_Status_connection_error;
-    ZVString request = ZVString("GET ") + path + " HTTP/1.1\r\n";
-    if (!ifModifiedSince.empty()) request += ZVString("If-Modified-Since: ") + ifModifiedSince + "\r\n";
-    request += ZVString("User-Agent: ZVWSLib\r\nHost: ") + host + "\r\n\r\n";
-    if (!http.Send(request) || !http.ReceiveHead()) return ZV_WS_Status_net_error;
+    ZVString condition;
+    if (!ifModifiedSince.empty()) condition = ZVString("If-Modified-Since: ") + ifModifiedSince + "\r\n";
+    if (!http.SendGet(path, host, RawHttp::Order::AgentFirst, condition) || !http.ReceiveHead()) {
+        return ZV_WS_Status_net_error;
+    }
     if (!http.StatusIs("HTTP/1.1 200 OK")) {
         if (http.Holds("HTTP/1.1 404 Not Found")) return ZV_WS_Status_file_not_found_on_server;
         if (http.Holds("HTTP/1.1 304 Not Modified")) return ZV_WS_Status_file_not_modified_on_server;

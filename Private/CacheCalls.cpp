@@ -40,7 +40,7 @@ ZV_WS_Status ZV_WS_getLastCacheLoadTimeUTC(ZV_WS_Session* handle, ZV_WS_String* 
 
 ZV_WS_Status ZV_WS_updateLocalCache(ZV_WS_Session* handle, unsigned int operations)
 {
-    if (!handle || !handle->_pSessionImpl) return ZV_WS_Status_invalid_param;
+    if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
     const SessionImpl& session = *handle->_pSessionImpl;
     const auto wanted = [&](ZV_WS_CacheParam::CacheData kind) {
         return (operations & kind) != 0 && session.Caches(kind);

@@ -10,10 +10,7 @@ ZV_WS_Status ZV_WS_getNavigation(ZV_WS_Session* handle, ZV_WS_GenreArray* genres
 
 ZV_WS_Status ZV_WS_getGenreLabel(ZV_WS_Session* handle, int genreID, ZV_WS_GenreLabelResponse* label)
 {
-    ServiceCall<Operation::getGenreLabel> call(__func__, handle, label);
-    if (!call.Accepts()) return call.Refusal();
-    call->GenreID = genreID;
-    return call.Into(label);
+    return AskAbout<Operation::getGenreLabel>(&_ZV1__getGenreLabel::GenreID, genreID, __func__, handle, label);
 }
 
 ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pagination* page, int purchaseType,
@@ -43,48 +40,33 @@ ZV_WS_Status ZV_WS_getTitlesByGenreIDs(ZV_WS_Session* handle, const int* genreID
 
 ZV_WS_Status ZV_WS_getTitleListing(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponse* listing)
 {
-    ServiceCall<Operation::getTitleListing> call(__func__, handle, listing);
-    if (!call.Accepts()) return call.Refusal();
-    call.CacheAs(kMetadata, "getTitleListing", titleID);
-    call->TitleID = titleID;
-    return call.Into(listing);
+    return AskAbout<Operation::getTitleListing>(&_ZV1__getTitleListing::TitleID, titleID, __func__, handle, listing,
+                                                "getTitleListing");
 }
 
 ZV_WS_Status ZV_WS_getTvEpisodeListing(ZV_WS_Session* handle, int episodeID, ZV_WS_TitleListingResponse* listing)
 {
-    ServiceCall<Operation::getTvEpisodeListing> call(__func__, handle, listing);
-    if (!call.Accepts()) return call.Refusal();
-    call.CacheAs(kMetadata, "getTvEpisodeListing", episodeID);
-    call->EpisodeID = episodeID;
-    return call.Into(listing);
+    return AskAbout<Operation::getTvEpisodeListing>(&_ZV1__getTvEpisodeListing::EpisodeID, episodeID, __func__, handle,
+                                                    listing, "getTvEpisodeListing");
 }
 
 ZV_WS_Status ZV_WS_getTvEpisodeListByTitleID(ZV_WS_Session* handle, int titleID, ZV_WS_TvEpisodeListResponse* episodes)
 {
-    ServiceCall<Operation::getTvEpisodeListByTitleID> call(__func__, handle, episodes);
-    if (!call.Accepts()) return call.Refusal();
-    call.CacheAs(kMetadata, "getTvEpisodeListByTitleID", titleID);
-    call->TitleID = titleID;
-    return call.Into(episodes);
+    return AskAbout<Operation::getTvEpisodeListByTitleID>(&_ZV1__getTvEpisodeListByTitleID::TitleID, titleID, __func__,
+                                                          handle, episodes, "getTvEpisodeListByTitleID");
 }
 
 ZV_WS_Status ZV_WS_getAllTvEpisodeListings(ZV_WS_Session* handle, int titleID,
                                            ZV_WS_TitleListingResponseArray* listings)
 {
-    ServiceCall<Operation::getAllTvEpisodeListings> call(__func__, handle, listings);
-    if (!call.Accepts()) return call.Refusal();
-    call.CacheAs(kMetadata, "getAllTvEpisodeListings", titleID);
-    call->TitleID = titleID;
-    return call.Into(listings);
+    return AskAbout<Operation::getAllTvEpisodeListings>(&_ZV1__getAllTvEpisodeListings::TitleID, titleID, __func__,
+                                                        handle, listings, "getAllTvEpisodeListings");
 }
 
 ZV_WS_Status ZV_WS_translateSkuID(ZV_WS_Session* handle, int skuID, ZV_WS_TranslateSkuIDResponse* title)
 {
-    ServiceCall<Operation::translateSkuId> call(__func__, handle, title);
-    if (!call.Accepts()) return call.Refusal();
-    call.CacheAs(kMetadata, "translateSkuID", skuID);
-    call->SkuId = skuID;
-    return call.Into(title);
+    return AskAbout<Operation::translateSkuId>(&_ZV1__translateSkuId::SkuId, skuID, __func__, handle, title,
+                                               "translateSkuID");
 }
 
 ZV_WS_Status ZV_WS_translateTivoExternalID(ZV_WS_Session* handle, const char* externalID,
@@ -130,9 +112,6 @@ ZV_WS_Status ZV_WS_searchForTitleDetail(ZV_WS_Session* handle, const ZV_WS_Pagin
 
 ZV_WS_Status ZV_WS_getRecommendedTitles(ZV_WS_Session* handle, int titleID, ZV_WS_RecommendedTitlesResponse* titles)
 {
-    ServiceCall<Operation::getRecommendedTitles> call(__func__, handle, titles);
-    if (!call.Accepts()) return call.Refusal();
-    call.CacheAs(kMetadata, "getRecommendedTitles", titleID);
-    call->TitleId = titleID;
-    return call.Into(titles);
+    return AskAbout<Operation::getRecommendedTitles>(&_ZV1__getRecommendedTitles::TitleId, titleID, __func__, handle,
+                                                     titles, "getRecommendedTitles");
 }

@@ -42,10 +42,7 @@ const char* QueryServiceBaseURL(ContentType type, soap* context, const char* des
     RawHttp http(Transport::Of(context));
     if (!http.Connect(ZVString("https://") + host + path)) return "";
     int environment = ENVID_PRODUCTION;
-    if (http.Send(ZVString("GET ") + path + " HTTP/1.1\r\n" + "User-Agent: ZVWSLib\r\nHost: " + host + "\r\n\r\n") &&
-        http.ReceiveHead()) {
-        environment = EnvironmentIn(http);
-    }
+    if (http.SendGet(path, host, RawHttp::Order::AgentFirst) && http.ReceiveHead()) environment = EnvironmentIn(http);
     envID = static_cast<ZV_WS_EnvID>(environment);
     const char* url = deployment.BaseUrl(type, environment);
     printf("\n---> End-Point URL: %s <---\n\n", url);

@@ -20,6 +20,7 @@
 namespace {
 
 constexpr int kClockTimeout = 30;  // seconds
+const char kClockPath[] = "/device/time/";
 constexpr unsigned int kMostMeasured = 204800;
 // The service's data spells it without the second "d".
 const char kBandwidthKey[] = "BandwithCheckURL";
@@ -33,22 +34,6 @@ struct SoapDeleter {
         soap_free(context);
     }
 };
-
-// The parts of "scheme://host/path": empty where they are missing.
-void SplitUrl(const ZVString& url, ZVString& host, ZVString& path)
-{
-    size_t start = 0;
-    do {
-        start = url.find('/', start);
-        if (start == ZVString::npos) return;
-        ++start;
-    } while (start >= url.length() || url[start] != '/');
-    const ZVString rest = url.substr(start + 1);
-    const size_t slash = rest.find('/');
-    if (slash == ZVString::npos) return;
-    host = rest.substr(0, slash);
-    path = rest.substr(slash + 1);
-}
 
 // "3/7/2011 1:30:00 PM", as UTC. An hour of 12 gets its twelve more like the others.
 ZV_WS_Status ParseTime(const ZVString& text, time_t& time)
@@ -72,12 +57,12 @@ ZV_WS_Status ParseTime(const ZVString& text, time_t& time)
 
 ZV_WS_Status ReadClock(RawHttp& http, const ZVString& host, time_t& time)
 {
-    if (!http.Connect(ZVString("http://") + host + "/device/time/")) return ZV_WS_Status_connection_error;
-    const ZVString request =
-        ZVString("GET /device/time/ HTTP/1.1\r\nUser-Agent: ZVWSLib\r\nHost: ") + host + "\r\n\r\n";
+    if (!http.Connect(ZVString("http://") + host + kClockPath)) return ZV_WS_Status_connection_error;
     const char* body = nullptr;
     size_t received = 0;
-    if (!http.Send(request) || !http.ReceiveHead() || !http.StatusIs(kFound)) return ZV_WS_Status_net_error;
+    if (!http.SendGet(kClockPath, host, RawHttp::Order::AgentFirst) || !http.ReceiveHead() || !http.StatusIs(kFound)) {
+        return ZV_WS_Status_net_error;
+    }
     const unsigned int length = http.ContentLength();
     if (length < 1 || !http.BodyStart(body, received)) return ZV_WS_Status_net_error;
     if (length > received) return ZV_WS_Status_general_error;
@@ -142,9 +127,9 @@ ZV_WS_Status CheckBandwidth(ZV_WS_Session* handle, unsigned int& bitsPerSecond)
     if (host.empty() || path.empty()) return ZV_WS_Status_invalid_bandwidth_check_url;
     RawHttp http(session.m_Stream.transport());
     if (!http.Connect(url)) return ZV_WS_Status_connection_error;
-    const ZVString request =
-        ZVString("GET /") + path + " HTTP/1.1\r\nHost: " + host + "\r\nUser-Agent: ZVWSLib\r\n\r\n";
-    if (!http.Send(request) || !http.ReceiveHead()) return ZV_WS_Status_net_error;
+    if (!http.SendGet(ZVString("/") + path, host, RawHttp::Order::HostFirst) || !http.ReceiveHead()) {
+        return ZV_WS_Status_net_error;
+    }
     return Measure(http, bitsPerSecond);
 }
 
@@ -167,7 +152,7 @@ ZVString OnlyAddress()
 
 ZV_WS_Status AddressTowardsService(SessionImpl& session, ZVString& address)
 {
-    const ZVString url = session.m_Params.ServiceBaseURL + "RealTimeBrowse.asmx";
+    const ZVString& url = session.m_Browse.Endpoint();
     ZVString host, path;
     SplitUrl(url, host, path);
     if (host.empty()) return ZV_WS_Status_general_error;
@@ -196,7 +181,7 @@ ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSe
 {
     ZV_ASSERT(bitsPerSecond != 0);
     *bitsPerSecond = 0;
-    if (!handle || !handle->_pSessionImpl) return ZV_WS_Status_invalid_param;
+    if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
     return GuardCall([&] { return CheckBandwidth(handle, *bitsPerSecond); });
 }
 
@@ -205,7 +190,7 @@ ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address)
     ZV_ASSERT(address != 0);
     return GuardCall([&] {
         Records::Tag(*address);
-        if (!handle || !handle->_pSessionImpl) return ZV_WS_Status_invalid_param;
+        if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
         ZVString text = OnlyAddress();
         const ZV_WS_Status status =
             text.empty() ? AddressTowardsService(*handle->_pSessionImpl, text) : ZV_WS_Status_ok;

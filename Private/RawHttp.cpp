@@ -14,17 +14,17 @@ namespace {
 const char kLineEnd[] = "\r\n";
 const char kHeadEnd[] = "\r\n\r\n";
 
-// Splits "scheme://host[:port]..." for a connection.
-bool SplitUrl(const ZVString& url, ZVString& host, int& port)
-{
-    const bool tls = strncasecmp(url.c_str(), "https:", 6) == 0;
-    const char* start = strstr(url.c_str(), "//");
-    if (!start) return false;
-    start += 2;
-    return SplitHostPort(ZVString(start, strcspn(start, "/")), tls ? 443 : 80, host, port);
-}
-
 }  // namespace
+
+void SplitUrl(const ZVString& url, ZVString& host, ZVString& path)
+{
+    const char* start = strstr(url.c_str(), "//");
+    if (!start) return;
+    start += 2;
+    const size_t length = strcspn(start, "/");
+    host = ZVString(start, length);
+    if (start[length] == '/') path = start + length + 1;
+}
 
 RawHttp::RawHttp(Transport& transport) : m_Transport(transport)
 {
@@ -36,9 +36,11 @@ RawHttp::RawHttp(Transport& transport) : m_Transport(transport)
 
 bool RawHttp::Connect(const ZVString& url)
 {
-    ZVString host;
+    ZVString hostPort, path, host;
     int port = 0;
-    if (!SplitUrl(url, host, port) || !m_Transport.UseHost(url.c_str())) return false;
+    SplitUrl(url, hostPort, path);
+    const int standardPort = Transport::IsTls(url.c_str()) ? 443 : 80;
+    if (!SplitHostPort(hostPort, standardPort, host, port) || !m_Transport.UseHost(url.c_str())) return false;
     soap& context = m_Transport.context();
     context.error = SOAP_OK;
     m_Transport.BeginExchange();
@@ -46,8 +48,13 @@ bool RawHttp::Connect(const ZVString& url)
     return context.error == SOAP_OK && soap_valid_socket(context.socket);
 }
 
-bool RawHttp::Send(const ZVString& text)
+bool RawHttp::SendGet(const ZVString& path, const ZVString& host, Order order, const ZVString& more)
 {
+    const ZVString agentLine = "User-Agent: ZVWSLib\r\n";
+    const ZVString hostLine = ZVString("Host: ") + host + kLineEnd;
+    const bool agentFirst = order == Order::AgentFirst;
+    const ZVString text = ZVString("GET ") + path + " HTTP/1.1\r\n" + more + (agentFirst ? agentLine : hostLine) +
+                          (agentFirst ? hostLine : agentLine) + kLineEnd;
     soap& context = m_Transport.context();
     return context.fsend(&context, text.c_str(), text.length()) == SOAP_OK;
 }
@@ -81,7 +88,7 @@ bool RawHttp::StatusIs(const char* line) const
 
 bool RawHttp::Header(const char* name, ZVString& value) const
 {
-    const ZVString start = ZVString(name) + ": ";
+    const ZVString start = ZVString(kLineEnd) + name + ": ";
     const char* found = strstr(m_Head, start.c_str());
     if (!found) return false;
     found += start.length();

@@ -7,8 +7,15 @@
 
 #include "Transport.h"
 
+/// The host (with its port, when it has one) and the path without its first "/" of "scheme://host/path"; empty where
+/// missing.
+void SplitUrl(const ZVString& url, ZVString& host, ZVString& path);
+
 class RawHttp {
 public:
+    /// How the two header lines of a request follow each other; services have their own ideas.
+    enum class Order { AgentFirst, HostFirst };
+
     /// The most bytes that one receive takes.
     static constexpr size_t kPiece = 2048;
 
@@ -21,7 +28,8 @@ public:
     /// "https:".
     bool Connect(const ZVString& url);
 
-    bool Send(const ZVString& text);
+    /// Sends "GET path" with the two header lines, and before them `more` whole ones. False when it cannot be sent.
+    bool SendGet(const ZVString& path, const ZVString& host, Order order, const ZVString& more = ZVString());
 
     /// Receives once, at most 2047 bytes: the answer's head, perhaps with the start of its body. False when nothing
     /// came.

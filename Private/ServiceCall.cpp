@@ -5,7 +5,7 @@
 ZV_LOG_AREA(ZVWS_SoapProxyLOG_AREA_NAME)
 
 ServiceCallBase::ServiceCallBase(const char* function, const ZV_WS_Session* handle)
-    : m_Function(function), m_Session(handle ? handle->_pSessionImpl : nullptr)
+    : m_Function(function), m_Session(SessionOf(handle))
 {}
 
 void ServiceCallBase::LogProxy(const char* verb, const char* proxy, const char* operation)

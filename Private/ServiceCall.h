@@ -170,6 +170,19 @@ ZV_WS_Status Ask(const char* function, const ZV_WS_Session* handle, Output* out,
     return call.Into(out);
 }
 
+/// A whole call of an operation whose only argument is a number; `child` is the request's. Kept in the cache among the
+/// catalogue's answers when a table is named.
+template <class Op, class Output>
+ZV_WS_Status AskAbout(int Op::Request::*child, int id, const char* function, const ZV_WS_Session* handle, Output* out,
+                      const char* table = nullptr)
+{
+    ServiceCall<Op> call(function, handle, out);
+    if (!call.Accepts()) return call.Refusal();
+    if (table) call.CacheAs(ZV_WS_CacheParam::CacheData_Metadata, table, id);
+    (call.operator->())->*child = id;
+    return call.Into(out);
+}
+
 /// Fills the children by which all requests for a page name it.
 template <class Call>
 void SetPage(Call& call, const ZV_WS_Pagination& page)

@@ -222,7 +222,7 @@ ZV_WS_Status WithSession(const ZV_WS_Session* handle, Output* out, Use use)
     ZV_ASSERT(out != 0);
     return GuardCall([&] {
         if constexpr (Records::kIsRecord<Output>) Records::Tag(*out);
-        if (!handle || !handle->_pSessionImpl) return ZV_WS_Status_invalid_param;
+        if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
         return use(*handle->_pSessionImpl);
     });
 }
@@ -252,7 +252,7 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
     ZV_ASSERT(newHandle != 0);
     newHandle->_pImpl = nullptr;
     newHandle->_pSessionImpl = nullptr;
-    if (!source || !source->_pSessionImpl) return ZV_WS_Status_invalid_param;
+    if (!SessionOf(source)) return ZV_WS_Status_invalid_param;
     return GuardCall([&] {
         MakeEmptySession(*newHandle);
         SessionImpl& session = *newHandle->_pSessionImpl;

@@ -21,3 +21,9 @@ struct SessionImpl {
     /// Whether there is a cache for that kind of data.
     bool Caches(ZV_WS_CacheParam::CacheData kind) const { return m_Cache && (m_Params.CacheData & kind) != 0; }
 };
+
+/// The session behind a handle; null when there is none.
+inline SessionImpl* SessionOf(const ZV_WS_Session* handle)
+{
+    return handle ? handle->_pSessionImpl : nullptr;
+}

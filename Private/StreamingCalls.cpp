@@ -32,10 +32,8 @@ ZV_WS_Status ZV_WS_loadLastStreamingAssetLocation(ZV_WS_Session* handle, int pas
 ZV_WS_Status ZV_WS_getStreamingBonusAssetLocation(ZV_WS_Session* handle, int bonusAssetID,
                                                   ZV_WS_StreamingAssetLocationResponse* location)
 {
-    ServiceCall<Operation::getBonusAssetLocation> call(__func__, handle, location);
-    if (!call.Accepts()) return call.Refusal();
-    call->BonusAssetID = bonusAssetID;
-    return call.Into(location);
+    return AskAbout<Operation::getBonusAssetLocation>(&_ZV1__getBonusAssetLocation::BonusAssetID, bonusAssetID,
+                                                      __func__, handle, location);
 }
 
 ZV_WS_Status ZV_WS_manageStreamingInstanceStatus(ZV_WS_Session* handle, const char* streamID, ZV_WS_StreamStatus status,

@@ -8,6 +8,7 @@
 #include <algorithm>
 
 #include "Namespaces.h"
+#include "RawHttp.h"
 #include "ReadLimits.h"
 #include "Tls.h"
 #include "ZVUtilities.h"
@@ -20,20 +21,6 @@ constexpr int kReceiveSeconds = 88;
 
 // The toolkit's own text, sent by a session without a user agent.
 const char kToolkitAgent[] = "gSOAP/2.7";
-
-bool IsTls(const char* url)
-{
-    return strncasecmp(url, "https:", 6) == 0;
-}
-
-// The host of "scheme://host[:port]/...".
-ZVString HostOf(const char* url)
-{
-    const char* start = strstr(url, "//");
-    if (!start) return ZVString();
-    start += 2;
-    return ZVString(start, strcspn(start, ":/"));
-}
 
 }  // namespace
 
@@ -97,7 +84,9 @@ bool Transport::LoadAuthorities(const Deployment& deployment)
 bool Transport::UseHost(const char* url)
 {
     if (!IsTls(url)) return true;
-    const ZVString host = HostOf(url);
+    ZVString host, path;
+    SplitUrl(url, host, path);
+    host = host.substr(0, host.find(':'));
     if (m_Soap.ctx && host == m_TlsHost) return true;
     Close();
     ForgetTls();

@@ -7,6 +7,7 @@
 #include <signal.h>
 #include <stdint.h>
 #include <stdsoap2.h>
+#include <strings.h>
 
 #include "Deployment.h"
 #include "TrafficLog.h"
@@ -34,6 +35,7 @@ public:
     Transport(const Transport&) = delete;
     Transport& operator=(const Transport&) = delete;
 
+    static bool IsTls(const char* url) { return strncasecmp(url, "https:", 6) == 0; }
     static Transport& Of(soap* context) { return *static_cast<Transport*>(context->user); }
 
     /// Loads the certificate authorities of the deployment, which lives as long as the process. False when they cannot

@@ -122,7 +122,7 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
     ZV_ASSERT(answers != 0);
     return GuardCall([&] {
         Records::Tag(*answers);
-        if (!handle || !handle->_pSessionImpl || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
+        if (!SessionOf(handle) || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
         const SessionImpl& session = *handle->_pSessionImpl;
         Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
         if (count == 0 || (session.m_Cache && ReadFlags(session, titleIDs, *answers))) return ZV_WS_Status_ok;

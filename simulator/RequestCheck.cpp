@@ -93,8 +93,9 @@ std::string Unbase64(const std::string& text)
     const int length =
         EVP_DecodeBlock(reinterpret_cast<unsigned char*>(&bytes[0]),
                         reinterpret_cast<const unsigned char*>(text.data()), static_cast<int>(text.size()));
-    if (length < 0) return "";
-    bytes.resize(static_cast<size_t>(length) - static_cast<size_t>(std::count(text.begin(), text.end(), '=')));
+    const auto padding = std::count(text.begin(), text.end(), '=');
+    if (length < padding || padding > 2) return "";
+    bytes.resize(static_cast<size_t>(length - padding));
     return bytes;
 }
 
