@@ -199,7 +199,7 @@ std::string CheckChildren(const Node& body, const OperationRow& operation, Argum
     size_t at = 0;
     for (const Child& wanted : operation.children) {
         if (at < children.size() && children[at].Is(kService, wanted.name)) {
-            const std::string wrong = CheckValue(wanted, children[at++], arguments);
+            std::string wrong = CheckValue(wanted, children[at++], arguments);
             if (!wrong.empty()) return wrong;
         } else if (wanted.type == ChildType::IntArray) {
             arguments.arrays[wanted.name];

@@ -82,9 +82,13 @@ void PrintHelp()
     printf(
         "Control, on the plain HTTP port: POST /control/faults (a fault a line), GET and DELETE /control/faults,\n"
         "GET /control/log (a JSON object a line), DELETE /control/log.\n\n"
-        "Not checked: whether a device is activated before it buys, the value of AuthToken in the device settings, the "
-        "user\n"
-        "agent's text, unused namespace declarations, and anything behind the addresses of streams and licences.\n");
+        "Not checked: which device asks (any DestinationUniqueID and type will do), whether it is activated before it "
+        "buys, the\n"
+        "value of AuthToken in the device settings, the user agent's text, unused namespace declarations, and anything "
+        "behind\n"
+        "the addresses of streams and licences. Header blocks that the client has no use for (RelatesTo, From, "
+        "FaultTo) are\n"
+        "refused, and so are the operations that it never calls.\n");
 }
 
 // 0 to go on, else the exit code (-1: help was printed).

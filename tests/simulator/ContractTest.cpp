@@ -134,7 +134,7 @@ std::string NameOf(const xmlNode* node)
 std::string TextOf(const xmlNode* node)
 {
     xmlChar* text = xmlNodeGetContent(node);
-    const std::string copy = reinterpret_cast<const char*>(text);
+    std::string copy = reinterpret_cast<const char*>(text);
     xmlFree(text);
     return copy;
 }

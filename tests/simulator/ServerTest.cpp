@@ -4,7 +4,7 @@
 #include <atomic>
 #include <chrono>
 #include <filesystem>
-#include <fstream>
+#include <list>
 #include <thread>
 
 #include "RawClient.h"
@@ -156,7 +156,7 @@ TEST_F(ServerTest, TheEndDoesNotWaitForConnections)
 TEST_F(ServerTest, ManyConnectionsAtOnce)
 {
     Begin();
-    std::vector<std::thread> threads;
+    std::list<std::thread> threads;
     std::atomic<int> good{0};
     for (int i = 0; i < 8; ++i) {
         threads.emplace_back([&] {
