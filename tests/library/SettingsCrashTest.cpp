@@ -1,7 +1,9 @@
 // Settings under processes that die and processes that write at once.
+#include <limits.h>
 #include <signal.h>
 #include <time.h>
 
+#include <algorithm>
 #include <random>
 
 #include "SettingsFolder.h"
@@ -10,61 +12,63 @@ namespace {
 
 class SettingsCrash : public SettingsFolder {};
 
+// Odd numbers are written to a plain setting, even ones to a protected one.
+const char* KeyOf(int number)
+{
+    return number % 2 ? "Plain" : "Secret";
+}
+
 // Writes one number after the other, each reported to the pipe once its write is complete.
 int WriteOn(const std::string& path, int from, int report)
 {
     CfgXMLFile settings(ZVString(path.c_str()));
     for (int number = from;; ++number) {
-        const std::string text = std::to_string(number);
-        if (settings.Write("Plain", text.c_str(), false) != 0 || settings.Write("Secret", text.c_str(), true) != 0)
-            return 1;
+        if (settings.Write(KeyOf(number), std::to_string(number).c_str(), number % 2 == 0) != 0) return 1;
         if (write(report, &number, sizeof number) != sizeof number) return 2;
     }
 }
 
-// The pipe's writer is dead, so that it ends behind the last report.
-int LastReport(int reports, int before)
+// Takes at most `count` reports; they end behind the last one of a dead writer.
+void TakeReports(int reports, int count, int& completed)
 {
-    int number = before;
-    while (read(reports, &number, sizeof number) == sizeof number) {
-    }
-    return number;
+    int number;
+    while (count-- > 0 && read(reports, &number, sizeof number) == sizeof number)
+        completed = number;
 }
 
 TEST_F(SettingsCrash, AKilledWriterLosesNoCompletedWrite)
 {
+    const int kRounds = 300;
     ASSERT_EQ(0u, Write("Beside", "stays", true));
+    ASSERT_EQ(0u, Write("Plain", "0"));
+    ASSERT_EQ(0u, Write("Secret", "0", true));
     std::mt19937 random(20110413);  // fixed: what varies from run to run is the disk
-    std::uniform_int_distribution<long> delay(0, 8000000);
-    int last = 0;
-    int advanced = 0;
-    for (int round = 0; round < 500; ++round) {
+    std::uniform_int_distribution<long> delay(0, 20000000);
+    int completed = 0;
+    for (int round = 0; round < kRounds; ++round) {
         int ends[2];
         ASSERT_EQ(0, pipe(ends));
-        const pid_t child = Fork([&] { return WriteOn(file, last + 1, ends[1]); });
+        const pid_t child = Fork([&] { return WriteOn(file, completed + 1, ends[1]); });
         close(ends[1]);
-        const timespec pause = {0, delay(random)};  // the moment of death, anywhere in a write
+        TakeReports(ends[0], round % 4, completed);
+        const timespec pause = {0, delay(random)};  // the moment of death, anywhere in the write that follows
         nanosleep(&pause, nullptr);
         kill(child, SIGKILL);
         EXPECT_EQ(-SIGKILL, Wait(child));
-        const int completed = LastReport(ends[0], last);
+        TakeReports(ends[0], INT_MAX, completed);
         close(ends[0]);
 
-        std::string plain = "0", secret = "0", beside;
-        const unsigned int results[] = {Read("Plain", plain), Read("Secret", secret, true)};
-        if (completed > 0) {
-            ASSERT_EQ(0u, results[0]) << Get(file);
-            ASSERT_EQ(0u, results[1]) << Get(file);
-        }
-        EXPECT_EQ(0u, Read("Beside", beside, true));
+        std::string plain, secret, beside;
+        ASSERT_EQ(0u, Read("Plain", plain)) << Get(file);
+        ASSERT_EQ(0u, Read("Secret", secret, true)) << Get(file);
+        ASSERT_EQ(0u, Read("Beside", beside, true)) << Get(file);
         ASSERT_EQ("stays", beside);
-        ASSERT_GE(atoi(plain.c_str()), completed);
-        ASSERT_GE(atoi(secret.c_str()), completed);
-        ASSERT_LE(atoi(plain.c_str()), completed + 1) << "only the write under way may be there, too";
-        if (completed > last) ++advanced;
-        last = completed;
+        const int stored[] = {atoi(secret.c_str()), atoi(plain.c_str())};
+        ASSERT_GE(stored[completed % 2], completed);
+        ASSERT_GE(stored[(completed + 1) % 2], completed - 1);
+        ASSERT_LE(std::max(stored[0], stored[1]), completed + 1) << "only the write under way may be there, too";
     }
-    EXPECT_GT(advanced, 50) << "the writers were killed before they did anything";
+    EXPECT_GE(completed, kRounds) << "the writers were killed before they did anything";
     // The folder holds nothing of the dead but what the next write takes away.
     ASSERT_EQ(0u, Write("Plain", "end"));
     size_t files = 0;
