@@ -15,7 +15,7 @@
 namespace {
 
 constexpr uint64_t kLockPatience = 5000;  // milliseconds; a writer holds the lock for one small file
-constexpr useconds_t kLockPause = 5000;   // microseconds
+constexpr useconds_t kLockPause = 1000;   // microseconds; flock itself cannot wait for a limited time
 
 ZVString Target(const ZVString& path)
 {
