@@ -91,6 +91,7 @@ TEST_F(SettingsCrash, WritersAtOnceLoseNothingOfEachOther)
 {
     const int kWriters = 4, kWrites = 40;
     std::vector<pid_t> writers;
+    writers.reserve(kWriters);
     for (int writer = 0; writer < kWriters; ++writer) {
         writers.push_back(Fork([&] {
             for (int i = 0; i < kWrites; ++i) {

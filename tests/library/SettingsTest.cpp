@@ -421,7 +421,7 @@ TEST_F(Settings, StatusesOfTheCalls)
         ZV_WS_String value;
         const ZV_WS_Status status = ZV_WS_readSetting(path, key, isProtected, &value);
         EXPECT_EQ(status == ZV_WS_Status_ok, value.data != nullptr);
-        const std::string text = std::to_string(status) + ":" + (value.data ? value.data : "");
+        std::string text = std::to_string(status) + ":" + (value.data ? value.data : "");
         ZV_WS_release(&value);
         return text;
     };
