@@ -750,3 +750,29 @@ ZV_WS_Status ZV_WS_folderExist(const char* path, bool* exists);
 /// Makes the missing folders above, too.
 ZV_WS_Status ZV_WS_createFolder(const char* path);
 ZV_WS_Status ZV_WS_fileExist(const char* path, bool* exists);
+
+// ---- Settings: key/value pairs in a small XML file, some of the values enciphered with the device's own key. No
+// session; any thread, any number of processes on one file. The calls block on the disk only, writers of one folder
+// also on each other (at most 5 s).
+//
+// ZV_WS_Status_invalid_param for a null argument, an empty path and an empty key. ZV_WS_Status_setting_invalid_value as
+// said for each call. ZV_WS_Status_file_operation_error when the file cannot be read or written, is larger than 1 MiB,
+// or, for a protected value, when the device key (docs/deployment.md) is missing.
+
+/// The value of a key, never null on success; "" when the key has no value. Others: setting_key_not_found, also for a
+/// file that is empty or no settings file; setting_invalid_value for a protected value that was changed from outside,
+/// was stored under another key or by another device, or was never protected.
+ZV_WS_Status ZV_WS_readSetting(const char* path, const char* key, bool protectedValue, ZV_WS_String* value);
+
+/// Changes the key's value or adds it; makes the file when there is none, but no folder. Once it has succeeded the
+/// value is on the disk; when it fails, or the process dies in it, the file is what it was or is whole with the new
+/// value. A file that is not empty and no settings file is left alone (file_operation_error). Key and value are UTF-8:
+/// setting_invalid_value for characters that XML cannot hold; a protected value may be any bytes.
+ZV_WS_Status ZV_WS_writeSetting(const char* path, const char* key, const char* value, bool protectedValue);
+
+/// Keeps the environment that a device is set to in a file of its own, of the same format, under the key "EnvNum" in
+/// decimal. The library never reads it: a movie passes the value to the set-up where it would pass ENVNUM_DEFAULT.
+/// setting_invalid_value for a number outside of ZV_WS_EnvNum.
+ZV_WS_Status ZV_WS_createEnvXML(const char* path, ZV_WS_EnvNum envNum);
+/// A file that is not there counts as deleted.
+ZV_WS_Status ZV_WS_deleteEnvXML(const char* path);

@@ -4,6 +4,7 @@
 #include <stdlib.h>
 #include <unistd.h>
 
+#include "ZVCfgLibAE.h"
 #include "ZVWSLibAE.h"
 #include "stagecraft/IStagecraft.h"
 
@@ -83,6 +84,7 @@ MovieRun RunMovie(const std::string& script, const Result& shown)
     IStagecraft* runtime = IStagecraft::InitializeStagecraftLibrary(2, arguments);
     if (!runtime) return run;
     runtime->RegisterExtensionClass<ZVWSLibAE>();
+    runtime->RegisterExtensionClass<ZVCfgLibAE>();
     runtime->RegisterExtensionClass<TestClass>();
     AEArray<StageWindow*> windows;
     runtime->CreateAndConfigureStageWindowSet(windows, 2, arguments, 1);

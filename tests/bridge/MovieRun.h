@@ -14,5 +14,5 @@ struct MovieRun {
     std::string Text() const;
 };
 
-/// The movie sees com.orvex.ZVWSLib, report(text), and result(): the script value of `shown`.
+/// The movie sees com.orvex.ZVWSLib, com.orvex.ZVCfgLib, report(text), and result(): the script value of `shown`.
 MovieRun RunMovie(const std::string& script, const Result& shown = Result());

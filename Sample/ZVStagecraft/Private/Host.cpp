@@ -4,6 +4,7 @@
 
 #include "HostConsole.h"
 #include "IpcChannel.h"
+#include "ZVCfgLibAE.h"
 #include "ZVMutex.h"
 #include "ZVWSLibAE.h"
 #include "player/Drm.h"
@@ -51,6 +52,7 @@ void Register(IStagecraft& runtime)
 void RegisterExtensionClasses(IStagecraft& runtime)
 {
     Register<ZVWSLibAE>(runtime);
+    Register<ZVCfgLibAE>(runtime);
     Register<ZVPlayerLibAE>(runtime);
 }
 

@@ -1,0 +1,115 @@
+#include "SafeFile.h"
+
+#include <errno.h>
+#include <fcntl.h>
+#include <limits.h>
+#include <stdlib.h>
+#include <string.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "ZVFile.h"
+#include "ZVUtilities.h"
+
+namespace {
+
+constexpr uint64_t kLockPatience = 5000;  // milliseconds; a writer holds the lock for one small file
+constexpr useconds_t kLockPause = 1000;   // microseconds; flock itself cannot wait for a limited time
+
+ZVString Target(const ZVString& path)
+{
+    char real[PATH_MAX];
+    return realpath(path.c_str(), real) ? ZVString(real) : path;
+}
+
+int OpenFolderOf(const ZVString& path)
+{
+    const char* slash = strrchr(path.c_str(), ZVFile::PATH_SEPERATOR);
+    const ZVString folder = slash ? path.substr(0, slash - path.c_str() + 1) : ZVString(".");
+    return open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+}
+
+bool WriteAll(int file, const ZVString& text)
+{
+    size_t done = 0;
+    while (done < text.length()) {
+        const ssize_t count = write(file, text.c_str() + done, text.length() - done);
+        if (count < 0 && errno != EINTR) return false;
+        if (count > 0) done += static_cast<size_t>(count);
+    }
+    return true;
+}
+
+// Only root may give files away; for others the owner changes with the replacement.
+bool TakeOver(int file, const char* original)
+{
+    struct stat old;
+    if (stat(original, &old) != 0) return errno == ENOENT;
+    if (fchown(file, old.st_uid, old.st_gid) != 0 && errno != EPERM) return false;
+    return fchmod(file, old.st_mode & 0777) == 0;
+}
+
+bool WriteFlushed(const char* path, const ZVString& text, mode_t mode, const char* original)
+{
+    const int file = open(path, O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_CLOEXEC, mode);
+    if (file < 0) return false;
+    const bool written = TakeOver(file, original) && WriteAll(file, text) && fsync(file) == 0;
+    return close(file) == 0 && written;
+}
+
+}  // namespace
+
+SafeFile::ReadResult SafeFile::Read(const char* path, size_t limit, ZVString& text)
+{
+    text = ZVString();
+    const int file = open(path, O_RDONLY | O_NONBLOCK | O_CLOEXEC);  // a pipe would block otherwise
+    if (file < 0) return errno == ENOENT ? ReadResult::kAbsent : ReadResult::kUnopened;
+    struct stat entry;
+    bool whole = fstat(file, &entry) == 0 && S_ISREG(entry.st_mode) && entry.st_size <= static_cast<off_t>(limit);
+    for (off_t left = whole ? entry.st_size : 0; left > 0 && whole;) {
+        char block[4096];
+        const ssize_t count = read(file, block, left < static_cast<off_t>(sizeof block) ? left : sizeof block);
+        if (count < 0 && errno == EINTR) continue;
+        whole = count > 0;
+        if (!whole) break;
+        text.append(block, static_cast<size_t>(count));
+        left -= count;
+    }
+    close(file);
+    if (whole) return ReadResult::kRead;
+    text = ZVString();
+    return ReadResult::kUnreadable;
+}
+
+bool SafeFile::Replace(const ZVString& path, const ZVString& text, mode_t mode)
+{
+    const ZVString target = Target(path);
+    const ZVString fresh = target + ".new";
+    if (!WriteFlushed(fresh.c_str(), text, mode, target.c_str()) || rename(fresh.c_str(), target.c_str()) != 0) {
+        unlink(fresh.c_str());
+        return false;
+    }
+    // The rename reaches the disk with the folder. Where a folder cannot be flushed, the file system sees to it.
+    const int folder = OpenFolderOf(target);
+    if (folder >= 0) {
+        fsync(folder);
+        close(folder);
+    }
+    return true;
+}
+
+SafeFile::FolderLock::FolderLock(const ZVString& path) : m_Folder(OpenFolderOf(Target(path)))
+{
+    const uint64_t end = ZVUtilities::MillisecondTime() + kLockPatience;
+    while (m_Folder >= 0 && !m_Held) {
+        m_Held = flock(m_Folder, LOCK_EX | LOCK_NB) == 0;
+        if (m_Held || (errno != EWOULDBLOCK && errno != EINTR) || ZVUtilities::MillisecondTime() >= end) return;
+        usleep(kLockPause);
+    }
+}
+
+SafeFile::FolderLock::~FolderLock()
+{
+    if (m_Folder >= 0) close(m_Folder);
+}

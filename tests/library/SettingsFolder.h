@@ -1,0 +1,92 @@
+// A folder for settings files and a device key of its own.
+#pragma once
+
+#include <gtest/gtest.h>
+#include <stdlib.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "CfgXMLFile.h"
+#include "Deployment.h"
+
+class SettingsFolder : public testing::Test {
+protected:
+    void SetUp() override
+    {
+        char name[] = "/tmp/zvsettingsXXXXXX";
+        ASSERT_TRUE(mkdtemp(name));
+        folder = name;
+        file = folder + "/settings.xml";
+        UseKeyFile(folder + "/device.key");
+    }
+    void TearDown() override { std::filesystem::remove_all(folder); }
+
+    void UseKeyFile(const std::string& path)
+    {
+        const std::string deployment = folder + "/deployment";
+        Put(deployment, "device_key_file = " + path + "\n");
+        setenv("ZV_DEPLOYMENT", deployment.c_str(), 1);
+        ASSERT_TRUE(Deployment::Load());
+    }
+
+    static void Put(const std::string& path, const std::string& text)
+    {
+        std::ofstream(path, std::ios::binary | std::ios::trunc) << text;
+    }
+
+    static std::string Get(const std::string& path)
+    {
+        std::ostringstream text;
+        text << std::ifstream(path, std::ios::binary).rdbuf();
+        return text.str();
+    }
+
+    static ZVString Bytes(const std::string& text) { return ZVString(text.data(), text.size()); }
+
+    unsigned int Write(const std::string& key, const std::string& value, bool isProtected = false) const
+    {
+        return CfgXMLFile(Bytes(file)).Write(Bytes(key), Bytes(value), isProtected);
+    }
+
+    unsigned int Read(const std::string& key, std::string& value, bool isProtected = false) const
+    {
+        ZVString read("not touched");
+        const unsigned int result = CfgXMLFile(Bytes(file)).Read(Bytes(key), read, isProtected);
+        value.assign(read.c_str(), read.length());
+        return result;
+    }
+
+    /// "result:value".
+    std::string Reading(const std::string& key, bool isProtected = false) const
+    {
+        std::string value;
+        const unsigned int result = Read(key, value, isProtected);
+        return std::to_string(result) + ":" + value;
+    }
+
+    /// Runs in a process of its own, which ends with the function's result.
+    template <class Function>
+    static pid_t Fork(Function function)
+    {
+        const pid_t child = fork();
+        if (child == 0) _exit(function());
+        return child;
+    }
+
+    /// The exit code; below 0 for the signal that ended it.
+    static int Wait(pid_t child)
+    {
+        int status = 0;
+        if (waitpid(child, &status, 0) != child) return 255;
+        return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
+    }
+
+    std::string folder;
+    std::string file;
+};

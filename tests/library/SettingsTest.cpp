@@ -1,0 +1,465 @@
+// The settings file: what is read from documents of every kind, what a write keeps, and what no one may change.
+#include <signal.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+
+#include "EVPCipher.h"
+#include "SafeFile.h"
+#include "Serializer.h"
+#include "SettingsFolder.h"
+#include "ZVWSLib.h"
+#include "soapStub.h"
+
+namespace {
+
+const std::string kNs = " xmlns:ZV1=\"http://api.zorvane.example/api/\"";
+
+std::string Document(const std::string& inside)
+{
+    return "<ZVWSLib" + kNs + ">" + inside + "</ZVWSLib>";
+}
+
+std::string Setting(const std::string& key, const std::string& value)
+{
+    return "<ZV1:Configuration Key=\"" + key + "\"><ZV1:Value>" + value + "</ZV1:Value></ZV1:Configuration>";
+}
+
+std::string Repeated(const std::string& text, size_t count)
+{
+    std::string all;
+    while (count-- > 0)
+        all += text;
+    return all;
+}
+
+class Settings : public SettingsFolder {};
+
+TEST_F(Settings, AreReadFromDocuments)
+{
+    const std::string item = "<ZV1:Configuration Key=\"k\"";
+    const struct {
+        const char* what;
+        std::string document;
+        const char* reading;
+    } rows[] = {
+        {"plain", Document(Setting("k", "v")), "0:v"},
+        {"the first of two", Document(Setting("j", "u") + Setting("k", "v") + Setting("k", "w")), "0:v"},
+        {"no value", Document(item + "/>" + Setting("k", "w")), "0:"},
+        {"empty value", Document(item + "><ZV1:Value/></ZV1:Configuration>"), "0:"},
+        {"case differs", Document(Setting("K", "v")), "3:"},
+        {"longer key", Document(Setting("kk", "v")), "3:"},
+        {"no key", Document("<ZV1:Configuration><ZV1:Value>a</ZV1:Value></ZV1:Configuration>" + Setting("k", "v")),
+         "0:v"},
+        {"references", Document(Setting("k", "&lt;&amp;&#228;&#x20ac;&quot;")), "0:<&ä€\""},
+        {"character data", Document(Setting("k", "a<![CDATA[<b>]]>c")), "0:a<b>c"},
+        {"blanks stay", Document(Setting("k", " \n v\t")), "0: \n v\t"},
+        {"reference in the key", Document(Setting("&#107;", "v")), "0:v"},
+        {"other prefix",
+         "<ZVWSLib xmlns:a=\"http://api.zorvane.example/api/\"><a:Configuration Key=\"k\"><a:Value>v"
+         "</a:Value></a:Configuration></ZVWSLib>",
+         "0:v"},
+        {"other namespace", Document("<x:Configuration xmlns:x=\"urn:x\" Key=\"k\"/>"), "3:"},
+        {"attribute of another namespace", Document("<ZV1:Configuration ZV1:Key=\"k\"/>"), "3:"},
+        {"no namespace", "<ZVWSLib><Configuration Key=\"k\"><Value>v</Value></Configuration></ZVWSLib>", "0:v"},
+        {"deeper", Document("<ZV1:Group>" + Setting("k", "v") + "</ZV1:Group>"), "3:"},
+        {"first value only",
+         Document(item + "><ZV1:Value>v<x>y</x></ZV1:Value><ZV1:Value>w</ZV1:Value>"
+                         "</ZV1:Configuration>"),
+         "0:v"},
+        {"byte order mark and declaration",
+         "\xEF\xBB\xBF<?xml version=\"1.0\" encoding=\"UTF-8\"?>" + Document(Setting("k", "ä")), "0:ä"},
+        {"empty file", "", "3:"},
+    };
+    for (const auto& row : rows) {
+        Put(file, row.document);
+        EXPECT_EQ(row.reading, Reading("k")) << row.what;
+    }
+    EXPECT_EQ("1:", Reading(""));
+}
+
+// None of these may be read, taken for empty or replaced.
+TEST_F(Settings, DocumentsThatAreNoneAreLeftAlone)
+{
+    const std::string setting = Setting("k", "v");
+    const struct {
+        const char* what;
+        std::string document;
+        unsigned int result;
+    } rows[] = {
+        {"text", "hello", 3},
+        {"blank", " \n", 3},
+        {"zero bytes", std::string(100, '\0'), 3},
+        {"cut short", Document(setting).substr(0, Document(setting).size() - 3), 3},
+        {"something behind", Document(setting) + "x", 3},
+        {"other root", "<Other" + kNs + ">" + setting + "</Other>", 3},
+        {"tags crossed", Document("<a><b></a></b>" + setting), 3},
+        {"undeclared prefix", "<ZVWSLib><ZV1:Configuration Key=\"k\"><ZV1:Value>", 3},
+        {"ill-formed UTF-8", Document(setting + "\xC3("), 3},
+        {"unknown entity", Document(Setting("k", "&v;")), 3},
+        {"entity", "<!DOCTYPE ZVWSLib [<!ENTITY v \"w\">]>" + Document(Setting("k", "&v;")), 3},
+        {"entities of entities",
+         "<!DOCTYPE ZVWSLib [<!ENTITY a \"" + Repeated("x", 1000) + "\"><!ENTITY b \"" + Repeated("&a;", 1000) +
+             "\"><!ENTITY c \"" + Repeated("&b;", 1000) + "\">]>" + Document(Setting("k", Repeated("&c;", 1000))),
+         3},
+        {"file as entity",
+         "<!DOCTYPE ZVWSLib [<!ENTITY v SYSTEM \"file:///etc/passwd\">]>" + Document(Setting("k", "&v;")), 3},
+        {"document type elsewhere", "<!DOCTYPE ZVWSLib SYSTEM \"http://127.0.0.1:1/x.dtd\">" + Document(setting), 3},
+        {"deep", Document(Repeated("<a>", 100000) + Repeated("</a>", 100000) + setting), 3},
+        {"other encoding", "<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?>" + Document(setting + "<!--\xE4-->"), 3},
+        {"too large", Document(setting + "<!--" + std::string(CfgXMLFile::kMaxSize, ' ') + "-->"), 2},
+    };
+    for (const auto& row : rows) {
+        Put(file, row.document);
+        EXPECT_EQ(std::to_string(row.result) + ":", Reading("k")) << row.what;
+        EXPECT_EQ(row.result, Write("k", "w")) << row.what;
+        EXPECT_TRUE(row.document == Get(file)) << row.what;
+    }
+}
+
+TEST_F(Settings, FilesThatAreNoneAreRefusedAtOnce)
+{
+    EXPECT_EQ("5:", Reading("k"));
+    Put(file, "");
+    ASSERT_EQ(0, truncate(file.c_str(), 100 << 20));
+    EXPECT_EQ("2:", Reading("k"));
+    EXPECT_EQ(2u, Write("k", "v"));
+
+    const std::string below = file + "/below.xml";
+    const std::string pipe = folder + "/pipe";
+    ASSERT_EQ(0, mkfifo(pipe.c_str(), 0600));
+    const struct {
+        std::string path;
+        const char* reading;
+        unsigned int written;
+    } rows[] = {{below, "5:", 4}, {pipe, "2:", 2}, {folder, "2:", 2}, {folder + "/no/folder.xml", "5:", 4}};
+    for (const auto& row : rows) {
+        file = row.path;
+        EXPECT_EQ(row.reading, Reading("k")) << row.path;
+        EXPECT_EQ(row.written, Write("k", "v")) << row.path;
+    }
+}
+
+TEST_F(Settings, AWriteChangesItsElementAndNothingElse)
+{
+    const std::string head = "\xEF\xBB\xBF<?xml version='1.0'?>\r\n<!-- a <ZVWSLib> -->\n";
+    const std::string odd =
+        "\n  <ZV1:Configuration  Key = 'a&gt;b' note='>' ><ZV1:Value></ZV1:Value><x/>"
+        "</ZV1:Configuration >\n<?pi <?><![CDATA[ ]]> &#65; <other Key=\"k\"/>";
+    const std::string declared = " xmlns:ZV1=\"http://api.zorvane.example/api/\"";
+    const std::string anew =
+        "<ZV1:Configuration" + declared + " Key=\"k\"><ZV1:Value>v</ZV1:Value></ZV1:Configuration>";
+    const struct {
+        const char* what;
+        std::string before, after;
+    } rows[] = {
+        {"replaced where it stands", head + Document(odd + Setting("k", "old") + odd + Setting("z", "1")) + "\n<!---->",
+         head + Document(odd + Setting("k", "v") + odd + Setting("z", "1")) + "\n<!---->"},
+        {"the first of two", Document(Setting("k", "1") + Setting("k", "2")),
+         Document(Setting("k", "v") + Setting("k", "2"))},
+        {"without a value", Document("<ZV1:Configuration Key='k'/>" + odd), Document(Setting("k", "v") + odd)},
+        {"added at the end", head + Document(odd) + " ", head + Document(odd + Setting("k", "v")) + " "},
+        {"first one", "<ZVWSLib" + kNs + " />\n", "<ZVWSLib" + kNs + " >" + Setting("k", "v") + "</ZVWSLib>\n"},
+        {"empty root", Document(""), Document(Setting("k", "v"))},
+        {"no prefix", "<ZVWSLib></ZVWSLib\n>", "<ZVWSLib>" + anew + "</ZVWSLib\n>"},
+        {"prefix of others", "<ZVWSLib xmlns:ZV1='urn:x'/>", "<ZVWSLib xmlns:ZV1='urn:x'>" + anew + "</ZVWSLib>"},
+        {"root with prefix", "<p:ZVWSLib xmlns:p='urn:p'/>", "<p:ZVWSLib xmlns:p='urn:p'>" + anew + "</p:ZVWSLib>"},
+    };
+    for (const auto& row : rows) {
+        Put(file, row.before);
+        EXPECT_EQ(0u, Write("k", "v")) << row.what;
+        EXPECT_EQ(row.after, Get(file)) << row.what;
+        EXPECT_EQ("0:v", Reading("k")) << row.what;
+    }
+}
+
+TEST_F(Settings, ValuesAndKeysComeBackAsTheyWere)
+{
+    const std::string texts[] = {"a",
+                                 "",
+                                 " ",
+                                 "\t\r\n\r",
+                                 "<&>\"'",
+                                 "]]>",
+                                 "&amp;",
+                                 "0040",
+                                 "äöü€\xF0\x9F\x8E\xAC",
+                                 "</ZVWSLib>",
+                                 "xmlns:ZV1=\"\"",
+                                 std::string(300000, 'x')};
+    for (const bool isProtected : {false, true}) {
+        for (const std::string& text : texts) {
+            const std::string what = text.substr(0, 40) + (isProtected ? " protected" : "");
+            EXPECT_EQ(0u, Write("value", text, isProtected)) << what;
+            EXPECT_TRUE(Reading("value", isProtected) == "0:" + text) << what;
+            if (text.empty()) continue;
+            EXPECT_EQ(0u, Write(text, "by key", isProtected)) << what;
+            EXPECT_EQ("0:by key", Reading(text, isProtected)) << what;
+            EXPECT_TRUE(Reading("value", isProtected) == "0:" + text) << what;
+            unlink(file.c_str());
+        }
+    }
+}
+
+TEST_F(Settings, WhatXmlCannotHoldIsRefusedUnlessProtected)
+{
+    ASSERT_EQ(0u, Write("k", "before"));
+    const std::string before = Get(file);
+    const std::string texts[] = {std::string("a\0b", 3), "\x01",        "\x1B[0m", "\xFF", "\xC3",
+                                 "\xED\xA0\x80",         "\xEF\xBF\xBF"};
+    for (const std::string& text : texts) {
+        EXPECT_EQ(6u, Write("k", text));
+        EXPECT_EQ(6u, Write("key" + text, "v"));
+        EXPECT_EQ(before, Get(file));
+        EXPECT_EQ(0u, Write("secret", text, true));
+        EXPECT_EQ("0:" + text, Reading("secret", true));
+        Put(file, before);
+    }
+    EXPECT_EQ(1u, Write("", "v"));
+    EXPECT_EQ(4u, Write("k", std::string(CfgXMLFile::kMaxSize, 'x')));
+    EXPECT_EQ(4u, Write("k", std::string(CfgXMLFile::kMaxSize + 1, 'x'), true));
+    EXPECT_EQ(before, Get(file));
+}
+
+TEST_F(Settings, ALargestFileIsReadAndCanBeChanged)
+{
+    const size_t around = Document(Setting("k", "")).size();
+    Put(file, Document(Setting("k", std::string(CfgXMLFile::kMaxSize - around, 'x'))));
+    EXPECT_EQ(4u, Write("j", "v"));
+    std::string value;
+    EXPECT_EQ(0u, Read("k", value));
+    EXPECT_EQ(CfgXMLFile::kMaxSize - around, value.size());
+    EXPECT_EQ(0u, Write("k", "small"));
+    EXPECT_EQ(0u, Write("j", "v"));
+}
+
+// The document is a record of the service's schema, so the SOAP runtime can read it, too.
+TEST_F(Settings, ADocumentIsASerializedRecord)
+{
+    ASSERT_EQ(0u, Write("a", "1 < 2"));
+    ASSERT_EQ(0u, Write("b&", "2"));
+    ASSERT_EQ(0u, Write("a", "3\n"));
+    Serializer serializer(false, false);
+    ZV1__ArrayOfConfigurationItemOfString record;
+    ASSERT_TRUE(serializer.Read(Bytes(Get(file)), record));
+    ASSERT_EQ(2, record.__sizeConfiguration);
+    EXPECT_STREQ("a", record.Configuration[0]->Key);
+    EXPECT_STREQ("3\n", record.Configuration[0]->Value);
+    EXPECT_STREQ("b&", record.Configuration[1]->Key);
+    EXPECT_STREQ("2", record.Configuration[1]->Value);
+
+    ZVString text;
+    ASSERT_TRUE(Serializer(false, false).Write(record, text));
+    Put(file, text.c_str());
+    EXPECT_EQ("0:3\n", Reading("a"));
+    EXPECT_EQ("0:2", Reading("b&"));
+}
+
+TEST_F(Settings, ModeAndLinkOfAFileStay)
+{
+    const auto modeOf = [](const std::string& path) {
+        struct stat entry = {};
+        EXPECT_EQ(0, lstat(path.c_str(), &entry));
+        return entry.st_mode;
+    };
+    ASSERT_EQ(0u, Write("k", "1", true));
+    EXPECT_EQ(S_IFREG | 0600u, modeOf(file));
+    EXPECT_EQ(S_IFREG | 0600u, modeOf(folder + "/device.key"));
+
+    const std::string real = file;
+    chmod(real.c_str(), 0644);
+    file = folder + "/link.xml";
+    ASSERT_EQ(0, symlink("settings.xml", file.c_str()));
+    EXPECT_EQ(0u, Write("k", "2"));
+    EXPECT_EQ(static_cast<mode_t>(S_IFLNK), modeOf(file) & S_IFMT);
+    EXPECT_EQ(S_IFREG | 0644u, modeOf(real));
+    file = real;
+    EXPECT_EQ("0:2", Reading("k"));
+}
+
+// ---- Protected values
+
+TEST_F(Settings, AProtectedValueShowsNothingAndIsNeverTheSameTwice)
+{
+    ASSERT_EQ(0u, Write("k", "a secret token", true));
+    const std::string first = Reading("k");
+    EXPECT_EQ(std::string::npos, Get(file).find("secret"));
+    EXPECT_EQ("0:0040", first.substr(0, 6));
+    ASSERT_EQ(0u, Write("k", "a secret token", true));
+    EXPECT_NE(first, Reading("k"));
+    EXPECT_EQ(Reading("k").size(), first.size());
+    EXPECT_EQ("0:a secret token", Reading("k", true));
+}
+
+TEST_F(Settings, ATamperedValueReadsAsEmpty)
+{
+    ASSERT_EQ(0u, Write("k", "a secret", true));
+    const std::string packed = Reading("k").substr(2);
+    std::vector<std::string> tampered = {"plain",
+                                         "0",
+                                         "0000",
+                                         "0040",
+                                         "00400",
+                                         "9999" + packed.substr(4),
+                                         packed + packed.substr(4),
+                                         packed + " ",
+                                         " " + packed,
+                                         "0000" + packed};
+    for (size_t i = 0; i < packed.size(); ++i) {
+        std::string changed = packed;
+        changed[i] = changed[i] == 'A' ? 'B' : 'A';
+        tampered.push_back(changed);
+        tampered.push_back(packed.substr(0, i));
+        tampered.push_back(packed.substr(0, i) + packed.substr(i + 1));
+    }
+    for (const std::string& text : tampered) {
+        if (text.empty()) continue;
+        Put(file, Document(Setting("k", text)));
+        EXPECT_EQ("6:", Reading("k", true)) << text;
+    }
+    Put(file, Document(Setting("k", packed) + Setting("shown", packed)));
+    EXPECT_EQ("0:a secret", Reading("k", true));
+    EXPECT_EQ("6:", Reading("shown", true));
+}
+
+TEST_F(Settings, AProtectedValueNeedsItsDevicesKey)
+{
+    ASSERT_EQ(0u, Write("k", "v", true));
+    const std::string key = folder + "/device.key";
+    const std::string right = Get(key);
+    EXPECT_EQ(EVPCipher::kDeviceKeySize, right.size());
+    const struct {
+        std::string key;
+        const char* reading;
+        unsigned int written;
+    } rows[] = {{std::string(32, 'x'), "6:", 0},
+                {"", "7:", 7},
+                {right.substr(1), "7:", 7},
+                {right + "x", "7:", 7},
+                {right, "0:v", 0}};
+    for (const auto& row : rows) {
+        Put(key, row.key);
+        EXPECT_EQ(row.reading, Reading("k", true));
+        EXPECT_EQ(row.written, Write("other", "v", true));
+        EXPECT_EQ(row.key, Get(key));
+    }
+    ASSERT_EQ(0, unlink(key.c_str()));
+    EXPECT_EQ("7:", Reading("k", true));
+    EXPECT_FALSE(std::filesystem::exists(key)) << "a read must not make a key";
+
+    UseKeyFile(file + "/below.key");
+    EXPECT_EQ(7u, Write("k", "w", true));
+    UseKeyFile("");
+    EXPECT_EQ(7u, Write("k", "w", true));
+    EXPECT_EQ(0u, Write("k", "", true)) << "an empty value is not enciphered";
+    EXPECT_EQ("0:", Reading("k", true));
+}
+
+TEST_F(Settings, PackedTextsCarryBothParts)
+{
+    ZVString packed, seal, cipherText;
+    ASSERT_TRUE(PackEncryptedValue(ZVString("a\0b", 3), ZVString("four"), packed));
+    EXPECT_STREQ("0004YQBiZm91cg==", packed.c_str());
+    ASSERT_TRUE(UnPackEncryptedValue(packed, seal, cipherText));
+    EXPECT_TRUE(seal == ZVString("a\0b", 3));
+    EXPECT_STREQ("four", cipherText.c_str());
+    EXPECT_TRUE(PackEncryptedValue(Bytes(std::string(7497, 's')), ZVString(), packed));
+    EXPECT_EQ(4u + 9996, packed.length());
+    EXPECT_FALSE(PackEncryptedValue(Bytes(std::string(7500, 's')), ZVString(), packed));
+    for (const char* text : {"", "000", "+004YQBi", " 4  YQBi", "0005YQBi", "0003YQBi", "0004YQ=i", "0004YQB!",
+                             "0004====", "0004YQBiZ", "0004YQBiZm91ch==", "0004YQBi Zm91cg=="}) {
+        EXPECT_FALSE(UnPackEncryptedValue(ZVString(text), seal, cipherText)) << text;
+        EXPECT_TRUE(seal.empty() && cipherText.empty()) << text;
+    }
+}
+
+// ---- Disks and other writers
+
+TEST_F(Settings, AFullDiskKeepsTheOldDocument)
+{
+    ASSERT_EQ(0u, Write("k", std::string(5000, 'v')));
+    const std::string before = Get(file);
+    EXPECT_EQ(4, Wait(Fork([&] {
+                  signal(SIGXFSZ, SIG_IGN);
+                  const rlimit limit = {4096, 4096};
+                  setrlimit(RLIMIT_FSIZE, &limit);
+                  return static_cast<int>(Write("j", "w"));
+              })));
+    EXPECT_EQ(before, Get(file));
+    EXPECT_FALSE(std::filesystem::exists(file + ".new"));
+    EXPECT_EQ(0u, Write("j", "w"));
+}
+
+TEST_F(Settings, AFolderThatTakesNoFileKeepsTheOldDocument)
+{
+    ASSERT_EQ(0u, Write("k", "v"));
+    const std::string before = Get(file);
+    std::filesystem::create_directory(file + ".new");  // stops everyone, root too
+    EXPECT_EQ(4u, Write("k", "w"));
+    EXPECT_EQ(before, Get(file));
+    std::filesystem::remove(file + ".new");
+
+    Put(folder + "/other", "untouched");
+    ASSERT_EQ(0, symlink("other", (file + ".new").c_str()));
+    EXPECT_EQ(4u, Write("k", "w")) << "a link that someone else has put there is not followed";
+    EXPECT_EQ("untouched", Get(folder + "/other"));
+    EXPECT_EQ(0u, Write("k", "w")) << "and does not stay";
+}
+
+TEST_F(Settings, AWriterThatNeverEndsStopsTheOthersForATimeOnly)
+{
+    const SafeFile::FolderLock lock(Bytes(file));
+    ASSERT_TRUE(lock.Held());
+    EXPECT_EQ(4u, Write("k", "v"));
+    EXPECT_FALSE(std::filesystem::exists(file));
+}
+
+// ---- The library's calls
+
+TEST_F(Settings, StatusesOfTheCalls)
+{
+    const auto read = [&](const char* path, const char* key, bool isProtected) {
+        ZV_WS_String value;
+        const ZV_WS_Status status = ZV_WS_readSetting(path, key, isProtected, &value);
+        EXPECT_EQ(status == ZV_WS_Status_ok, value.data != nullptr);
+        std::string text = std::to_string(status) + ":" + (value.data ? value.data : "");
+        ZV_WS_release(&value);
+        return text;
+    };
+    const char* path = file.c_str();
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_writeSetting(nullptr, "k", "v", false));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_writeSetting("", "k", "v", false));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_writeSetting(path, nullptr, "v", false));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_writeSetting(path, "", "v", false));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_writeSetting(path, "k", nullptr, false));
+    EXPECT_EQ(ZV_WS_Status_setting_invalid_value, ZV_WS_writeSetting(path, "k", "\x01", false));
+    EXPECT_EQ("-1906:", read((folder + "/deployment").c_str(), "k", false));
+    EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_writeSetting((folder + "/deployment").c_str(), "k", "v", false));
+    const std::string fileError = std::to_string(ZV_WS_Status_file_operation_error) + ":";
+    EXPECT_EQ(fileError, read(path, "k", false));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(path, "k", "", true));
+    EXPECT_EQ("0:", read(path, "k", true));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(path, "k", "v", true));
+    EXPECT_EQ("0:v", read(path, "k", true));
+    EXPECT_EQ("-1906:", read(path, "K", true));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(path, "k", "v", false));
+    EXPECT_EQ("-1907:", read(path, "k", true));
+    EXPECT_EQ(std::to_string(ZV_WS_Status_invalid_param) + ":", read(path, "", true));
+}
+
+TEST_F(Settings, TheEnvironmentFileIsASettingsFile)
+{
+    const char* path = file.c_str();
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_deleteEnvXML(path));
+    EXPECT_EQ(ZV_WS_Status_setting_invalid_value, ZV_WS_createEnvXML(path, static_cast<ZV_WS_EnvNum>(4)));
+    EXPECT_EQ(ZV_WS_Status_setting_invalid_value, ZV_WS_createEnvXML(path, static_cast<ZV_WS_EnvNum>(-1)));
+    EXPECT_FALSE(std::filesystem::exists(file));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_createEnvXML(path, ENVNUM_PRODUCTION));
+    EXPECT_EQ("0:2", Reading("EnvNum"));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_createEnvXML(path, ENVNUM_APISTG));
+    EXPECT_EQ("0:0", Reading("EnvNum"));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_deleteEnvXML(path));
+    EXPECT_FALSE(std::filesystem::exists(file));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_deleteEnvXML(nullptr));
+}
+
+}  // namespace
