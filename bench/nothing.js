@@ -1,0 +1,3 @@
+// Says "page" at once: what a process costs before it asks anything.
+trace("page");
+quit();
