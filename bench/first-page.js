@@ -1,4 +1,4 @@
-// Says "page" when the first page of titles is there.
+// Says "the page is there" when the first page of titles is there.
 var ws = new com.orvex.ZVWSLib();
 
 function call(method, parameters, use) {
@@ -17,7 +17,7 @@ call("init", {
 }, function () {
     call("getTitles", {genreid: 1, CurrentPageNumber: 1, ItemsPerPage: 20, purchasetype: 0}, function (page) {
         if (page.Titles.length !== 20) throw new Error("no page");
-        trace("page");
+        trace("the page is there");
         quit();
     });
 });

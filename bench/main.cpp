@@ -73,19 +73,22 @@ const struct {
     const char* measured;
     const char* floorName;
     const char* floor;
-    double goal;  // 0: none
+    double goal;     // 0: none
+    bool hasThread;  // the measuring thread does the work
 } kRows[] = {
-    {"Warm `ZV_WS_getTitles`, 20 titles", "warm/library", "bare SOAP toolkit, connection kept", "warm/toolkit", 1.3},
-    {"Warm `ZV_WS_getTitles`, 20 titles", "warm/library", "libcurl with libxml2, connection kept", "warm/curl", 1.2},
+    {"Warm `ZV_WS_getTitles`, 20 titles", "warm/library", "bare SOAP toolkit, connection kept", "warm/toolkit", 1.3,
+     true},
+    {"Warm `ZV_WS_getTitles`, 20 titles", "warm/library", "libcurl with libxml2, connection kept", "warm/curl", 1.2,
+     true},
     {"Cached `ZV_WS_getTitles`, 20 titles", "cached/library", "open, select, close + inflate + parse + convert",
-     "cached/database+cached/inflate+cached/parse+cached/convert", 1.3},
-    {"of which open, select, close", "cached/database", "the cached call", "cached/library", 0},
-    {"of which inflate", "cached/inflate", "the cached call", "cached/library", 0},
-    {"of which parse", "cached/parse", "the cached call", "cached/library", 0},
-    {"of which convert and release", "cached/convert", "the cached call", "cached/library", 0},
-    {"Store in a cache of 500 pages", "store/full", "store in a cache of one page", "store/first", 0},
-    {"First page from process start", "start/page", "process start alone", "start/nothing", 0},
-    {"New session and its first page", "start/session", "warm `ZV_WS_getTitles`", "warm/library", 0},
+     "cached/database+cached/inflate+cached/parse+cached/convert", 1.3, true},
+    {"of which open, select, close", "cached/database", "the cached call", "cached/library", 0, true},
+    {"of which inflate", "cached/inflate", "the cached call", "cached/library", 0, true},
+    {"of which parse", "cached/parse", "the cached call", "cached/library", 0, true},
+    {"of which convert and release", "cached/convert", "the cached call", "cached/library", 0, true},
+    {"Store in a cache of 500 pages", "store/full", "store in a cache of one page", "store/first", 0, true},
+    {"First page from process start", "start/page", "process start alone", "start/nothing", 0, false},
+    {"New session and its first page", "start/session", "warm `ZV_WS_getTitles`", "warm/library", 0, true},
 };
 
 std::string Processor()
@@ -121,10 +124,11 @@ void PrintTable(const Keeper& keeper)
     for (const auto& row : kRows) {
         Times measured, floor;
         if (!keeper.Find(row.measured, measured) || !keeper.Find(row.floor, floor)) continue;
-        char goal[16] = "";
+        char goal[16] = "", cpu[16] = "";
         if (row.goal > 0) snprintf(goal, sizeof goal, "%.1f", row.goal);
-        printf("| %s | %.0f | %s | %.0f | %.2f | %.2f | %s |\n", row.what, measured.real, row.floorName, floor.real,
-               measured.real / floor.real, measured.cpu / floor.cpu, goal);
+        if (row.hasThread) snprintf(cpu, sizeof cpu, "%.2f", measured.cpu / floor.cpu);
+        printf("| %s | %.0f | %s | %.0f | %.2f | %s | %s |\n", row.what, measured.real, row.floorName, floor.real,
+               measured.real / floor.real, cpu, goal);
     }
 }
 
