@@ -70,7 +70,7 @@ const char* ReadLine(const std::string& line, Deployment& values)
     return "unknown key";
 }
 
-bool ReadFile(const char* name, Deployment& values)
+bool ReadLines(const char* name, Deployment& values)
 {
     std::ifstream file(name, std::ios::binary);
     std::string line;
@@ -152,12 +152,16 @@ const char* Deployment::BaseUrl(ContentType type, int environment) const
     return m_BaseUrls[(type == ContentType_KAC ? kEnvironments : 0) + environment].c_str();
 }
 
+bool Deployment::Read(const char* fileName, Deployment& values)
+{
+    values = Defaults();
+    return !fileName || ReadLines(fileName, values);
+}
+
 const Deployment* Deployment::Load()
 {
-    Deployment values = Defaults();
-    const char* name = getenv("ZV_DEPLOYMENT");
-    if (name && !ReadFile(name, values)) return nullptr;
-    return TheRegistry().MakeCurrent(values);
+    Deployment values;
+    return Read(getenv("ZV_DEPLOYMENT"), values) ? TheRegistry().MakeCurrent(values) : nullptr;
 }
 
 const Deployment& Deployment::Current()

@@ -20,6 +20,9 @@ struct Deployment {
     /// The services' base URL for a content type and an environment; production for any other environment.
     const char* BaseUrl(ContentType type, int environment) const;
 
+    /// The defaults with what the file (null: none) replaces. False after one line on the error stream.
+    static bool Read(const char* fileName, Deployment& values);
+
     /// Reads the values anew and makes them the current ones. Null after one line on the error stream when the file
     /// cannot be read or holds a mistake; the current ones stay. The object lives as long as the process. Any thread.
     static const Deployment* Load();

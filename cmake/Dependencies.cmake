@@ -10,6 +10,8 @@ pkg_check_modules(DUKTAPE REQUIRED IMPORTED_TARGET duktape)
 pkg_check_modules(GSOAP REQUIRED gsoapssl++)
 if(BUILD_TESTING OR NOT DEFINED BUILD_TESTING)
     find_package(GTest REQUIRED)
+    find_package(benchmark REQUIRED)
+    find_package(CURL REQUIRED)
 endif()
 
 # The flags decide the layout of struct soap: every file that sees stdsoap2.h must take them from here.

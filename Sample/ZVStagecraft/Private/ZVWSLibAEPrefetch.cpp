@@ -243,14 +243,20 @@ struct Plan {
 
     bool Caches(unsigned int kind) const { return (listing.m_CurrentCacheData & kind) != 0; }
 
+    // For Update, which takes the mutex itself: the analysis does not see that the manager's is this one.
+    AEArray<AEString>& WaitingBoxArts() const ZV_THREAD_ATTRIBUTE(no_thread_safety_analysis)
+    {
+        return state.m_WaitingForDownloadBoxArts;
+    }
+
     template <class Param, class Response>
     void Pages(Result_Type type, const Response& shown, Param param, int userdata1, int userdata2, int userdata3,
                void (*worker)(void*))
     {
         if (shown.TotalPages < 2) return;
         ZVWSLibAE::PrefetchMgr& manager = state.m_PrefetchMgr;
-        manager.Update(state.m_WaitingForDownloadBoxArts, type, shown.TotalPages, shown.TotalItems, shown.ItemsPerPage,
-                       userdata1, userdata2, userdata3);
+        manager.Update(WaitingBoxArts(), type, shown.TotalPages, shown.TotalItems, shown.ItemsPerPage, userdata1,
+                       userdata2, userdata3);
         manager.MarkPagePrefetched(shown.CurrentPageNumber);
         unsigned int pages[ZVWSLibAE::PrefetchMgr::m_kPrefetchPages];
         unsigned int found = 0;

@@ -1,0 +1,214 @@
+// A call over a connection that is open: the library against the bare SOAP toolkit, and against libcurl with libxml2.
+// All three verify the server, authenticate each request with a fresh digest and accept a compressed answer.
+#include <curl/curl.h>
+#include <libxml/parser.h>
+#include <libxml/tree.h>
+#include <openssl/evp.h>
+#include <openssl/rand.h>
+#include <string.h>
+#include <time.h>
+#include <wsaapi.h>
+#include <wsseapi.h>
+
+#include "Namespaces.h"
+#include "Store.h"
+#include "soapRealTimeBrowseSoap12Proxy.h"
+
+namespace {
+
+const char kAction[] = "http://api.zorvane.example/api/getTitlesByNavigation";
+const char kAnonymous[] = "http://schemas.xmlsoap.org/ws/2004/08/addressing/role/anonymous";
+
+std::string Endpoint()
+{
+    return "https://localhost:" + std::to_string(TheStore().HttpsPort()) + "/api/RealTimeBrowse.asmx";
+}
+
+std::string Authorities()
+{
+    return TheStore().DataFolder() + "/ca.pem";
+}
+
+void Library(benchmark::State& state)
+{
+    BenchSession session;
+    session.GetTitles();
+    for (auto _ : state)
+        session.GetTitles();
+}
+
+// ---- The toolkit alone
+
+class Toolkit {
+public:
+    Toolkit() : m_Endpoint(Endpoint()), m_Proxy(SOAP_IO_KEEPALIVE | SOAP_C_UTFSTRING)
+    {
+        soap_set_namespaces(&m_Proxy, namespaces);
+        soap_register_plugin(&m_Proxy, soap_wsa);
+        soap_register_plugin(&m_Proxy, soap_wsse);
+        const auto flags = SOAP_SSL_DEFAULT | SOAP_TLSv1_2 | SOAP_TLSv1_3;
+        Check(soap_ssl_client_context(&m_Proxy, flags, nullptr, nullptr, Authorities().c_str(), nullptr, nullptr) ==
+                  SOAP_OK,
+              "a TLS context");
+        m_Proxy.soap_endpoint = m_Endpoint.c_str();
+    }
+    ~Toolkit()
+    {
+        m_Proxy.destroy();
+        soap_done(&m_Proxy);
+    }
+
+    void GetTitles()
+    {
+        ZV1__DeviceSettings settings;
+        settings.APIKey = const_cast<char*>(StorefrontAccount::kApiKey);
+        settings.DestinationUniqueID = const_cast<char*>("bench");
+        settings.DestinationTypeID = 48;
+        m_Proxy.header = nullptr;
+        soap_wsa_request(&m_Proxy, "uuid:getTitlesByNavigation", m_Endpoint.c_str(), kAction);
+        soap_wsa_add_ReplyTo(&m_Proxy, kAnonymous);
+        soap_wsse_add_UsernameTokenDigest(&m_Proxy, "User", StorefrontAccount::kUser, StorefrontAccount::kPassword);
+        m_Proxy.header->ZV1__DeviceSettings_ = &settings;
+        _ZV1__getTitlesByNavigation request;
+        _ZV1__getTitlesByNavigationResponse response;
+        request.GenreID = 1;
+        request.CurrentPageNumber = 1;
+        request.ItemsPerPage = kItems;
+        request.PurchaseType = ZV1__StreamAPIPurchaseType(PURCHASE_TYPE_RENT);
+        Check(m_Proxy.getTitlesByNavigation(&request, &response) == SOAP_OK && response.getTitlesByNavigationResult,
+              "the toolkit's call");
+        m_Proxy.destroy();
+    }
+
+private:
+    const std::string m_Endpoint;
+    RealTimeBrowseSoap12Proxy m_Proxy;
+};
+
+void BareToolkit(benchmark::State& state)
+{
+    Toolkit toolkit;
+    toolkit.GetTitles();
+    for (auto _ : state)
+        toolkit.GetTitles();
+}
+
+// ---- libcurl and libxml2
+
+std::string Base64(const unsigned char* bytes, int length)
+{
+    std::string text(static_cast<size_t>(length) * 2 + 4, '\0');
+    text.resize(static_cast<size_t>(EVP_EncodeBlock(reinterpret_cast<unsigned char*>(&text[0]), bytes, length)));
+    return text;
+}
+
+std::string Token()
+{
+    unsigned char nonce[20], digest[EVP_MAX_MD_SIZE];
+    unsigned int length = 0;
+    RAND_bytes(nonce, sizeof nonce);
+    char created[32];
+    const time_t now = time(nullptr);
+    tm parts;
+    strftime(created, sizeof created, "%Y-%m-%dT%H:%M:%SZ", gmtime_r(&now, &parts));
+    const std::string hashed =
+        std::string(reinterpret_cast<char*>(nonce), sizeof nonce) + created + StorefrontAccount::kPassword;
+    EVP_Digest(hashed.data(), hashed.size(), digest, &length, EVP_sha1(), nullptr);
+    return std::string("<wsse:UsernameToken wsu:Id=\"User\"><wsse:Username>") + StorefrontAccount::kUser +
+           "</wsse:Username><wsse:Password Type=\"http://docs.oasis-open.org/wss/2004/01/"
+           "oasis-200401-wss-username-token-profile-1.0#PasswordDigest\">" +
+           Base64(digest, static_cast<int>(length)) + "</wsse:Password><wsse:Nonce>" + Base64(nonce, sizeof nonce) +
+           "</wsse:Nonce><wsu:Created>" + created + "</wsu:Created></wsse:UsernameToken>";
+}
+
+std::string Envelope(const std::string& endpoint)
+{
+    return "<s:Envelope xmlns:s=\"http://schemas.xmlsoap.org/soap/envelope/\" "
+           "xmlns:a=\"http://schemas.xmlsoap.org/ws/2004/08/addressing\" "
+           "xmlns:wsse=\"http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-secext-1.0.xsd\" "
+           "xmlns:wsu=\"http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-utility-1.0.xsd\" "
+           "xmlns:z=\"http://api.zorvane.example/api/\"><s:Header><wsse:Security s:mustUnderstand=\"1\">" +
+           Token() +
+           "</wsse:Security><a:MessageID>uuid:getTitlesByNavigation</a:MessageID><a:ReplyTo s:mustUnderstand=\"1\">"
+           "<a:Address>" +
+           kAnonymous + "</a:Address></a:ReplyTo><a:To s:mustUnderstand=\"1\">" + endpoint +
+           "</a:To><a:Action s:mustUnderstand=\"1\">" + kAction +
+           "</a:Action><z:DeviceSettings s:mustUnderstand=\"1\"><z:APIKey>" + StorefrontAccount::kApiKey +
+           "</z:APIKey><z:DestinationUniqueID>bench</z:DestinationUniqueID><z:DestinationTypeID>48"
+           "</z:DestinationTypeID></z:DeviceSettings></s:Header><s:Body><z:getTitlesByNavigation><z:GenreID>1"
+           "</z:GenreID><z:CurrentPageNumber>1</z:CurrentPageNumber><z:ItemsPerPage>" +
+           std::to_string(kItems) +
+           "</z:ItemsPerPage><z:PurchaseType>rent</z:PurchaseType></z:getTitlesByNavigation></s:Body></s:Envelope>";
+}
+
+unsigned int CountTitles(xmlNodePtr node)
+{
+    unsigned int count = 0;
+    for (; node; node = node->next) {
+        if (node->type != XML_ELEMENT_NODE) continue;
+        count += strcmp(reinterpret_cast<const char*>(node->name), "TitleID") == 0;
+        count += CountTitles(node->children);
+    }
+    return count;
+}
+
+class Curl {
+public:
+    Curl() : m_Endpoint(Endpoint()), m_Authorities(Authorities()), m_Curl(curl_easy_init())
+    {
+        m_Headers = curl_slist_append(nullptr, "Content-Type: text/xml; charset=utf-8");
+        m_Headers = curl_slist_append(m_Headers, (std::string("SOAPAction: \"") + kAction + "\"").c_str());
+        curl_easy_setopt(m_Curl, CURLOPT_URL, m_Endpoint.c_str());
+        curl_easy_setopt(m_Curl, CURLOPT_CAINFO, m_Authorities.c_str());
+        curl_easy_setopt(m_Curl, CURLOPT_HTTPHEADER, m_Headers);
+        curl_easy_setopt(m_Curl, CURLOPT_USERAGENT, "bench");
+        curl_easy_setopt(m_Curl, CURLOPT_ACCEPT_ENCODING, "gzip");
+        curl_easy_setopt(m_Curl, CURLOPT_WRITEFUNCTION, Take);
+        curl_easy_setopt(m_Curl, CURLOPT_WRITEDATA, &m_Answer);
+    }
+    ~Curl()
+    {
+        curl_slist_free_all(m_Headers);
+        curl_easy_cleanup(m_Curl);
+    }
+
+    void GetTitles()
+    {
+        const std::string envelope = Envelope(m_Endpoint);
+        m_Answer.clear();
+        curl_easy_setopt(m_Curl, CURLOPT_POSTFIELDS, envelope.data());
+        curl_easy_setopt(m_Curl, CURLOPT_POSTFIELDSIZE, static_cast<long>(envelope.size()));
+        Check(curl_easy_perform(m_Curl) == CURLE_OK, "libcurl's request");
+        const xmlDocPtr document =
+            xmlReadMemory(m_Answer.data(), static_cast<int>(m_Answer.size()), nullptr, nullptr, XML_PARSE_NONET);
+        Check(document && CountTitles(xmlDocGetRootElement(document)) == kItems, "libcurl's answer");
+        xmlFreeDoc(document);
+    }
+
+private:
+    static size_t Take(char* bytes, size_t, size_t length, void* answer)
+    {
+        static_cast<std::string*>(answer)->append(bytes, length);
+        return length;
+    }
+
+    const std::string m_Endpoint;
+    const std::string m_Authorities;
+    CURL* m_Curl;
+    curl_slist* m_Headers;
+    std::string m_Answer;
+};
+
+void CurlAndXml(benchmark::State& state)
+{
+    Curl curl;
+    curl.GetTitles();
+    for (auto _ : state)
+        curl.GetTitles();
+}
+
+}  // namespace
+
+BENCHMARK(Library)->Name("warm/library");
+BENCHMARK(BareToolkit)->Name("warm/toolkit");
+BENCHMARK(CurlAndXml)->Name("warm/curl");

@@ -1,0 +1,16 @@
+#!/bin/bash
+# Runs every measurement and writes docs/performance.md. Further arguments go to zv_bench (--benchmark_filter=warm, for
+# one; then the table has only those rows). Wants a machine that does nothing else.
+set -euo pipefail
+cd "$(dirname "${BASH_SOURCE[0]}")/.."
+source cmake/setup.sh
+
+zv_install
+zv_build default zv_bench
+table=$(build/bin/zv_bench --benchmark_repetitions=7 --benchmark_enable_random_interleaving=true "$@" 2>build/bench.log) ||
+    { tail -n 5 build/bench.log >&2; exit 1; }
+{
+    cat bench/performance.head.md
+    echo "$table"
+} >docs/performance.md
+echo "$table"

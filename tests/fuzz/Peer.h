@@ -1,0 +1,101 @@
+// The other end of SOAP contexts' connections, in memory, and a session that has it for its services.
+#pragma once
+
+#include <map>
+#include <string>
+#include <string_view>
+
+#include "SessionImpl.h"
+
+/// Answers every connection with the same bytes and swallows what is sent. One exists at a time.
+class Peer {
+public:
+    /// `answer` is borrowed. `piece`: the most bytes that one receive gets.
+    explicit Peer(std::string_view answer, size_t piece = 65536);
+    /// Every connection has been closed by then.
+    ~Peer();
+    Peer(const Peer&) = delete;
+    Peer& operator=(const Peer&) = delete;
+
+    /// From now on the context's connections lead to the peer that exists then.
+    static void Attach(soap& context);
+
+    /// No further connection is accepted.
+    void Refuse() { m_Accepts = 0; }
+
+private:
+    static SOAP_SOCKET Open(soap* context, const char* endpoint, const char* host, int port);
+    static int Send(soap* context, const char* data, size_t length);
+    static size_t Receive(soap* context, char* buffer, size_t size);
+    static int CloseSocket(soap* context, SOAP_SOCKET socket);
+
+    static Peer* s_Current;
+    const std::string_view m_Answer;
+    const size_t m_Piece;
+    size_t m_At = 0;
+    int m_Accepts = 4;  // a call that walks pages gets the same one each time
+    int m_Open = 0;
+};
+
+/// What a session stored, by table and key.
+class MemoryCache : public CacheInterface {
+public:
+    /// Every table answers with `text`, a few times.
+    void Preset(std::string_view text);
+    bool empty() const { return m_Texts.empty(); }
+
+    int Open(const ZV_WS_CacheParam2&) override { return 0; }
+    int Close() override { return 0; }
+    bool ReadMetaData(const ZVString& name, const ZVString& key, ZVString& value) override;
+    bool WriteMetaData(const ZVString& name, const ZVString& key, const ZVString& value) override;
+    bool UpdateLastCacheLoadTime(const ZVString&) override { return true; }
+    bool WriteBoxArt(const ZVString&, ZV_WS_BoxArtSize, unsigned int, const ZVString&, unsigned int,
+                     const ZVString&) override
+    {
+        return true;
+    }
+    bool ReadBoxArt(const ZVString&, ZV_WS_BoxArtSize, unsigned int&, ZVString&, unsigned int&, ZVString&) override
+    {
+        return false;
+    }
+    bool SetBoxArtNeedUpdate() override { return true; }
+    bool ReadUserData(const ZVString& name, const ZVString& key, ZVString& value) override
+    {
+        return ReadMetaData(name, key, value);
+    }
+    bool WriteUserData(const ZVString& name, const ZVString& key, const ZVString& value) override
+    {
+        return WriteMetaData(name, key, value);
+    }
+    bool PurgeUserData(const ZVString&) override
+    {
+        m_Texts.clear();
+        return true;
+    }
+    bool ReadWishlistFlag(int, bool&) override { return false; }
+    bool WriteWishlistFlag(int, bool) override { return true; }
+    bool WriteWishlistFlags(const ZVWS_IntVector&, const ZVWS_BoolVector&) override { return true; }
+    bool RemoveWishlistFlag(int) override { return true; }
+    bool RemoveAllWishlistFlags() override { return true; }
+
+private:
+    std::map<std::string, ZVString> m_Texts;
+    ZVString m_Preset;
+    int m_PresetReads = 0;
+};
+
+/// A session as ZV_WS_initialize makes one, whose services are the current peer.
+class PeerSession {
+public:
+    PeerSession();
+    ~PeerSession() { ZV_WS_release(&m_Handle); }
+    PeerSession(const PeerSession&) = delete;
+    PeerSession& operator=(const PeerSession&) = delete;
+
+    ZV_WS_Session* handle() { return &m_Handle; }
+    SessionImpl& session() { return *m_Handle._pSessionImpl; }
+    MemoryCache& cache() { return static_cast<MemoryCache&>(*session().m_Cache); }
+
+private:
+    ZV_WS_Session m_Handle;
+};

@@ -1,0 +1,35 @@
+// A service's answer to a call. The input's first line names the call, the rest is a whole HTTP message.
+#include "Calls.h"
+#include "Peer.h"
+#include "Target.h"
+
+namespace {
+
+// Which text is secret must not hang on where the network cuts it.
+void FilterInPieces(std::string_view text)
+{
+    SecretFilter whole, pieces;
+    const size_t half = text.size() / 2;
+    ZVString cut = pieces.Filter(text.data(), half);
+    cut += pieces.Filter(text.data() + half, text.size() - half);
+    Require(whole.Filter(text.data(), text.size()).compare(cut) == 0, "secrets are found in pieces as in one");
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
+{
+    std::string_view input = AsText(data, size);
+    const std::string name = TakeLine(input);
+    FilterInPieces(input);
+    Peer peer(input);
+    PeerSession session;
+    CallResult first, second;
+    if (!MakeCall(name, session.handle(), first) || first.status != ZV_WS_Status_ok || session.cache().empty()) {
+        return 0;
+    }
+    peer.Refuse();
+    MakeCall(name, session.handle(), second);
+    Require(second == first, "what was stored answers like the service did");
+    return 0;
+}
