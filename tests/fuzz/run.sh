@@ -1,7 +1,8 @@
 #!/bin/bash
 # run.sh SECONDS [TARGET...]: builds the fuzz targets and runs each (all without names) that long over its seeds. What
 # the fuzzer learns stays in build-fuzz/corpus/TARGET and is used again; the exit code is 1 when an input broke a
-# property, leaked or crashed, and that input then lies in build-fuzz/findings/. Needs clang.
+# property, leaked or crashed, and that input then lies in build-fuzz/findings/. When its cause is mended, it belongs into
+# tests/fuzz/seeds/TARGET, under a name that says what was wrong. Needs clang.
 set -euo pipefail
 seconds=${1:?usage: run.sh SECONDS [TARGET...]}
 shift
