@@ -77,7 +77,7 @@ void Library(benchmark::State& state)
 {
     BenchSession& session = CachedPage::Get().session();
     const size_t before = TheStore().Log().size();
-    for (auto _ : state)
+    while (state.KeepRunning())
         session.GetTitles();
     Check(TheStore().Log().size() == before, "nothing was asked from the service");
 }
@@ -85,14 +85,14 @@ void Library(benchmark::State& state)
 void Database(benchmark::State& state)
 {
     const CachedPage& page = CachedPage::Get();
-    for (auto _ : state)
+    while (state.KeepRunning())
         benchmark::DoNotOptimize(page.Select());
 }
 
 void Inflate(benchmark::State& state)
 {
     const std::string packed = CachedPage::Get().Select();
-    for (auto _ : state)
+    while (state.KeepRunning())
         benchmark::DoNotOptimize(Inflated(packed));
 }
 
@@ -100,7 +100,7 @@ void Parse(benchmark::State& state)
 {
     const std::string text = Inflated(CachedPage::Get().Select());
     const ZVString xml(text.data(), text.size());
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         Serializer serializer(false, false);
         Response response;
         Check(serializer.Read(xml, response), "parse");
@@ -113,7 +113,7 @@ void Convert(benchmark::State& state)
     Serializer serializer(false, false);
     Response response;
     Check(serializer.Read(ZVString(text.data(), text.size()), response), "parse");
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         ZV_WS_TitlesResponse titles;
         Records::Tag(titles);
         ZVUtilities::Convert(response.getTitlesByNavigationResult, titles);
@@ -150,7 +150,7 @@ void Store(benchmark::State& state, int pages)
     for (int page = 0; page < pages; ++page)
         write(page);
     int page = 0;
-    for (auto _ : state)
+    while (state.KeepRunning())
         write(page++);
 }
 

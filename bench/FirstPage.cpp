@@ -48,14 +48,14 @@ double UntilPage(const char* movie)
 void Process(benchmark::State& state, const char* movie)
 {
     TheStore();
-    for (auto _ : state)
+    while (state.KeepRunning())
         state.SetIterationTime(UntilPage(movie));
 }
 
 // The same in a process that runs: set-up of a session and its first call, without ticks.
 void Session(benchmark::State& state)
 {
-    for (auto _ : state)
+    while (state.KeepRunning())
         BenchSession().GetTitles();
 }
 

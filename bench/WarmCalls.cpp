@@ -33,7 +33,7 @@ void Library(benchmark::State& state)
 {
     BenchSession session;
     session.GetTitles();
-    for (auto _ : state)
+    while (state.KeepRunning())
         session.GetTitles();
 }
 
@@ -89,7 +89,7 @@ void BareToolkit(benchmark::State& state)
 {
     Toolkit toolkit;
     toolkit.GetTitles();
-    for (auto _ : state)
+    while (state.KeepRunning())
         toolkit.GetTitles();
 }
 
@@ -203,7 +203,7 @@ void CurlAndXml(benchmark::State& state)
 {
     Curl curl;
     curl.GetTitles();
-    for (auto _ : state)
+    while (state.KeepRunning())
         curl.GetTitles();
 }
 

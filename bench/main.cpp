@@ -80,6 +80,8 @@ const struct {
      true},
     {"Warm `ZV_WS_getTitles`, 20 titles", "warm/library", "libcurl with libxml2, connection kept", "warm/curl", 1.2,
      true},
+    {"Bare SOAP toolkit, connection kept", "warm/toolkit", "libcurl with libxml2, connection kept", "warm/curl", 0,
+     true},
     {"Cached `ZV_WS_getTitles`, 20 titles", "cached/library", "open, select, close + inflate + parse + convert",
      "cached/database+cached/inflate+cached/parse+cached/convert", 1.3, true},
     {"of which open, select, close", "cached/database", "the cached call", "cached/library", 0, true},

@@ -56,13 +56,12 @@ private:
 
 void ImageToFile(SessionImpl& session)
 {
-    static const Folder folder;
+    const Folder folder;
     BoxArtDownloader downloader(session.m_Download.transport());
     const ZV_WS_Status status = downloader.DownloadToFile("ZV00001", BOX_ART_SIZE_95, "", folder.File());
     Require(folder.Entries() == (status == ZV_WS_Status_ok), "a whole image is left, or nothing");
     if (status != ZV_WS_Status_ok) return;
     Require(std::filesystem::file_size(folder.File().c_str()) == downloader.GetContentLength(), "the file is whole");
-    std::filesystem::remove(folder.File().c_str());
 }
 
 // The clock is asked without a session, over a connection of its own.

@@ -103,8 +103,10 @@ public:
                 "ws.getSysInfo(",        "ws.fileExist(",     "ws.trace(",        "new com.orvex.ZVWSLib("};
             const std::string call = kCalls[Next() % std::size(kCalls)];
             const bool isArray = call.find('[') != std::string::npos;
-            const std::string more = Next() % 4 == 0 ? ", " + Value(0) : "";
-            text += "try { " + call + Value(0) + more + (isArray ? "]" : "") + "); } catch (e) {}\n";
+            const bool isMore = Next() % 4 == 0;
+            text.append("try { ").append(call).append(Value(0));
+            if (isMore) text.append(", ").append(Value(0));
+            text.append(isArray ? "]" : "").append("); } catch (e) {}\n");
         }
         return text;
     }
@@ -161,51 +163,37 @@ private:
     {
         std::string text = "{";
         for (unsigned int count = Next() % 12; count > 0; --count)
-            text += (text.size() > 1 ? ", " : "") + Name() + ": " + Value(depth + 1);
+            text.append(text.size() > 1 ? ", " : "").append(Name()).append(": ").append(Value(depth + 1));
         return text + "}";
     }
 
+    std::string Getter(int depth)
+    {
+        const std::string name = Name();
+        return "Object.defineProperty({}, " + name + ", {get: function () { return " + Value(depth + 1) + "; }})";
+    }
+
+    // One step after the other: every compiler makes the same script of an input.
     std::string Value(int depth)
     {
         // Its text would take the engine minutes, which is the script's own fault.
         static const char kEndless[] =
             "(function () { var a = new Array(4294967295); a.toString = function () { return 'endless'; }; return a; "
             "})()";
-        static const char* const kPlain[] = {"null",
-                                             "undefined",
-                                             "true",
-                                             "false",
-                                             "NaN",
-                                             "-Infinity",
-                                             "-0",
-                                             "2147483648",
-                                             "-2147483649",
-                                             "4294967296",
-                                             "''",
-                                             "'12'",
-                                             "'0x10'",
-                                             "new Date(NaN)",
-                                             "/x/",
-                                             "function () {}",
-                                             "ws",
-                                             "com",
-                                             "fuzz.Probe",
-                                             "[,,]",
-                                             "Object.create(null)",
-                                             kEndless,
-                                             "{valueOf: function () { throw 1; }}",
-                                             "{toString: function () { return {}; }, valueOf: null}",
-                                             "{get genreid() { throw 2; }}",
-                                             "{get titleids() { return [1, 2]; }}",
-                                             "new Proxy([], {get: function (t, name) { return name; }})"};
+        // clang-format off
+        static const char* const kPlain[] = {
+            "null", "undefined", "true", "false", "NaN", "-Infinity", "-0", "2147483648", "-2147483649", "4294967296",
+            "''", "'12'", "'0x10'", "new Date(NaN)", "/x/", "function () {}", "ws", "com", "fuzz.Probe", "[,,]",
+            "Object.create(null)", kEndless, "{valueOf: function () { throw 1; }}",
+            "{toString: function () { return {}; }, valueOf: null}", "{get genreid() { throw 2; }}",
+            "{get titleids() { return [1, 2]; }}", "new Proxy([], {get: function (t, name) { return name; }})"};
+        // clang-format on
         const unsigned int kind = Next();
         if (depth > 3 || kind < 96) return std::string("(") + kPlain[kind % std::size(kPlain)] + ")";
         if (kind < 120) return Text();
         if (kind < 144) return Number();
         if (kind < 176) return Array(depth);
-        if (kind < 184)
-            return "Object.defineProperty({}, " + Name() + ", {get: function () { return " + Value(depth + 1) + "; }})";
-        return Object(depth);
+        return kind < 184 ? Getter(depth) : Object(depth);
     }
 
     std::string_view m_Input;

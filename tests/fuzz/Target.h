@@ -24,7 +24,7 @@ inline void Require(bool holds, const char* what)
 inline std::string TakeLine(std::string_view& text)
 {
     const size_t end = text.find('\n');
-    const std::string line(text.substr(0, end));
+    std::string line(text.substr(0, end));
     text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
     return line;
 }
