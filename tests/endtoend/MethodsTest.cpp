@@ -2,7 +2,7 @@
 // keeps the order of the properties, and compared with what the simulator's database says, also as JSON.
 #include <gtest/gtest.h>
 
-#include "Process.h"
+#include "Movie.h"
 #include "Storefront.h"
 
 namespace {
@@ -276,7 +276,9 @@ TEST(Methods, AnswerWhatTheStoreHolds)
     for (const Row& row : rows)
         expected.push_back(store->Query(row.expected));
 
-    const ProcessOutput output = RunMovieText(Movie(rows), {{"ZV_DEPLOYMENT", store->DeploymentFile()}, {"TZ", "UTC"}});
+    const Folder folder;
+    const MovieOutput output = RunMovieFile(folder.Write("movie.js", Movie(rows)),
+                                            {{"ZV_DEPLOYMENT", store->DeploymentFile()}, {"TZ", "UTC"}});
     EXPECT_EQ(0, output.status);
     EXPECT_EQ("0 true", output.After("=init "));
     EXPECT_EQ("seen", output.After("FLASH TRACE == "));

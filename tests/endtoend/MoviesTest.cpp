@@ -1,7 +1,7 @@
 // The movies that come with the project, and what a movie sees when the store is not as it should be.
 #include <gtest/gtest.h>
 
-#include "Process.h"
+#include "Movie.h"
 #include "Storefront.h"
 
 namespace {
@@ -15,13 +15,13 @@ protected:
         ASSERT_TRUE(store) << error;
     }
 
-    ProcessOutput Run(const std::string& movie, const std::string& deployment = "")
+    MovieOutput Run(const std::string& movie, const std::string& deployment = "")
     {
         return RunMovieFile(std::string(ZV_MOVIES) + "/" + movie,
                             {{"ZV_DEPLOYMENT", deployment.empty() ? store->DeploymentFile() : deployment}});
     }
 
-    static void ExpectScriptErrors(const ProcessOutput& output, const std::string& error)
+    static void ExpectScriptErrors(const MovieOutput& output, const std::string& error)
     {
         EXPECT_EQ(error, output.After("script error: ").substr(0, error.size())) << output.Text();
     }
@@ -31,7 +31,7 @@ protected:
 
 TEST_F(Demonstration, TheStoreIsShown)
 {
-    const ProcessOutput output = Run("storefront.js");
+    const MovieOutput output = Run("storefront.js");
     EXPECT_EQ(0, output.status);
     ExpectScriptErrors(output, "(none)");
     EXPECT_EQ("", output.After("Genres"));
@@ -47,7 +47,7 @@ TEST_F(Demonstration, TheStoreIsShown)
 
 TEST_F(Demonstration, AnEveningChangesTheAccount)
 {
-    const ProcessOutput output = Run("evening.js");
+    const MovieOutput output = Run("evening.js");
     EXPECT_EQ(0, output.status);
     ExpectScriptErrors(output, "(none)");
     EXPECT_EQ("0 goes on at 1234 s", output.After("loadLastStreamingAssetLocation: "));
@@ -70,7 +70,7 @@ TEST_F(Demonstration, AStoreThatCannotBeTrustedOrReachedEndsTheMovieWithAnError)
 
 TEST_F(Demonstration, AMovieThatCannotBeReadIsOneLine)
 {
-    const ProcessOutput output = Run("no-such-movie.js");
+    const MovieOutput output = Run("no-such-movie.js");
     EXPECT_EQ("", output.After("[ZV_FLASH]CreateAndConfigureStageWindowSet fail "));
     EXPECT_NE(std::string::npos, output.After("stagecraft: cannot read the movie ").find("no-such-movie.js"));
 }
