@@ -28,8 +28,8 @@
 //   checkZVSWFmd5sum(path, sum) boolean: whether the file has that MD5 sum, in hexadecimal digits
 //   setLogAreaIDsAndTargetConfig({LogAreaIDs, LogTarget, SettingsFile, PreferenceFile})
 //                               bits of areas and target, as numbers or texts in any base of C; the log file stands
-//                               beside the first file given with a folder. ZV_LOG_AREAS and ZV_LOG_TARGET in the
-//                               environment override. 0; 1 no target, 2 file cannot be opened, -3 no object
+//                               beside the first file given with a folder. ZV_LOG ("areas,target,folder")
+//                               in the environment overrides. 0; 1 no target, 2 file cannot be opened, -3 no object
 //   trace(value)                prints the value's text
 #pragma once
 

@@ -95,14 +95,12 @@ TEST_F(Log, AMovieSetsItUp)
 
 TEST_F(Log, TheEnvironmentOverridesTheMovie)
 {
-    setenv("ZV_LOG_AREAS", "256", 1);
-    setenv("ZV_LOG_TARGET", "02", 1);
+    setenv("ZV_LOG", ("0x100,02," + m_Folder).c_str(), 1);
     const MovieRun run = RunMovie(
         "var lib = com.orvex.ZVWSLib;\n"
-        "report(lib.setLogAreaIDsAndTargetConfig({LogAreaIDs: 0, LogTarget: 1, PreferenceFile: '" +
-        m_Folder + "p'}));\nnew lib().getNavigation();\n");
-    unsetenv("ZV_LOG_AREAS");
-    unsetenv("ZV_LOG_TARGET");
+        "report(lib.setLogAreaIDsAndTargetConfig({LogAreaIDs: 0, LogTarget: 1, PreferenceFile: '/no/such/p'}));\n"
+        "new lib().getNavigation();\n");
+    unsetenv("ZV_LOG");
     EXPECT_EQ("0\n", run.Text());
     EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
 }

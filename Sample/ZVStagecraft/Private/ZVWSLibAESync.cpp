@@ -183,19 +183,34 @@ void ZVWSLibAE::getAvailableEnvLists(StageWindow* /*window*/, ASObject& object, 
 
 namespace {
 
-// A number in any base that C knows ("0x300"), from the environment when it is set there.
-unsigned int LogSetting(ASObject& settings, const char* property, const char* variable)
+// A number in any base that C knows ("0x300"); 0 when it is none.
+unsigned int NumberOf(const ZVString& text)
 {
-    const char* override = getenv(variable);
-    const AEString text = override && *override ? AEString(override) : settings.GetText(property);
     return static_cast<unsigned int>(strtoul(text.c_str(), nullptr, 0));
 }
 
-// The log file stands beside the settings.
+// From the text up to the next comma, which is taken off with it.
+ZVString NextField(ZVString& text)
+{
+    const size_t comma = text.find(',');
+    const ZVString field = text.substr(0, comma);
+    text = comma == ZVString::npos ? ZVString() : text.substr(comma + 1);
+    return field;
+}
+
+// "areas,target,folder" of the environment, which has the last word.
+int InitLogsAs(ZVString given)
+{
+    const unsigned int areas = NumberOf(NextField(given));
+    const auto target = static_cast<unsigned char>(NumberOf(NextField(given)));
+    return given.empty() ? ZVWSAELog::InitWSLogs(areas, target) : ZVWSAELog::InitWSLogs(areas, target, given.c_str());
+}
+
+// What the movie asks for. The log file stands beside the settings.
 int InitLogs(ASObject& settings)
 {
-    const unsigned int areas = LogSetting(settings, "LogAreaIDs", "ZV_LOG_AREAS");
-    const auto target = static_cast<unsigned char>(LogSetting(settings, "LogTarget", "ZV_LOG_TARGET"));
+    const unsigned int areas = NumberOf(settings.GetText("LogAreaIDs").c_str());
+    const auto target = static_cast<unsigned char>(NumberOf(settings.GetText("LogTarget").c_str()));
     for (const char* property : {"SettingsFile", "PreferenceFile"}) {
         const AEString path = settings.GetText(property);
         if (!strchr(path.c_str(), ZVFile::PATH_SEPERATOR)) continue;
@@ -210,5 +225,9 @@ void ZVWSLibAE::setLogAreaIDsAndTargetConfig(StageWindow* /*window*/, ASObject& 
                                              ASValue& returnValue)
 {
     const bool given = arguments.size() == 1 && arguments[0].IsObject();
-    returnValue = ASValue::Number(given ? InitLogs(*arguments[0].GetObject()) : static_cast<int>(kWrongArguments));
+    const char* override = getenv("ZV_LOG");
+    const auto init = [&] {
+        return override && *override ? InitLogsAs(override) : InitLogs(*arguments[0].GetObject());
+    };
+    returnValue = ASValue::Number(given ? init() : static_cast<int>(kWrongArguments));
 }
