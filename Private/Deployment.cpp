@@ -44,10 +44,9 @@ Deployment Defaults()
 
 std::string Trimmed(const std::string& text)
 {
-    const char* const kBlank = " \t\r";
-    const size_t first = text.find_first_not_of(kBlank);
-    if (first == std::string::npos) return std::string();
-    return text.substr(first, text.find_last_not_of(kBlank) - first + 1);
+    ZVString trimmed(text.data(), text.size());
+    trimmed.trim();
+    return std::string(trimmed.c_str(), trimmed.length());
 }
 
 // What is wrong with the line, or null.

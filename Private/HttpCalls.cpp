@@ -13,7 +13,7 @@
 #include "CallGuard.h"
 #include "RawHttp.h"
 #include "Records.h"
-#include "SessionImpl.h"
+#include "ServiceCall.h"
 #include "ZVAssert.h"
 #include "ZVUtilities.h"
 
@@ -167,7 +167,7 @@ ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime)
 {
     ZV_ASSERT(serverTime != 0);
     *serverTime = -1;
-    return GuardCall([&] {
+    const ZV_WS_Status status = GuardCall([&] {
         const std::unique_ptr<soap, SoapDeleter> context(soap_new());
         if (!context) return ZV_WS_Status_general_error;
         Transport transport(*context);
@@ -175,6 +175,8 @@ ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime)
         RawHttp http(transport);
         return ReadClock(http, Deployment::Current().web_host, *serverTime);
     });
+    LogCall(__func__, status, 0);
+    return status;
 }
 
 ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSecond)
@@ -182,19 +184,22 @@ ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSe
     ZV_ASSERT(bitsPerSecond != 0);
     *bitsPerSecond = 0;
     if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
-    return GuardCall([&] { return CheckBandwidth(handle, *bitsPerSecond); });
+    const ZV_WS_Status status = GuardCall([&] { return CheckBandwidth(handle, *bitsPerSecond); });
+    LogCall(__func__, status, 0);
+    return status;
 }
 
 ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address)
 {
     ZV_ASSERT(address != 0);
-    return GuardCall([&] {
+    const ZV_WS_Status status = GuardCall([&] {
         Records::Tag(*address);
         if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
         ZVString text = OnlyAddress();
-        const ZV_WS_Status status =
-            text.empty() ? AddressTowardsService(*handle->_pSessionImpl, text) : ZV_WS_Status_ok;
-        if (status == ZV_WS_Status_ok) ZVUtilities::SetText(*address, text);
-        return status;
+        const ZV_WS_Status found = text.empty() ? AddressTowardsService(*handle->_pSessionImpl, text) : ZV_WS_Status_ok;
+        if (found == ZV_WS_Status_ok) ZVUtilities::SetText(*address, text);
+        return found;
     });
+    LogCall(__func__, status, 0);
+    return status;
 }

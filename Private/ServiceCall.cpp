@@ -18,10 +18,14 @@ ZV_WS_Status ServiceCallBase::Finish(soap& context, const Outcome& outcome)
     soap_destroy(&context);
     soap_end(&context);
     context.header = nullptr;
-    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, ret:%d,responseCode:%d\n", m_Function, outcome.result,
-                 outcome.responseCode);
+    LogCall(m_Function, outcome.result, outcome.responseCode);
     if (outcome.result == SOAP_OK && !outcome.answered) return ZV_WS_Status_general_error;
     return ZVUtilities::To_ZV_WS_Status(outcome.result, m_UsesResponseCode ? outcome.responseCode : 0, m_Function);
+}
+
+void LogCall(const char* function, int result, int responseCode)
+{
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, ret:%d,responseCode:%d\n", function, result, responseCode);
 }
 
 ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status)

@@ -217,6 +217,9 @@ inline ZV1__ArrayOfInt BorrowedInts(const int* numbers, unsigned int count)
 /// status.
 ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status);
 
+/// The line with which every call ends; those that ask no operation give their status as the result.
+void LogCall(const char* function, int result, int responseCode);
+
 /// Logs the answer of a yes-or-no call; returns its status.
 ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, bool answer);
 

@@ -107,6 +107,7 @@ ZV_WS_Status ZV_WS_checkTitleInWishlist(ZV_WS_Session* handle, int titleID, bool
     if (!call.Accepts()) return call.Refusal();
     CacheInterface* cache = call.session().m_Cache.get();
     if (cache && cache->ReadWishlistFlag(titleID, *isInWishlist)) {
+        LogCall(__func__, ZV_WS_Status_ok, 0);
         return LogAnswer(__func__, ZV_WS_Status_ok, *isInWishlist);
     }
     call->TitleID = titleID;
@@ -120,21 +121,23 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
                                          ZV_WS_TitleTypeFilter typeFilter, ZV_WS_TitlesInWishlist* answers)
 {
     ZV_ASSERT(answers != 0);
-    return GuardCall([&] {
+    const ZV_WS_Status status = GuardCall([&] {
         Records::Tag(*answers);
         if (!SessionOf(handle) || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
         const SessionImpl& session = *handle->_pSessionImpl;
         Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
         if (count == 0 || (session.m_Cache && ReadFlags(session, titleIDs, *answers))) return ZV_WS_Status_ok;
         std::set<int> wished;
-        const ZV_WS_Status status = ReadList(handle, typeFilter, wished);
-        if (status != ZV_WS_Status_ok) {
+        const ZV_WS_Status listed = ReadList(handle, typeFilter, wished);
+        if (listed != ZV_WS_Status_ok) {
             Records::FreeMembers(*answers);
-            return status;
+            return listed;
         }
         std::transform(titleIDs, titleIDs + count, answers->IsAvailInUserWishlist,
                        [&](int titleID) { return wished.count(titleID) != 0; });
         if (session.m_Cache) WriteFlags(session, titleIDs, *answers, typeFilter == TITLE_TYPE_FILTER_ANY);
         return ZV_WS_Status_ok;
     });
+    LogCall(__func__, status, 0);
+    return status;
 }

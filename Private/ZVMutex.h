@@ -1,4 +1,4 @@
-// The mutex that all code here uses: std::mutex with the annotations that let Clang check who may touch what.
+// The mutex of the library and the host: std::mutex with the annotations that let Clang check who may touch what.
 #pragma once
 
 #include <chrono>
@@ -27,19 +27,22 @@ private:
     std::mutex m_Mutex;
 };
 
-class ZV_THREAD_ATTRIBUTE(scoped_lockable) ZVMutexLock {
+/// Holds a mutex of any kind as long as it exists.
+template <class Mutex>
+class ZV_THREAD_ATTRIBUTE(scoped_lockable) ZVScopedLock {
 public:
-    explicit ZVMutexLock(ZVMutex& mutex) ZV_THREAD_ATTRIBUTE(acquire_capability(mutex)) : m_Mutex(mutex)
+    explicit ZVScopedLock(Mutex& mutex) ZV_THREAD_ATTRIBUTE(acquire_capability(mutex)) : m_Mutex(mutex)
     {
         m_Mutex.lock();
     }
-    ~ZVMutexLock() ZV_THREAD_ATTRIBUTE(release_capability()) { m_Mutex.unlock(); }
-    ZVMutexLock(const ZVMutexLock&) = delete;
-    ZVMutexLock& operator=(const ZVMutexLock&) = delete;
+    ~ZVScopedLock() ZV_THREAD_ATTRIBUTE(release_capability()) { m_Mutex.unlock(); }
+    ZVScopedLock(const ZVScopedLock&) = delete;
+    ZVScopedLock& operator=(const ZVScopedLock&) = delete;
 
 private:
-    ZVMutex& m_Mutex;
+    Mutex& m_Mutex;
 };
+using ZVMutexLock = ZVScopedLock<ZVMutex>;
 
 /// Waits with a ZVMutex held, which is free while it waits. Wake-ups without a cause occur: wait in a loop.
 class ZVCondition {

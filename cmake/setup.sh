@@ -23,11 +23,11 @@ zv_install() {
             >/dev/null
 }
 
-# zv_build PRESET [TARGET...]: configures build folder of the preset when needed and builds.
+# zv_build PRESET [TARGET...]: configures build folder of the preset when needed and builds. ZV_CMAKE_OPTIONS goes to cmake.
 zv_build() {
     local preset=$1
     shift
     (cd "$zv_root" &&
-        cmake --preset "$preset" >/dev/null &&
+        cmake --preset "$preset" ${ZV_CMAKE_OPTIONS:-} >/dev/null &&
         cmake --build --preset "$preset" ${*:+--target "$@"})
 }

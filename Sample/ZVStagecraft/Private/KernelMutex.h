@@ -18,16 +18,4 @@ private:
     IAEKernel::Mutex* m_Mutex;
 };
 
-class ZV_THREAD_ATTRIBUTE(scoped_lockable) KernelLock {
-public:
-    explicit KernelLock(KernelMutex& mutex) ZV_THREAD_ATTRIBUTE(acquire_capability(mutex)) : m_Mutex(mutex)
-    {
-        m_Mutex.lock();
-    }
-    ~KernelLock() ZV_THREAD_ATTRIBUTE(release_capability()) { m_Mutex.unlock(); }
-    KernelLock(const KernelLock&) = delete;
-    KernelLock& operator=(const KernelLock&) = delete;
-
-private:
-    KernelMutex& m_Mutex;
-};
+using KernelLock = ZVScopedLock<KernelMutex>;
