@@ -1,4 +1,7 @@
 // What was seen once comes back without the network.
+#include <signal.h>
+#include <sys/resource.h>
+
 #include <filesystem>
 #include <fstream>
 #include <functional>
@@ -259,6 +262,31 @@ TEST_F(Cached, ABrokenCacheIsNoCache)
     }
 }
 
+// Nothing more fits on the disk: what is not there yet comes from the service each time, and nothing is left half
+// written.
+TEST_F(Cached, AFullDiskIsNoCache)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    rlimit before;
+    getrlimit(RLIMIT_FSIZE, &before);
+    const rlimit full = {1, before.rlim_max};
+    const auto handler = signal(SIGXFSZ, SIG_IGN);
+    setrlimit(RLIMIT_FSIZE, &full);
+    EXPECT_EQ(ZV_WS_Status_ok, Listing());
+    EXPECT_EQ(ZV_WS_Status_ok, Listing());
+    Owned<ZV_WS_String> place;
+    EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, "ZV00012", &place));
+    setrlimit(RLIMIT_FSIZE, &before);
+    signal(SIGXFSZ, handler);
+    EXPECT_EQ((std::vector<std::string>{"getTitleListing", "getTitleListing", "ZV00012"}), Asked());
+    EXPECT_FALSE(fs::exists(folder + "/ZV0001295.jpg"));
+    // With room again it is a cache again.
+    store->ClearLog();
+    Listing();
+    Listing();
+    EXPECT_EQ(1u, store->Log().size());
+}
+
 // ---- Box art
 
 class BoxArt : public Cached {
@@ -377,6 +405,41 @@ TEST_F(BoxArt, IsAFileOrAnAddress)
     EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_clearLocalCache(folder.c_str()));
     EXPECT_TRUE(fs::is_empty(folder));
     EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_clearLocalCache(""));
+}
+
+// What lies in the folder without the cache knowing of it is not trusted.
+TEST_F(BoxArt, AFileWithoutItsRowIsReplaced)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    std::ofstream(File()) << "left over from another time";
+    Owned<ZV_WS_Image> image;
+    ASSERT_EQ(ZV_WS_Status_ok, Image(&image));
+    EXPECT_EQ(fs::file_size(File()), image.size);
+    EXPECT_EQ(0xff, image.data[0]);
+}
+
+// The oldest titles make room, also when somebody has removed their files.
+TEST_F(BoxArt, EvictionFindsItsFilesGone)
+{
+    ZV_WS_SetupParams setup = Setup();
+    folder = store->DataFolder() + "/cache";
+    setup.CacheParam = {CacheType_File, ZV_WS_CacheParam::CacheData_BoxArtImage, 358400, folder.c_str()};
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+    for (int title = 1; title <= 40; ++title) {
+        char prefix[16];
+        snprintf(prefix, sizeof prefix, "ZV%05d", title);
+        Owned<ZV_WS_String> place;
+        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_321, prefix, &place)) << title;
+        if (title % 3 == 0) fs::remove(place.data);
+    }
+    size_t files = 0, bytes = 0;
+    for (const auto& entry : fs::directory_iterator(folder)) {
+        if (entry.path().extension() != ".jpg") continue;
+        ++files;
+        bytes += entry.file_size();
+    }
+    EXPECT_LT(files, 27u) << "nothing was evicted";
+    EXPECT_LT(bytes, 2 * 358400u);
 }
 
 TEST_F(BoxArt, PrefixesThatLeaveTheFolderAreRefused)
