@@ -1,4 +1,5 @@
 #include <array>
+#include <memory>
 
 #include "Records.h"
 #include "SessionImpl.h"
@@ -17,9 +18,11 @@ void FreeRecord(ZV_WS_Object* record)
 
 void FreeSession(ZV_WS_Object* record)
 {
-    auto* session = static_cast<ZV_WS_Session*>(record);
-    delete session->_pSessionImpl;
-    session->_pSessionImpl = nullptr;
+    auto* handle = static_cast<ZV_WS_Session*>(record);
+    std::unique_ptr<SessionImpl> session;  // ends after the lock
+    ZVMutexLock lock(HandleMutex());
+    session.reset(handle->_pSessionImpl);
+    handle->_pSessionImpl = nullptr;
 }
 
 template <class... R>
@@ -48,6 +51,12 @@ constexpr bool HasUniqueTags(std::tuple<R...>*)
 static_assert(HasUniqueTags(static_cast<ZV_WS_AllRecords*>(nullptr)), "two records share a tag");
 
 }  // namespace
+
+ZVMutex& HandleMutex()
+{
+    static auto* mutex = new ZVMutex;  // outlives threads that still end a session at exit
+    return *mutex;
+}
 
 ZV_WS_Status ZV_WS_release(ZV_WS_Object* any)
 {

@@ -163,7 +163,9 @@ void MakeEmptySession(ZV_WS_Session& handle)
     handle._pImpl = nullptr;
     handle._pSessionImpl = nullptr;
     handle._pImpl = new unsigned int(SessionImpl::kTag);
-    handle._pSessionImpl = new SessionImpl;
+    auto session = std::make_unique<SessionImpl>();
+    ZVMutexLock lock(HandleMutex());
+    handle._pSessionImpl = session.release();
 }
 
 // The device's kind of access, asked from the service when the caller does not know it.
@@ -265,6 +267,17 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
         const bool opened = session.m_Params.CacheKind != CacheType_File || OpenCache(session, false);
         return opened ? ZV_WS_Status_ok : ZV_WS_Status_local_cache_error;
     });
+}
+
+void ZV_WS_abort(const ZV_WS_Session* handle)
+{
+    if (!handle) return;
+    ZVMutexLock lock(HandleMutex());
+    SessionImpl* session = handle->_pSessionImpl;
+    if (!session) return;
+    session->m_Browse.transport().Abort();
+    session->m_Stream.transport().Abort();
+    session->m_Download.transport().Abort();
 }
 
 ZV_WS_Status ZV_WS_getVersion(ZV_WS_VersionInfo* version)

@@ -7,6 +7,7 @@
 #include "RealTimeBrowse.h"
 #include "SetupParams2.h"
 #include "StreamDownloadAPI.h"
+#include "ZVMutex.h"
 
 struct SessionImpl {
     static constexpr unsigned int kTag = 1;
@@ -22,7 +23,10 @@ struct SessionImpl {
     bool Caches(ZV_WS_CacheParam::CacheData kind) const { return m_Cache && (m_Params.CacheData & kind) != 0; }
 };
 
-/// The session behind a handle; null when there is none.
+/// Held while a handle gets or loses its session, and while ZV_WS_abort, which may come from another thread, uses one.
+ZVMutex& HandleMutex();
+
+/// The session behind a handle; null when there is none. For the thread that uses the handle.
 inline SessionImpl* SessionOf(const ZV_WS_Session* handle)
 {
     return handle ? handle->_pSessionImpl : nullptr;

@@ -4,9 +4,11 @@
 #include <string.h>
 #include <sys/socket.h>
 #include <time.h>
+#include <unistd.h>
 
 #include <algorithm>
 
+#include "Connector.h"
 #include "Namespaces.h"
 #include "RawHttp.h"
 #include "ReadLimits.h"
@@ -50,6 +52,7 @@ SigpipeGuard::~SigpipeGuard()
 Transport::Transport(soap& context)
     : m_Soap(context),
       m_Open(context.fopen),
+      m_CloseSocket(context.fclosesocket),
       m_Send(context.fsend),
       m_Receive(context.frecv),
       m_Header(context.fposthdr)
@@ -63,6 +66,7 @@ Transport::Transport(soap& context)
     context.fpreparerecv = PreparedHook;
     context.fposthdr = HeaderHook;
     context.fshutdownsocket = ShutdownHook;
+    context.fclosesocket = CloseHook;
     context.cookie_max = 0;
     LimitReading(context);
     context.ssl_flags = SOAP_SSL_DEFAULT | SOAP_TLSv1_2 | SOAP_TLSv1_3 | SOAP_SSL_NO_DEFAULT_CA_PATH;
@@ -151,7 +155,63 @@ SOAP_SOCKET Transport::OpenHook(soap* context, const char* endpoint, const char*
 {
     Transport& self = Of(context);
     self.m_Connected = true;
-    return self.m_Open(context, endpoint, host, port);
+    // The way through a proxy is the toolkit's.
+    const SOAP_SOCKET socket =
+        context->proxy_host ? self.m_Open(context, endpoint, host, port) : self.Open(endpoint, host, port);
+    self.Watch(socket);
+    return socket;
+}
+
+SOAP_SOCKET Transport::Open(const char* endpoint, const char* host, int port)
+{
+    const Patience patience = {ZVUtilities::MillisecondTime() + 1000ull * m_Soap.connect_timeout, m_Aborted};
+    m_Soap.imode &= ~SOAP_ENC_SSL;
+    m_Soap.omode &= ~SOAP_ENC_SSL;
+    m_Soap.errnum = 0;
+    const int socket = Connector::OpenTcp(host, port, patience);
+    if (socket < 0) {
+        m_Soap.error = SOAP_TCP_ERROR;
+        return SOAP_INVALID_SOCKET;
+    }
+    if (!IsTls(endpoint) || OpenTls(socket, host, port)) return socket;
+    close(socket);
+    m_Soap.error = SOAP_SSL_ERROR;
+    return SOAP_INVALID_SOCKET;
+}
+
+// Offers the last session with the same host and port; the toolkit keeps it when it closes a connection.
+bool Transport::OpenTls(int socket, const char* host, int port)
+{
+    const Patience patience = {ZVUtilities::MillisecondTime() + 1000ull * m_Soap.connect_timeout, m_Aborted};
+    const bool isSame = m_Soap.session && strcmp(m_Soap.session_host, host) == 0 && m_Soap.session_port == port;
+    m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, isSame ? m_Soap.session : nullptr, patience);
+    if (m_Soap.session) SSL_SESSION_free(m_Soap.session);
+    m_Soap.session = nullptr;
+    if (!m_Soap.ssl) return false;
+    m_Soap.imode |= SOAP_ENC_SSL;
+    m_Soap.omode |= SOAP_ENC_SSL;
+    return true;
+}
+
+void Transport::Watch(SOAP_SOCKET socket)
+{
+    ZVMutexLock lock(m_AbortMutex);
+    m_Watched = socket;
+    if (m_Aborted && soap_valid_socket(socket)) shutdown(socket, SHUT_RDWR);
+}
+
+void Transport::Abort()
+{
+    ZVMutexLock lock(m_AbortMutex);
+    m_Aborted = true;
+    if (soap_valid_socket(m_Watched)) shutdown(m_Watched, SHUT_RDWR);
+}
+
+int Transport::CloseHook(soap* context, SOAP_SOCKET socket)
+{
+    Transport& self = Of(context);
+    self.Watch(SOAP_INVALID_SOCKET);
+    return self.m_CloseSocket(context, socket);
 }
 
 int Transport::SendHook(soap* context, const char* data, size_t length)

@@ -9,8 +9,11 @@
 #include <stdsoap2.h>
 #include <strings.h>
 
+#include <atomic>
+
 #include "Deployment.h"
 #include "TrafficLog.h"
+#include "ZVMutex.h"
 #include "ZVString.h"
 
 /// While one exists, a connection that the peer has reset does not kill the process: SIGPIPE is blocked in the calling
@@ -63,11 +66,20 @@ public:
     /// Closes the connection at once, without waiting for the peer.
     void Close();
 
+    /// Any thread: breaks off the exchange that is under way and lets no other begin. For the end of a session whose
+    /// call hangs.
+    void Abort() ZV_EXCLUDES(m_AbortMutex);
+
     /// The one whose authorities were loaded; the current one before.
     const Deployment& deployment() const { return m_Deployment ? *m_Deployment : Deployment::Current(); }
     soap& context() { return m_Soap; }
 
 private:
+    SOAP_SOCKET Open(const char* endpoint, const char* host, int port);
+    bool OpenTls(int socket, const char* host, int port);
+    void Watch(SOAP_SOCKET socket) ZV_EXCLUDES(m_AbortMutex);
+
+    static int CloseHook(soap* context, SOAP_SOCKET socket);
     static SOAP_SOCKET OpenHook(soap* context, const char* endpoint, const char* host, int port);
     static int SendHook(soap* context, const char* data, size_t length);
     static size_t ReceiveHook(soap* context, char* buffer, size_t size);
@@ -87,7 +99,12 @@ private:
     SecretFilter m_SentSecrets;
     SecretFilter m_ReceivedSecrets;
 
+    std::atomic<bool> m_Aborted{false};
+    ZVMutex m_AbortMutex;
+    SOAP_SOCKET m_Watched ZV_GUARDED_BY(m_AbortMutex) = SOAP_INVALID_SOCKET;  // the open one, as Abort may know it
+
     decltype(soap::fopen) m_Open;
+    decltype(soap::fclosesocket) m_CloseSocket;
     decltype(soap::fsend) m_Send;
     decltype(soap::frecv) m_Receive;
     decltype(soap::fposthdr) m_Header;

@@ -76,6 +76,18 @@ void ZVThread::SafeDestroyThread(ZVThread* thread)
     DestroyThread(thread);
 }
 
+bool ZVThread::HasFinished(unsigned long milliseconds) const
+{
+    if (m_Impl->m_Thread == 0) return true;
+    Shared& shared = *m_Impl->m_Shared;
+    const auto end = std::chrono::steady_clock::now() + std::chrono::milliseconds(milliseconds);
+    ZVMutexLock lock(shared.mutex);
+    while (!shared.finished) {
+        if (!shared.changed.WaitUntil(shared.mutex, end)) break;
+    }
+    return shared.finished;
+}
+
 void ZVThread::Sleep(unsigned long milliseconds)
 {
     timespec rest = {static_cast<time_t>(milliseconds / 1000), static_cast<long>(milliseconds % 1000) * 1000000};

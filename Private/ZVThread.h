@@ -13,6 +13,9 @@ public:
     /// Must not be called by the thread itself.
     static void SafeDestroyThread(ZVThread* thread);
 
+    /// Whether the function has returned (or never will be called), after at most that time.
+    bool HasFinished(unsigned long milliseconds) const;
+
     /// Sleeps the whole time, signals or not.
     static void Sleep(unsigned long milliseconds);
 

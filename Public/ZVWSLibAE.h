@@ -6,7 +6,7 @@
 //
 // Threads. Everything here runs on the runtime's main thread. An asynchronous method starts one worker thread, which
 // uses the instance's library session alone; its result is handed over on a later update tick. Destructing an instance
-// waits for its worker, that is at most for the time-outs of the library's calls.
+// breaks off the call that its worker makes, and waits for the worker.
 //
 // Calling convention of the asynchronous methods: one argument, an Array of the callback object and the parameter
 // object. They return a code at once, and only after ReturnCode::kStarted the callback's "onComplete"(status, result)

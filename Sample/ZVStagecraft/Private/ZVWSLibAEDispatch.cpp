@@ -6,6 +6,18 @@ using namespace ae::stagecraft;
 
 ZV_LOG_AREA(ZVWSAELOG_AREA_NAME)
 
+// Ends a worker that may hang in the network. A session that it has just made is told, too.
+void ZVWSLibAE::State::EndWorker(ZVThread* thread)
+{
+    while (thread && !thread->HasFinished(20)) {
+        for (const ZV_WS_Session* session :
+             {&m_PrefetchUserDataSession, &m_PrefetchBoxArtsSession, &m_PrefetchTitlesSession, &m_Session}) {
+            ZV_WS_abort(session);
+        }
+    }
+    ZVThread::SafeDestroyThread(thread);
+}
+
 ZVWSLibAE::State::~State()
 {
     m_StopPrefetch = true;
@@ -16,8 +28,7 @@ ZVWSLibAE::State::~State()
         std::swap(threads[1], m_PrefetchTitlesThread);
         std::swap(threads[2], m_PrefetchBoxArtsThread);
     }
-    for (ZVThread* thread : threads)
-        ZVThread::SafeDestroyThread(thread);
+    for (ZVThread* thread : threads) EndWorker(thread);
     m_Result.Release();
     for (ZV_WS_Session* session :
          {&m_PrefetchUserDataSession, &m_PrefetchBoxArtsSession, &m_PrefetchTitlesSession, &m_Session}) {

@@ -50,6 +50,8 @@ struct ZVWSLibAE::State {
     /// one before in that slot must have ended. The worker owns `param`.
     void RunPrefetchThread(const char* name, void (*function)(void*), void* param);
 
+    void EndWorker(ZVThread* thread);
+
     /// The worker's last act on the instance: hands the result over.
     template <class Output>
     void Publish(const Output& output, ZV_WS_Status status)
