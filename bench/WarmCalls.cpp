@@ -117,8 +117,10 @@ std::string Token()
     return std::string("<wsse:UsernameToken wsu:Id=\"User\"><wsse:Username>") + StorefrontAccount::kUser +
            "</wsse:Username><wsse:Password Type=\"http://docs.oasis-open.org/wss/2004/01/"
            "oasis-200401-wss-username-token-profile-1.0#PasswordDigest\">" +
-           Base64(digest, static_cast<int>(length)) + "</wsse:Password><wsse:Nonce>" + Base64(nonce, sizeof nonce) +
-           "</wsse:Nonce><wsu:Created>" + created + "</wsu:Created></wsse:UsernameToken>";
+           Base64(digest, static_cast<int>(length)) +
+           "</wsse:Password><wsse:Nonce EncodingType=\"http://docs.oasis-open.org/wss/2004/01/"
+           "oasis-200401-wss-soap-message-security-1.0#Base64Binary\">" +
+           Base64(nonce, sizeof nonce) + "</wsse:Nonce><wsu:Created>" + created + "</wsu:Created></wsse:UsernameToken>";
 }
 
 std::string Envelope(const std::string& endpoint)

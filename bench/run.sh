@@ -7,7 +7,8 @@ source cmake/setup.sh
 
 zv_install
 zv_build default zv_bench
-table=$(build/bin/zv_bench --benchmark_repetitions=7 --benchmark_enable_random_interleaving=true "$@" 2>build/bench.log) ||
+table=$(build/bin/zv_bench --benchmark_repetitions=5 --benchmark_min_time=0.2 \
+    --benchmark_enable_random_interleaving=true "$@" 2>build/bench.log) ||
     { tail -n 5 build/bench.log >&2; exit 1; }
 {
     cat bench/performance.head.md
