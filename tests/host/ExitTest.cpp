@@ -12,6 +12,7 @@
 #include "HostConsole.h"
 #include "HostLines.h"
 #include "IpcChannel.h"
+#include "Storefront.h"
 
 namespace {
 
@@ -68,6 +69,34 @@ TEST_F(ExitTest, RequestedClose)
                         ListenLines({UninitMessage()})));
     EXPECT_EQ(Lines{}, host.Errors());
     ExpectReceived({4});
+}
+
+// Nothing that the network does keeps the process: it is gone within three seconds, and the player system hears of it.
+TEST_F(ExitTest, RequestedCloseWhileACallHangs)
+{
+    for (const char* fault : {"connect=stall", "discovery=stall", "getFileType=stall", "getNavigation=stall",
+                              "getNavigation=stall-body", "getNavigation=drip:200"}) {
+        SCOPED_TRACE(fault);
+        std::string error;
+        const auto store = Storefront::Start(StorefrontOptions(), error);
+        ASSERT_TRUE(store && store->AddFault(fault, error)) << error;
+        Environment environment = WithMovie(
+            "var ws = new com.orvex.ZVWSLib();"
+            "ws.init([{onComplete: function () { ws.getNavigation([{}, {}]); }}, {APIKey: 'desktop', UserName: "
+            "'customer',"
+            "    Password: 'secret', DestinationUniqueID: 'd', DestinationTypeID: 1, EnvNum: 3}]);"
+            "setTimeout(function () { trace('running'); }, 300);");
+        environment.emplace_back("ZV_DEPLOYMENT", store->DeploymentFile());
+        Process host({ZV_STAGECRAFT, "5"}, environment);
+        m_player.Accept();
+        ASSERT_TRUE(host.WaitForLine("running"));
+        const auto asked = std::chrono::steady_clock::now();
+        m_player.Send(3);
+        EXPECT_EQ(0, host.WaitForEnd());
+        EXPECT_LT(std::chrono::steady_clock::now() - asked, std::chrono::seconds(3));
+        ExpectReceived({4});
+        m_player.Close();
+    }
 }
 
 // A FIFO's writing end, once somebody reads it.
