@@ -3,6 +3,7 @@
 #include <arpa/inet.h>
 #include <openssl/err.h>
 #include <openssl/x509v3.h>
+#include <stdio.h>
 #include <stdsoap2.h>
 
 #include <map>
@@ -53,6 +54,8 @@ private:
         ERR_clear_error();
         if (loaded != 1) {
             X509_STORE_free(store);
+            fprintf(stderr, "%s: cannot read the certificate authorities; name a PEM file with ca_file\n",
+                    caFile.empty() ? "system" : caFile.c_str());
             return nullptr;
         }
         return m_Authorities[caFile] = store;

@@ -549,10 +549,10 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
 /// fine.
 ZV_WS_Status ZV_WS_release(ZV_WS_Object* any);
 
-/// Breaks off the call that another thread makes with the session, and lets no further one begin: the call returns within a
-/// second with a transport failure (but for the time that the system takes to look a host's name up). For ending a session
-/// that may hang in the network; ZV_WS_release still has to follow, after that thread's call has returned. Any thread. A null
-/// or empty handle is fine.
+/// Breaks off the call that another thread makes with the session, and lets no further one begin: the call returns
+/// within a second with a transport failure (but for the time that the system takes to look a host's name up). For
+/// ending a session that may hang in the network; ZV_WS_release still has to follow, after that thread's call has
+/// returned. Any thread. A null or empty handle is fine.
 void ZV_WS_abort(const ZV_WS_Session* handle);
 
 /// The library's version, 1.3.1.

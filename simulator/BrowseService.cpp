@@ -72,8 +72,7 @@ void getTitlesByGenreArray(Call& call)
 void Search(Call& call, const char* columns)
 {
     static const char* const kByType[] = {"", " AND is_tv = 1", " AND is_tv = 0 AND season = 0"};
-    const std::string where =
-        std::string("instr(fold(") + columns + "), fold(?)) > 0" + kByType[call.Int("TitleType")];
+    const std::string where = std::string("instr(fold(") + columns + "), fold(?)) > 0" + kByType[call.Int("TitleType")];
     WriteTitles(call, where, {call.Text("Query")}, 0);
 }
 

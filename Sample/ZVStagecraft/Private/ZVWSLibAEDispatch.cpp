@@ -28,7 +28,8 @@ ZVWSLibAE::State::~State()
         std::swap(threads[1], m_PrefetchTitlesThread);
         std::swap(threads[2], m_PrefetchBoxArtsThread);
     }
-    for (ZVThread* thread : threads) EndWorker(thread);
+    for (ZVThread* thread : threads)
+        EndWorker(thread);
     m_Result.Release();
     for (ZV_WS_Session* session :
          {&m_PrefetchUserDataSession, &m_PrefetchBoxArtsSession, &m_PrefetchTitlesSession, &m_Session}) {
