@@ -1,6 +1,7 @@
 #include "ZVThread.h"
 
 #include <errno.h>
+#include <openssl/crypto.h>
 #include <pthread.h>
 #include <time.h>
 
@@ -37,6 +38,8 @@ struct ZVThread::Impl {
         Shared& shared = **owned;
         shared.running = true;
         shared.function(shared.argument);
+        // By itself this comes after "finished", and so could meet the process's own clean-up at exit.
+        OPENSSL_thread_stop();
         shared.running = false;
         ZVMutexLock lock(shared.mutex);
         shared.finished = true;

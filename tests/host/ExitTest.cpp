@@ -74,22 +74,26 @@ TEST_F(ExitTest, RequestedClose)
 // Nothing that the network does keeps the process: it is gone within three seconds, and the player system hears of it.
 TEST_F(ExitTest, RequestedCloseWhileACallHangs)
 {
-    for (const char* fault : {"connect=stall", "discovery=stall", "getFileType=stall", "getNavigation=stall",
-                              "getNavigation=stall-body", "getNavigation=drip:200"}) {
-        SCOPED_TRACE(fault);
+    const struct {
+        const char* fault;
+        size_t requests;  // that the store has seen when the fault bites
+    } rows[] = {{"connect=stall", 1},       {"discovery=stall", 1},          {"getFileType=stall", 2},
+                {"getNavigation=stall", 3}, {"getNavigation=stall-body", 3}, {"getNavigation=drip:200", 3}};
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fault);
         std::string error;
         const auto store = Storefront::Start(StorefrontOptions(), error);
-        ASSERT_TRUE(store && store->AddFault(fault, error)) << error;
+        ASSERT_TRUE(store && store->AddFault(row.fault, error)) << error;
         Environment environment = WithMovie(
             "var ws = new com.orvex.ZVWSLib();"
             "ws.init([{onComplete: function () { ws.getNavigation([{}, {}]); }}, {APIKey: 'desktop', UserName: "
             "'customer',"
             "    Password: 'secret', DestinationUniqueID: 'd', DestinationTypeID: 1, EnvNum: 3}]);"
-            "setTimeout(function () { trace('running'); }, 300);");
+            "setInterval(function () {}, 10);");
         environment.emplace_back("ZV_DEPLOYMENT", store->DeploymentFile());
         Process host({ZV_STAGECRAFT, "5"}, environment);
         m_player.Accept();
-        ASSERT_TRUE(host.WaitForLine("running"));
+        ASSERT_TRUE(store->WaitForRequests(row.requests));
         const auto asked = std::chrono::steady_clock::now();
         m_player.Send(3);
         EXPECT_EQ(0, host.WaitForEnd());
