@@ -39,27 +39,40 @@ void CloseIfOpen(int& descriptor)
     descriptor = -1;
 }
 
-// Child, between fork and exec.
-[[noreturn]] void Execute(const Lines& arguments, const Environment& environment, const int (&files)[3])
+// The variables of this process and those given here; what the client and its stand-ins read comes from the latter
+// alone.
+Lines Variables(const Environment& environment)
+{
+    const auto isTheirs = [](const std::string& variable) {
+        return variable.compare(0, 3, "ZV_") == 0 || variable.compare(0, 11, "STAGECRAFT_") == 0;
+    };
+    Lines variables;
+    for (char** own = environ; *own; ++own) {
+        if (!isTheirs(*own)) variables.emplace_back(*own);
+    }
+    for (const auto& [name, value] : environment)
+        variables.push_back(name + "=" + value);
+    return variables;
+}
+
+std::vector<char*> Pointers(const Lines& texts)
+{
+    std::vector<char*> pointers;
+    for (const std::string& text : texts)
+        pointers.push_back(const_cast<char*>(text.c_str()));
+    pointers.push_back(nullptr);
+    return pointers;
+}
+
+// Child, between fork and exec: other threads of the test may have held any lock.
+[[noreturn]] void Execute(char* const* arguments, char* const* variables, const int (&files)[3])
 {
     for (int i = 0; i < 3; ++i) {
         dup2(files[i], i);
     }
-    for (const char* name : {"ZV_IPC_SOCKET", "ZV_FLASHVARS", "ZV_CORE_DUMP", "ZV_DRM_INIT_RESULT",
-                             "ZV_DRM_TERMINATE_RESULT", "STAGECRAFT_MOVIE", "STAGECRAFT_FPS"}) {
-        unsetenv(name);
-    }
-    for (const auto& variable : environment) {
-        setenv(variable.first.c_str(), variable.second.c_str(), 1);
-    }
     const rlimit none = {0, 0};
     setrlimit(RLIMIT_CORE, &none);
-    std::vector<char*> vector;
-    for (const std::string& argument : arguments) {
-        vector.push_back(const_cast<char*>(argument.c_str()));
-    }
-    vector.push_back(nullptr);
-    execv(vector[0], vector.data());
+    execve(arguments[0], arguments, variables);
     _exit(127);
 }
 
@@ -87,8 +100,11 @@ Process::Process(const Lines& arguments, const Environment& environment)
 {
     int input[2], output[2], errors[2];
     if (pipe2(input, O_CLOEXEC) != 0 || pipe2(output, O_CLOEXEC) != 0 || pipe2(errors, O_CLOEXEC) != 0) abort();
+    const Lines variables = Variables(environment);
+    const std::vector<char*> argumentVector = Pointers(arguments);
+    const std::vector<char*> variableVector = Pointers(variables);
     m_Pid = fork();
-    if (m_Pid == 0) Execute(arguments, environment, {input[0], output[1], errors[1]});
+    if (m_Pid == 0) Execute(argumentVector.data(), variableVector.data(), {input[0], output[1], errors[1]});
     close(input[0]);
     close(output[1]);
     close(errors[1]);
