@@ -158,14 +158,24 @@ bool OpenCache(SessionImpl& session, bool mayReplace)
     return mayReplace && ZVFile::Exist(file) && ZVFile::Remove(file) && session.m_Cache->Open(param) == 0;
 }
 
-void MakeEmptySession(ZV_WS_Session& handle)
+void PutSession(ZV_WS_Session& handle, std::unique_ptr<SessionImpl> session)
 {
-    handle._pImpl = nullptr;
-    handle._pSessionImpl = nullptr;
-    handle._pImpl = new unsigned int(SessionImpl::kTag);
-    auto session = std::make_unique<SessionImpl>();
     ZVMutexLock lock(HandleMutex());
     handle._pSessionImpl = session.release();
+}
+
+// What was in the handle is overwritten unseen: it may be memory that nobody has set.
+void MakeEmpty(ZV_WS_Session& handle)
+{
+    handle._pImpl = nullptr;
+    PutSession(handle, nullptr);
+}
+
+void MakeSession(ZV_WS_Session& handle)
+{
+    MakeEmpty(handle);
+    handle._pImpl = new unsigned int(SessionImpl::kTag);
+    PutSession(handle, std::make_unique<SessionImpl>());
 }
 
 // The device's kind of access, asked from the service when the caller does not know it.
@@ -242,7 +252,7 @@ ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* pa
     ZV_ASSERT(handle != 0);
     ZV_ASSERT(params != 0);
     const ZV_WS_Status status = GuardCall([&] {
-        MakeEmptySession(*handle);
+        MakeSession(*handle);
         return Initialize(handle, *params);
     });
     if (status != ZV_WS_Status_ok && status != ZV_WS_Status_ssl_error) ZV_WS_release(handle);
@@ -252,11 +262,10 @@ ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* pa
 ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* source)
 {
     ZV_ASSERT(newHandle != 0);
-    newHandle->_pImpl = nullptr;
-    newHandle->_pSessionImpl = nullptr;
+    MakeEmpty(*newHandle);
     if (!SessionOf(source)) return ZV_WS_Status_invalid_param;
     return GuardCall([&] {
-        MakeEmptySession(*newHandle);
+        MakeSession(*newHandle);
         SessionImpl& session = *newHandle->_pSessionImpl;
         const Deployment& deployment = source->_pSessionImpl->m_Browse.transport().deployment();
         if (!LoadAuthorities(session, deployment)) return ZV_WS_Status_ssl_error;
