@@ -173,16 +173,15 @@ SOAP_SOCKET Transport::Open(const char* endpoint, const char* host, int port)
         m_Soap.error = SOAP_TCP_ERROR;
         return SOAP_INVALID_SOCKET;
     }
-    if (!IsTls(endpoint) || OpenTls(socket, host, port)) return socket;
+    if (!IsTls(endpoint) || OpenTls(socket, host, port, patience)) return socket;
     close(socket);
     m_Soap.error = SOAP_SSL_ERROR;
     return SOAP_INVALID_SOCKET;
 }
 
 // Offers the last session with the same host and port; the toolkit keeps it when it closes a connection.
-bool Transport::OpenTls(int socket, const char* host, int port)
+bool Transport::OpenTls(int socket, const char* host, int port, const Patience& patience)
 {
-    const Patience patience = {ZVUtilities::MillisecondTime() + 1000ull * m_Soap.connect_timeout, m_Aborted};
     const bool isSame = m_Soap.session && strcmp(m_Soap.session_host, host) == 0 && m_Soap.session_port == port;
     m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, isSame ? m_Soap.session : nullptr, patience);
     if (m_Soap.session) SSL_SESSION_free(m_Soap.session);

@@ -16,6 +16,8 @@
 #include "ZVMutex.h"
 #include "ZVString.h"
 
+struct Patience;
+
 /// While one exists, a connection that the peer has reset does not kill the process: SIGPIPE is blocked in the calling
 /// thread and taken off it afterwards. The process's own handling of the signal stays as it is.
 class SigpipeGuard {
@@ -76,7 +78,7 @@ public:
 
 private:
     SOAP_SOCKET Open(const char* endpoint, const char* host, int port);
-    bool OpenTls(int socket, const char* host, int port);
+    bool OpenTls(int socket, const char* host, int port, const Patience& patience);
     void Watch(SOAP_SOCKET socket) ZV_EXCLUDES(m_AbortMutex);
 
     static int CloseHook(soap* context, SOAP_SOCKET socket);
