@@ -42,22 +42,20 @@ Deployment Defaults()
     return values;
 }
 
-std::string Trimmed(const std::string& text)
+ZVString Trimmed(ZVString text)
 {
-    ZVString trimmed(text.data(), text.size());
-    trimmed.trim();
-    return std::string(trimmed.c_str(), trimmed.length());
+    text.trim();
+    return text;
 }
 
-// What is wrong with the line, or null.
-const char* ReadLine(const std::string& line, Deployment& values)
+// What is wrong with the line (trimmed), or null.
+const char* ReadLine(const ZVString& line, Deployment& values)
 {
-    const std::string text = Trimmed(line);
-    if (text.empty() || text[0] == '#') return nullptr;
-    const size_t equals = text.find('=');
-    if (equals == std::string::npos) return "no '=' between key and value";
-    const std::string name = Trimmed(text.substr(0, equals));
-    const ZVString value(Trimmed(text.substr(equals + 1)).c_str());
+    if (line.empty() || line[0] == '#') return nullptr;
+    const size_t equals = line.find('=');
+    if (equals == ZVString::npos) return "no '=' between key and value";
+    const ZVString name = Trimmed(line.substr(0, equals));
+    const ZVString value = Trimmed(line.substr(equals + 1));
     for (const Key& key : kKeys) {
         if (name != key.name) continue;
         ZVString host;
@@ -77,8 +75,9 @@ bool ReadLines(const char* name, Deployment& values)
     errno = 0;
     while (std::getline(file, line)) {
         ++number;
-        if (const char* mistake = ReadLine(line, values)) {
-            fprintf(stderr, "%s:%d: %s: %s\n", name, number, mistake, Trimmed(line).c_str());
+        const ZVString text = Trimmed(ZVString(line.data(), line.size()));
+        if (const char* mistake = ReadLine(text, values)) {
+            fprintf(stderr, "%s:%d: %s: %s\n", name, number, mistake, text.c_str());
             return false;
         }
     }

@@ -42,7 +42,7 @@ ZV_WS_Status ZV_WS_readSetting(const char* path, const char* key, bool protected
         if (!IsPath(path) || !key) return ZV_WS_Status_invalid_param;
         ZVString text;
         const unsigned int result = CfgXMLFile(path).Read(key, text, protectedValue);
-        if (result == CfgXMLFile::kOk) ZVUtilities::SetText(*value, text.c_str());
+        if (result == CfgXMLFile::kOk) ZVUtilities::SetText(*value, text);
         return To_ZV_WS_Status(result, ZV_WS_Status_setting_key_not_found);
     });
 }

@@ -17,7 +17,8 @@ char* StrDup(const char* text)
 
 void SetText(ZV_WS_String& to, const ZVString& text)
 {
-    to.data = StrDup(text.c_str());
+    to.data = new char[text.length() + 1];
+    memcpy(to.data, text.c_str(), text.length() + 1);
     to.size = static_cast<unsigned int>(text.length());
 }
 

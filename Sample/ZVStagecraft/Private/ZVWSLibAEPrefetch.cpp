@@ -49,18 +49,14 @@ void ZVWSLibAE::PrefetchMgr::MarkPagePrefetched(unsigned int page)
 
 ZVWSLibAE::PrefetchMgr::Pages ZVWSLibAE::PrefetchMgr::Scan(unsigned int current, unsigned int count, bool forward) const
 {
-    const char* const format = forward ? "ZVWSLibAE::PrefetchMgr::GetPagesForPrefetch, pageForNext[%d]:%d \n"
-                                       : "ZVWSLibAE::PrefetchMgr::GetPagesForPrefetch,,pageForPre[%d]:%d \n";
+    const char* const direction = forward ? " pageForNext" : ",pageForPre";
     Pages pages(m_kPrefetchPages);
     for (unsigned int i = 1; i <= count; ++i) {
         const unsigned int rest = (forward ? current + i : current + m_TotalPages - i) % m_TotalPages;
         const unsigned int page = rest == 0 ? m_TotalPages : rest;
         if (IsPageAlreadyPrefetched(page)) continue;
-            // The format is one of the two above.
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wformat-nonliteral"
-        ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, format, static_cast<int>(pages.size()), static_cast<int>(page));
-#pragma GCC diagnostic pop
+        ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "ZVWSLibAE::PrefetchMgr::GetPagesForPrefetch,%s[%d]:%d \n",
+                     direction, static_cast<int>(pages.size()), static_cast<int>(page));
         pages.Append(page);
     }
     // Both directions are counted under this name.
