@@ -101,7 +101,7 @@ private:
     HttpResponse Answer(const HttpRequest& request, Connection& connection, LoggedRequest& log, Fault& fault);
     bool Send(Connection& connection, const HttpRequest& request, HttpResponse response, const Fault& fault);
     bool SendFaulty(Channel& channel, const std::string& head, const std::string& body, const Fault& fault);
-    bool SendEndless(Channel& channel, const std::string& head);
+    bool SendEndless(Channel& channel, const std::string& head, const std::string& half);
     bool SendDrip(Channel& channel, const std::string& bytes, int pause);
     // False when the simulator ends meanwhile.
     bool Pause(int milliseconds);
@@ -456,7 +456,7 @@ bool Simulator::SendFaulty(Channel& channel, const std::string& head, const std:
     if (fault.Is("cut-body")) return channel.Write(head + half), channel.Close(), false;
     if (fault.Is("short")) return channel.Write(head + body), channel.Close(), false;
     if (fault.Is("long")) return channel.Write(head + body + "left over");
-    if (fault.Is("endless")) return SendEndless(channel, head);
+    if (fault.Is("endless")) return SendEndless(channel, head, half);
     if (fault.Is("drip")) return SendDrip(channel, head + body, fault.Number(100));
     if (fault.Is("split")) return channel.Write(head) && Pause(fault.Number(50)) && channel.Write(body);
     if (fault.Is("stall") || fault.Is("stall-body")) {
@@ -472,11 +472,12 @@ bool Simulator::SendFaulty(Channel& channel, const std::string& head, const std:
     return channel.Write(head + body);
 }
 
-bool Simulator::SendEndless(Channel& channel, const std::string& head)
+// Half of the right body, and text from there on.
+bool Simulator::SendEndless(Channel& channel, const std::string& head, const std::string& half)
 {
     const size_t start = head.find("Content-Length");
-    if (!channel.Write(head.substr(0, start) + "Connection: close\r\n\r\n<?xml version=\"1.0\"?><a>")) return false;
-    const std::string piece(16384, ' ');
+    if (!channel.Write(head.substr(0, start) + "Connection: close\r\n\r\n" + half)) return false;
+    const std::string piece(16384, 'x');
     while (channel.Write(piece) && Pause(0)) {
     }
     return false;

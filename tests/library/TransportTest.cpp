@@ -1,4 +1,4 @@
-// What a service can do to a connection, and that the next call works.
+// Connections: kept, replaced, resumed, and what is never sent twice.
 #include <csignal>
 
 #include "Store.h"
@@ -23,53 +23,6 @@ protected:
         return status;
     }
 };
-
-TEST_F(Transport, FaultsOfOneAnswerEndThere)
-{
-    const int kFails = 1;  // with a status that is the SOAP runtime's affair
-    const struct {
-        const char* fault;
-        int status;
-    } rows[] = {
-        {"fault11", -6012},
-        {"fault12", -6012},
-        {"http:404", -4404},
-        {"http:500", -4500},
-        {"http:503", -4503},
-        {"http:302", -4302},
-        {"garbage", kFails},
-        {"empty", kFails},
-        {"cut-header", kFails},
-        {"cut-body", kFails},
-        {"damaged-gzip", kFails},
-        {"bomb:64", kFails},
-        {"endless", kFails},
-        {"unknown-enum", -1004},
-        {"missing-result", -1004},
-        {"code:3", -1004},
-        {"must-understand", -6008},
-        {"soap12", 0},
-        {"extra-header", 0},
-        {"split", 0},
-        {"long", 0},
-        {"no-length", 0},
-        {"drip:0", 0},
-        {"short", 0},
-    };
-    for (const auto& row : rows) {
-        Fault(std::string("getTitleListing=") + row.fault);
-        Owned<ZV_WS_TitleListingResponse> listing;
-        const ZV_WS_Status status = ZV_WS_getTitleListing(&session, 12, &listing);
-        if (row.status == kFails) {
-            EXPECT_NE(ZV_WS_Status_ok, status) << row.fault;
-        } else {
-            EXPECT_EQ(row.status, status) << row.fault;
-        }
-        EXPECT_EQ(row.status == 0 ? 12 : 0, listing.TitleID) << row.fault;
-        EXPECT_EQ(ZV_WS_Status_ok, Listing()) << "after " << row.fault;
-        store->ClearFaults();
-    }
-}
 
 TEST_F(Transport, RefusalsKeepCodeAndMessage)
 {
@@ -142,12 +95,6 @@ TEST_F(Transport, TheProcessKeepsItsSignals)
     sigset_t pending;
     sigpending(&pending);
     EXPECT_FALSE(sigismember(&pending, SIGPIPE));
-}
-
-TEST_F(Transport, AServiceThatIsGoneIsAConnectionError)
-{
-    store.reset();
-    EXPECT_EQ(ZV_WS_Status_connection_error, Listing());
 }
 
 }  // namespace
