@@ -42,7 +42,25 @@ public:
         return context;
     }
 
+    // Takes the reference.
+    void Keep(SSL_CTX* context, SSL_SESSION* session) ZV_EXCLUDES(m_Mutex)
+    {
+        ZVMutexLock lock(m_Mutex);
+        SSL_SESSION*& newest = m_Sessions[context];
+        SSL_SESSION_free(newest);
+        newest = session;
+    }
+
+    SSL_SESSION* Session(SSL_CTX* context) ZV_EXCLUDES(m_Mutex)
+    {
+        ZVMutexLock lock(m_Mutex);
+        const auto newest = m_Sessions.find(context);
+        return newest == m_Sessions.end() ? nullptr : SSL_SESSION_dup(newest->second);
+    }
+
 private:
+    static int KeepSession(SSL* connection, SSL_SESSION* session);
+
     X509_STORE* AuthoritiesLocked(const std::string& caFile) ZV_REQUIRES(m_Mutex)
     {
         const auto known = m_Authorities.find(caFile);
@@ -70,7 +88,8 @@ private:
         SSL_CTX_set_mode(context, SSL_MODE_AUTO_RETRY);
         // A peer that cuts the connection without a TLS goodbye is told from a whole answer by the answer's length.
         SSL_CTX_set_options(context, SSL_OP_NO_RENEGOTIATION | SSL_OP_IGNORE_UNEXPECTED_EOF);
-        SSL_CTX_set_session_cache_mode(context, SSL_SESS_CACHE_CLIENT);
+        SSL_CTX_set_session_cache_mode(context, SSL_SESS_CACHE_CLIENT | SSL_SESS_CACHE_NO_INTERNAL);
+        SSL_CTX_sess_set_new_cb(context, KeepSession);
         SSL_CTX_set1_cert_store(context, authorities);
         SSL_CTX_set_verify(context, SSL_VERIFY_PEER, nullptr);
         X509_VERIFY_PARAM* verify = SSL_CTX_get0_param(context);
@@ -86,6 +105,7 @@ private:
     ZVMutex m_Mutex;
     std::map<std::string, X509_STORE*> m_Authorities ZV_GUARDED_BY(m_Mutex);
     std::map<std::pair<std::string, std::string>, SSL_CTX*> m_Contexts ZV_GUARDED_BY(m_Mutex);
+    std::map<SSL_CTX*, SSL_SESSION*> m_Sessions ZV_GUARDED_BY(m_Mutex);  // of contexts, which live as long
 };
 
 Contexts& TheContexts()
@@ -93,6 +113,13 @@ Contexts& TheContexts()
     static Library library;
     static auto* contexts = new Contexts;  // outlives threads that still end a session at exit
     return *contexts;
+}
+
+// On the thread that reads from the connection.
+int Contexts::KeepSession(SSL* connection, SSL_SESSION* session)
+{
+    TheContexts().Keep(SSL_get_SSL_CTX(connection), session);
+    return 1;
 }
 
 std::string Text(const ZVString& text)
@@ -112,6 +139,11 @@ bool LoadAuthorities(const ZVString& caFile)
 SSL_CTX* ContextFor(const ZVString& caFile, const ZVString& host)
 {
     return TheContexts().Context(Text(caFile), Text(host));
+}
+
+SSL_SESSION* SessionFor(SSL_CTX* context)
+{
+    return TheContexts().Session(context);
 }
 
 }  // namespace Tls

@@ -145,7 +145,7 @@ void Transport::Close()
     const int error = m_Soap.error;
     m_Soap.keep_alive = 0;
     m_Soap.error = SOAP_OK;
-    soap_closesock(&m_Soap);  // keeps the TLS session for the next connection; soap_force_closesock leaves `ssl` behind
+    soap_closesock(&m_Soap);  // soap_force_closesock leaves `ssl` behind
     m_Soap.error = error;
     m_Soap.keep_alive = 1;
     m_Soap.bufidx = m_Soap.buflen = 0;
@@ -173,19 +173,17 @@ SOAP_SOCKET Transport::Open(const char* endpoint, const char* host, int port)
         m_Soap.error = SOAP_TCP_ERROR;
         return SOAP_INVALID_SOCKET;
     }
-    if (!IsTls(endpoint) || OpenTls(socket, host, port, patience)) return socket;
+    if (!IsTls(endpoint) || OpenTls(socket, host, patience)) return socket;
     close(socket);
     m_Soap.error = SOAP_SSL_ERROR;
     return SOAP_INVALID_SOCKET;
 }
 
-// Offers the last session with the same host and port; the toolkit keeps it when it closes a connection.
-bool Transport::OpenTls(int socket, const char* host, int port, const Patience& patience)
+bool Transport::OpenTls(int socket, const char* host, const Patience& patience)
 {
-    const bool isSame = m_Soap.session && strcmp(m_Soap.session_host, host) == 0 && m_Soap.session_port == port;
-    m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, isSame ? m_Soap.session : nullptr, patience);
-    if (m_Soap.session) SSL_SESSION_free(m_Soap.session);
-    m_Soap.session = nullptr;
+    SSL_SESSION* const offered = Tls::SessionFor(m_Soap.ctx);
+    m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, offered, patience);
+    SSL_SESSION_free(offered);
     if (!m_Soap.ssl) return false;
     m_Soap.imode |= SOAP_ENC_SSL;
     m_Soap.omode |= SOAP_ENC_SSL;

@@ -78,7 +78,7 @@ public:
 
 private:
     SOAP_SOCKET Open(const char* endpoint, const char* host, int port);
-    bool OpenTls(int socket, const char* host, int port, const Patience& patience);
+    bool OpenTls(int socket, const char* host, const Patience& patience);
     void Watch(SOAP_SOCKET socket) ZV_EXCLUDES(m_AbortMutex);
 
     static int CloseHook(soap* context, SOAP_SOCKET socket);

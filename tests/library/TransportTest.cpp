@@ -1,5 +1,6 @@
 // Connections: kept, replaced, resumed, and what is never sent twice.
 #include <csignal>
+#include <set>
 
 #include "Store.h"
 
@@ -63,6 +64,32 @@ TEST_F(Transport, ADeadKeptConnectionIsReplacedAndItsSessionResumed)
         EXPECT_EQ(4u, store->Log().size()) << fault;
         EXPECT_EQ(ZV_WS_Status_ok, Listing());
     }
+}
+
+// Of all sessions of the process together, discovery included.
+TEST_F(Transport, AHostSeesOneFullHandshake)
+{
+    ZV_WS_release(&session);
+    Open(StorefrontOptions());
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize(Setup(ACCESS_TYPE_UNKNOWN)));
+    ZV_WS_Session copies[2];
+    for (ZV_WS_Session& copy : copies)
+        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
+    for (ZV_WS_Session* each : {&session, &copies[0], &copies[1]}) {
+        Owned<ZV_WS_TitleListingResponse> listing;
+        Owned<ZV_WS_EmailAddressResponse> address;
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getTitleListing(each, 12, &listing));
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getEmailAddress(each, &address));
+    }
+    std::set<unsigned long> connections, resumed;
+    for (const LoggedRequest& request : store->Log()) {
+        connections.insert(request.connection);
+        if (request.resumed) resumed.insert(request.connection);
+    }
+    EXPECT_EQ(7u, connections.size());  // discovery, and two services of three sessions
+    EXPECT_EQ(connections.size() - 1, resumed.size());
+    for (ZV_WS_Session& copy : copies)
+        ZV_WS_release(&copy);
 }
 
 TEST_F(Transport, WhatChangesSomethingIsSentOnce)
