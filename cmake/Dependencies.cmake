@@ -12,6 +12,7 @@ if(BUILD_TESTING OR NOT DEFINED BUILD_TESTING)
     find_package(GTest REQUIRED)
     find_package(benchmark REQUIRED)
     find_package(CURL REQUIRED)
+    pkg_check_modules(PUGIXML REQUIRED IMPORTED_TARGET pugixml)
 endif()
 
 # The flags decide the layout of struct soap: every file that sees stdsoap2.h must take them from here.
