@@ -9,11 +9,12 @@ namespace {
 const char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
 const char kSoap12[] = "http://www.w3.org/2003/05/soap-envelope";
 
-std::string Envelope(const std::string& body, const std::string& version = kSoap11, const std::string& header = "")
+std::string Envelope(const std::string& body, const std::string& version = kSoap11)
 {
     return "<?xml version=\"1.0\" encoding=\"utf-8\"?><s:Envelope xmlns:s=\"" + version +
-           "\" xmlns:xsi=\"http://www.w3.org/2001/XMLSchema-instance\">" + header +
-           "<s:Body xmlns=\"http://api.zorvane.example/api/\">" + body + "</s:Body></s:Envelope>";
+           "\" xmlns:xsi=\"http://www.w3.org/2001/XMLSchema-instance\">"
+           "<s:Body xmlns=\"http://api.zorvane.example/api/\">" +
+           body + "</s:Body></s:Envelope>";
 }
 
 const char kListing[] =
@@ -42,11 +43,8 @@ struct Listing {
                               [&](RealTimeBrowse& service) { return service.getTitleListing(&request, &response); });
         answered = response.getTitleListingResult != nullptr;
         if (result == SOAP_OK && answered) ZVUtilities::Convert(response.getTitleListingResult, record);
-        fault = exchange.service().soap_fault_string() ? exchange.service().soap_fault_string() : "";
     }
     ~Listing() { ZV_WS_release(&record); }
-
-    std::string fault;
 };
 
 TEST(Answer, RecordsAreReadWholeInBothVersions)
@@ -78,48 +76,14 @@ TEST(Answer, RecordsAreReadWholeInBothVersions)
     }
 }
 
-TEST(Answer, UnmarkedHeadersAreSkippedAndMarkedOnesRefused)
+// What damage does to an answer, the library's tests see with the simulator's faults; these are whole and not the
+// answer.
+TEST(Answer, AnswersToSomethingElseFail)
 {
-    const std::string plain = "<s:Header><x:Trace xmlns:x=\"urn:x\">1</x:Trace></s:Header>";
-    EXPECT_EQ(SOAP_OK, Listing(HttpAnswer(Envelope(kListing, kSoap11, plain))).result);
-    const std::string marked = "<s:Header><x:Trace xmlns:x=\"urn:x\" s:mustUnderstand=\"1\">1</x:Trace></s:Header>";
-    EXPECT_EQ(SOAP_MUSTUNDERSTAND, Listing(HttpAnswer(Envelope(kListing, kSoap11, marked))).result);
-}
-
-TEST(Answer, FaultsOfBothVersionsGiveTheSameText)
-{
-    const std::string fault11 =
-        Envelope("<s:Fault xmlns=\"\"><faultcode>s:Server</faultcode><faultstring>shop closed</faultstring></s:Fault>");
-    const std::string fault12 = Envelope(
-        "<s:Fault><s:Code><s:Value>s:Receiver</s:Value></s:Code>"
-        "<s:Reason><s:Text xml:lang=\"en\">shop closed</s:Text></s:Reason></s:Fault>",
-        kSoap12);
-    for (const std::string& fault : {fault11, fault12}) {
-        const Listing listing(HttpAnswer(fault, "500 Internal Server Error"));
-        EXPECT_EQ("shop closed", listing.fault);
-        EXPECT_EQ(-6012, ZVUtilities::To_ZV_WS_Status(listing.result)) << listing.result;
-    }
-}
-
-TEST(Answer, UnusableAnswersFail)
-{
-    const std::string good = Envelope(kListing);
-    const struct {
-        const char* what;
-        std::string answer;
-        int status;
-    } rows[] = {
-        {"unknown enumeration text", HttpAnswer(std::string(good).replace(good.find("buy"), 3, "let")), -1004},
-        {"cut short", HttpAnswer(good).substr(0, 700), -2012},
-        {"no answer at all", "", -2012},
-        {"another element", HttpAnswer(Envelope("<getNothingResponse/>")), -4200},
-        {"no XML", HttpAnswer("hello"), -4200},
-        {"busy", HttpAnswer("", "503 Busy"), -4503},
-        {"moved", HttpAnswer("", "302 Found"), -4302},
-    };
-    for (const auto& row : rows) {
-        const Listing listing(row.answer);
-        EXPECT_EQ(row.status, ZVUtilities::To_ZV_WS_Status(listing.result)) << row.what << ": " << listing.result;
+    for (const char* body : {"<getNothingResponse/>", "<getTitleListingResult/>"}) {
+        const Listing listing(HttpAnswer(Envelope(body)));
+        EXPECT_NE(SOAP_OK, listing.result) << body;
+        EXPECT_FALSE(listing.answered) << body;
     }
     const Listing empty(HttpAnswer(Envelope("<getTitleListingResponse/>")));
     EXPECT_EQ(SOAP_OK, empty.result);
@@ -155,27 +119,6 @@ TEST(Answer, OddlyTypedResults)
         EXPECT_EQ(row.enabled, record.IsAdultVerificationEnabled) << row.literal;
         ZV_WS_release(&record);
     }
-}
-
-TEST(Answer, ConfigurationKeysAreAttributes)
-{
-    Exchange<StreamAPI> exchange;
-    _ZV1__getConfig request;
-    _ZV1__getConfigResponse response;
-    ASSERT_EQ(SOAP_OK, exchange.Run("getConfig",
-                                    HttpAnswer(Envelope("<getConfigResponse><getConfigResult><ConfigurationSet>"
-                                                        "<Configuration Key=\"a\"><Value>1</Value></Configuration>"
-                                                        "<Configuration Key=\"b\"/></ConfigurationSet>"
-                                                        "</getConfigResult></getConfigResponse>")),
-                                    [&](StreamAPI& service) { return service.getConfig(&request, &response); }));
-    ZV_WS_ConfigResponse record;
-    Records::Tag(record);
-    ZVUtilities::Convert(response.getConfigResult, record);
-    ASSERT_EQ(2u, record.size);
-    EXPECT_STREQ("1", record.ConfigurationItem[0].Value);
-    EXPECT_STREQ("b", record.ConfigurationItem[1].Key);
-    EXPECT_EQ(nullptr, record.ConfigurationItem[1].Value);
-    ZV_WS_release(&record);
 }
 
 }  // namespace
