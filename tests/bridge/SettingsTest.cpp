@@ -1,29 +1,13 @@
 // The settings class as a movie sees it.
-#include <gtest/gtest.h>
-#include <stdlib.h>
+#include <sstream>
 
-#include <filesystem>
-#include <fstream>
-
-#include "Deployment.h"
+#include "../library/SettingsFolder.h"
 #include "MovieRun.h"
 
 namespace {
 
-class MovieSettings : public testing::Test {
+class MovieSettings : public SettingsFolder {
 protected:
-    void SetUp() override
-    {
-        char name[] = "/tmp/zvmoviecfgXXXXXX";
-        ASSERT_TRUE(mkdtemp(name));
-        folder = name;
-        const std::string deployment = folder + "/deployment";
-        std::ofstream(deployment) << "device_key_file = " << folder << "/device.key\n";
-        setenv("ZV_DEPLOYMENT", deployment.c_str(), 1);
-        ASSERT_TRUE(Deployment::Load());
-    }
-    void TearDown() override { std::filesystem::remove_all(folder); }
-
     std::string Report(const std::string& script) const
     {
         const MovieRun run = RunMovie("var folder = '" + folder +
@@ -34,8 +18,6 @@ protected:
         EXPECT_TRUE(run.succeeded);
         return run.Text();
     }
-
-    std::string folder;
 };
 
 TEST_F(MovieSettings, AreKeptFromMovieToMovie)
@@ -52,34 +34,17 @@ TEST_F(MovieSettings, AreKeptFromMovieToMovie)
 
 TEST_F(MovieSettings, ArgumentsMustBeThereAndOfTheirKind)
 {
-    const char* kWrong[] = {"setFile()",
-                            "setFile(5)",
-                            "setFile(null)",
-                            "setFile('')",
-                            "setFile('a\\0b')",
-                            "read()",
-                            "read('k')",
-                            "read('k', 1)",
-                            "read(1, true)",
-                            "read('k\\0', true)",
-                            "read({}, true)",
-                            "write('k', 'v')",
-                            "write('k', 5, true)",
-                            "write('k', null, false)",
-                            "write('k', 'v', 'true')",
-                            "write('k', 'v\\0w', true)",
-                            "selectEnv()",
-                            "selectEnv('1')",
-                            "selectEnv(1.5)",
-                            "selectEnv(NaN)",
-                            "selectEnv(4294967296)"};
+    std::istringstream wrong(
+        "setFile() setFile(5) setFile(null) setFile('') setFile('a\\0b') read() read('k') read('k',1) read(1,true) "
+        "read('k\\0',true) read({},true) write('k','v') write('k',5,true) write('k',null,false) write('k','v','true') "
+        "write('k','v\\0w',true) selectEnv() selectEnv('1') selectEnv(1.5) selectEnv(NaN) selectEnv(4294967296)");
     std::string script = "cfg.setFile(folder + 'settings.xml');\n", expected;
-    for (const char* call : kWrong) {
-        script += std::string("report('") + "' + cfg." + call + ");\n";
+    for (std::string call; wrong >> call;) {
+        script += "report(cfg." + call + ");\n";
         expected += "-3\n";
     }
     EXPECT_EQ(expected, Report(script));
-    EXPECT_FALSE(std::filesystem::exists(folder + "/settings.xml"));
+    EXPECT_FALSE(std::filesystem::exists(file));
 }
 
 TEST_F(MovieSettings, WithoutAFileThereIsNothingToReadOrWrite)

@@ -8,9 +8,8 @@
 #include <random>
 #include <sstream>
 
+#include "../library/Store.h"
 #include "Movie.h"
-#include "Storefront.h"
-#include "ZVWSLib.h"
 
 namespace {
 
@@ -79,12 +78,11 @@ void CheckCache(const fs::path& folder, int& images)
     }
 }
 
-TEST(CacheCrash, AKilledPlayerLeavesAWholeCache)
+using CacheCrash = Store;
+
+TEST_F(CacheCrash, AKilledPlayerLeavesAWholeCache)
 {
     const int kRounds = 40;
-    std::string error;
-    const auto store = Storefront::Start(StorefrontOptions(), error);
-    ASSERT_TRUE(store) << error;
     const Folder folder;
     const std::string movie = folder.Write("movie.js", kMovie);
     const std::string cache = folder.Path("cache");
