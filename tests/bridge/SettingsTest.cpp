@@ -11,7 +11,7 @@ protected:
     std::string Report(const std::string& script) const
     {
         const MovieRun run = RunMovie("var folder = '" + folder +
-                                      "/';\n"
+                                      "';\n"
                                       "var cfg = new com.orvex.ZVCfgLib();\n"
                                       "function show(value) { report(JSON.stringify(value)); }\n" +
                                       script);
@@ -63,7 +63,7 @@ TEST_F(MovieSettings, TheEnvironmentStandsInAFileBesideTheSettings)
                      "show(cfg.selectEnv(4)); show(env.read('EnvNum', false)); show(cfg.read('k', false));\n"
                      "show(cfg.clearEnv()); show(env.read('EnvNum', false)); show(cfg.read('k', false));\n"
                      "show(cfg.clearEnv());\n"));
-    EXPECT_FALSE(std::filesystem::exists(folder + "/env.xml"));
+    EXPECT_FALSE(std::filesystem::exists(folder + "env.xml"));
 }
 
 }  // namespace
