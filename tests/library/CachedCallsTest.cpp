@@ -18,12 +18,12 @@ constexpr unsigned int kAll = ZV_WS_CacheParam::CacheData_Metadata | ZV_WS_Cache
 
 class Cached : public Store {
 protected:
-    ZV_WS_Status Begin(CacheType type, unsigned int data = kAll)
+    ZV_WS_Status Begin(CacheType type, unsigned int data = kAll, unsigned int limit = 0)
     {
         ZV_WS_release(&session);
         folder = store->DataFolder() + "/cache";
         ZV_WS_SetupParams setup = Setup();
-        setup.CacheParam = {type, data, 0, folder.c_str()};
+        setup.CacheParam = {type, data, limit, folder.c_str()};
         const ZV_WS_Status status = Initialize(setup);
         store->ClearLog();
         return status;
@@ -393,10 +393,7 @@ TEST_F(BoxArt, AFileWithoutItsRowIsReplaced)
 // The oldest titles make room, also when somebody has removed their files.
 TEST_F(BoxArt, EvictionFindsItsFilesGone)
 {
-    ZV_WS_SetupParams setup = Setup();
-    folder = store->DataFolder() + "/cache";
-    setup.CacheParam = {CacheType_File, ZV_WS_CacheParam::CacheData_BoxArtImage, 358400, folder.c_str()};
-    ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File, ZV_WS_CacheParam::CacheData_BoxArtImage, 358400));
     for (int title = 1; title <= 40; ++title) {
         char prefix[16];
         snprintf(prefix, sizeof prefix, "ZV%05d", title);

@@ -88,10 +88,10 @@ TEST_F(Calls, TheAccessTypeChoosesTheService)
     } rows[] = {
         {ACCESS_TYPE_DOWNLOAD,
          {"account getConfig", "account getMyVideos", "account checkForPurchasedTitle",
-          "stream checkForPurchasedStream"}},
+          "stream checkForPurchasedStream", "account getWishlistItems", "account GetCountryID"}},
         {ACCESS_TYPE_STREAM,
          {"stream getConfig", "stream getMyStreamingVideos", "stream checkForPurchasedStreamByTitleID",
-          "stream checkForPurchasedStream"}},
+          "stream checkForPurchasedStream", "stream getWishlistItems", "stream GetCountryID"}},
     };
     for (const auto& row : rows) {
         Begin(row.type);
@@ -106,6 +106,10 @@ TEST_F(Calls, TheAccessTypeChoosesTheService)
         EXPECT_TRUE(flag);
         OK(ZV_WS_checkForPurchasedSku(&session, 240, &flag));
         EXPECT_TRUE(flag);
+        Owned<ZV_WS_WishlistItemsResponse> items;
+        OK(ZV_WS_getWishlistItems(&session, SORT_ORDER_TITLENAME, &page, TITLE_TYPE_FILTER_ANY, &items));
+        int country = 0;
+        OK(ZV_WS_getCountryID(&session, &country));
         std::vector<std::string> asked;
         for (const LoggedRequest& request : store->Log())
             asked.push_back(request.service + " " + request.operation);

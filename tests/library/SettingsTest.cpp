@@ -172,18 +172,9 @@ TEST_F(Settings, AWriteChangesItsElementAndNothingElse)
 
 TEST_F(Settings, ValuesAndKeysComeBackAsTheyWere)
 {
-    const std::string texts[] = {"a",
-                                 "",
-                                 " ",
-                                 "\t\r\n\r",
-                                 "<&>\"'",
-                                 "]]>",
-                                 "&amp;",
-                                 "0040",
-                                 "äöü€\xF0\x9F\x8E\xAC",
-                                 "</ZVWSLib>",
-                                 "xmlns:ZV1=\"\"",
-                                 std::string(300000, 'x')};
+    std::vector<std::string> texts = {"a",   "",      " ",    "\t\r\n\r",   "<&>\"'",
+                                      "]]>", "&amp;", "0040", "</ZVWSLib>", "xmlns:ZV1=\"\""};
+    texts.insert(texts.end(), {"äöü€\xF0\x9F\x8E\xAC", std::string(300000, 'x')});
     for (const bool isProtected : {false, true}) {
         for (const std::string& text : texts) {
             const std::string what = text.substr(0, 40) + (isProtected ? " protected" : "");
@@ -292,16 +283,8 @@ TEST_F(Settings, ATamperedValueReadsAsEmpty)
 {
     ASSERT_EQ(0u, Write("k", "a secret", true));
     const std::string packed = Reading("k").substr(2);
-    std::vector<std::string> tampered = {"plain",
-                                         "0",
-                                         "0000",
-                                         "0040",
-                                         "00400",
-                                         "9999" + packed.substr(4),
-                                         packed + packed.substr(4),
-                                         packed + " ",
-                                         " " + packed,
-                                         "0000" + packed};
+    std::vector<std::string> tampered = {"plain", "0", "0000", "0040", "00400", packed + " ", " " + packed};
+    tampered.insert(tampered.end(), {"9999" + packed.substr(4), packed + packed.substr(4), "0000" + packed});
     for (size_t i = 0; i < packed.size(); ++i) {
         std::string changed = packed;
         changed[i] = changed[i] == 'A' ? 'B' : 'A';
