@@ -1,12 +1,8 @@
 // The tracer, and the log that a movie sets up.
-#include <gtest/gtest.h>
-#include <stdlib.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <algorithm>
-#include <fstream>
+#include <sstream>
 
+#include "../foundation/TempFolder.h"
 #include "MovieRun.h"
 #include "ZVWSAELog.h"
 #include "ZV_Log.h"
@@ -15,32 +11,25 @@ namespace {
 
 class Log : public testing::Test {
 protected:
-    void SetUp() override
-    {
-        char folder[] = "/tmp/zvlogXXXXXX";
-        ASSERT_TRUE(mkdtemp(folder));
-        m_Folder = std::string(folder) + "/";
-    }
     void TearDown() override
     {
         ZVWSAELog::InitWSLogs(0x3F00, ZVWSAELog::kConsole);  // closes the file
         ZV_LogSetTarget(nullptr, nullptr);
-        unlink((m_Folder + "log.txt").c_str());
-        rmdir(m_Folder.c_str());
     }
 
     // The file's lines without their times.
     std::string File()
     {
         ZVWSAELog::InitWSLogs(0, ZVWSAELog::kConsole);
-        std::ifstream file(m_Folder + "log.txt");
+        std::istringstream file(m_Temp.Read("log.txt"));
         std::string text;
         for (std::string line; std::getline(file, line);)
             text += "[" + line.substr(std::min(line.size(), sizeof "[HH:MM:SS.mmm-" - 1)) + "\n";
         return text;
     }
 
-    std::string m_Folder;
+    const TempFolder m_Temp;
+    const std::string m_Folder = m_Temp / "";
 };
 
 int AreaId(const char* name)

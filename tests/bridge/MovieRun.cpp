@@ -1,9 +1,8 @@
 #include "MovieRun.h"
 
-#include <stdio.h>
 #include <stdlib.h>
-#include <unistd.h>
 
+#include "../foundation/TempFolder.h"
 #include "ZVCfgLibAE.h"
 #include "ZVWSLibAE.h"
 #include "stagecraft/IStagecraft.h"
@@ -40,28 +39,6 @@ private:
     }
 };
 
-class MovieFile {
-public:
-    explicit MovieFile(const std::string& script)
-    {
-        const int file = mkstemp(m_Path);
-        FILE* stream = fdopen(file, "w");
-        fputs(
-            "function report(text) { test.Native.report(text); }\n"
-            "function result() { return test.Native.result(); }\n",
-            stream);
-        fputs(script.c_str(), stream);
-        fclose(stream);
-    }
-    ~MovieFile() { unlink(m_Path); }
-    MovieFile(const MovieFile&) = delete;
-    MovieFile& operator=(const MovieFile&) = delete;
-    const char* Path() const { return m_Path; }
-
-private:
-    char m_Path[32] = "/tmp/zvmovieXXXXXX";
-};
-
 }  // namespace
 
 std::string MovieRun::Text() const
@@ -77,10 +54,14 @@ MovieRun RunMovie(const std::string& script, const Result& shown)
     MovieRun run;
     s_Run = &run;
     s_Shown = &shown;
-    const MovieFile movie(script);
+    const TempFolder folder;
+    const std::string movie = folder.Write("movie.js",
+                                           "function report(text) { test.Native.report(text); }\n"
+                                           "function result() { return test.Native.result(); }\n" +
+                                               script);
     setenv("STAGECRAFT_FPS", "200", 1);
     unsetenv("STAGECRAFT_MOVIE");
-    const char* arguments[] = {"test", movie.Path()};
+    const char* arguments[] = {"test", movie.c_str()};
     IStagecraft* runtime = IStagecraft::InitializeStagecraftLibrary(2, arguments);
     if (!runtime) return run;
     runtime->RegisterExtensionClass<ZVWSLibAE>();

@@ -1,43 +1,35 @@
 // Fetching ahead, seen from the store: which pages are asked for after one was shown, in which order, and when not.
-#include <gtest/gtest.h>
-#include <stdlib.h>
-
 #include <filesystem>
 #include <fstream>
 #include <thread>
 
-#include "MovieRun.h"
-#include "Storefront.h"
+#include "StoreMovie.h"
 
 namespace {
 
-class Prefetch : public testing::Test {
+class Prefetch : public StoreMovie {
 protected:
     void SetUp() override
     {
-        std::string error;
-        store = Storefront::Start(StorefrontOptions(), error);
-        ASSERT_TRUE(store) << error;
-        setenv("ZV_DEPLOYMENT", store->DeploymentFile().c_str(), 1);
+        StoreMovie::SetUp();
         go = store->DataFolder() + "/go";
     }
 
-    // Runs the script in a movie whose "init" has succeeded with a file cache for `data`. until(then) goes on when the
+    // Runs the script in a movie, in `ready` of an instance with a file cache for `data`. until(then) goes on when the
     // store has seen `requests` of them.
     std::string Run(int data, size_t requests, const std::string& script)
     {
         std::thread opener([&] {
             if (store->WaitForRequests(requests)) std::ofstream(go) << "go";
         });
-        const MovieRun run = RunMovie("var go = '" + go + "', folder = '" + store->DataFolder() +
-                                      "/cache', data = " + std::to_string(data) + ";" + R"(
-var ws = new com.orvex.ZVWSLib();
-function call(method, parameters, then) {
-    var code = ws[method]([{onComplete: function (status, result) {
+        const std::string report =
+            Report("var perPage, go = '" + go + "';setup.EnvNum = 2; setup.CacheType = 2; setup.CachePath = '" +
+                   store->DataFolder() + "/cache'; setup.CacheData = " + std::to_string(data) + R"(;
+function ask(method, parameters, then) {
+    call(ws, method, parameters, function (status, result) {
         if (status !== 0) report(method + ' ' + status);
         then(result);
-    }}, parameters]);
-    if (code !== 0) report(method + ' refused ' + code);
+    });
 }
 function until(then) {
     var timer = setInterval(function () {
@@ -47,21 +39,13 @@ function until(then) {
     }, 10);
 }
 function titles(page, then) {
-    call('getTitles', {genreid: 100, CurrentPageNumber: page, ItemsPerPage: perPage, purchasetype: 2}, then);
+    ask('getTitles', {genreid: 100, CurrentPageNumber: page, ItemsPerPage: perPage, purchasetype: 2}, then);
 }
-)" + script);
+ready(function () {)" +
+                   script + "});");
         store->ClearFaults();
-        EXPECT_TRUE(run.succeeded);
         opener.join();
-        return run.Text();
-    }
-
-    static std::string Init(const std::string& then)
-    {
-        return "call('init', {APIKey: 'desktop', UserName: 'customer', Password: 'secret', DestinationUniqueID: 'd', "
-               "DestinationTypeID: 1, AccessType: 2, EnvNum: 2, CacheType: 2, CacheData: data, CachePath: folder}, "
-               "function () {" +
-               then + "});";
+        return report;
     }
 
     // The pages asked for, in order.
@@ -79,12 +63,11 @@ function titles(page, then) {
     // So many items on a page that genre 100 has that many pages.
     std::string PerPage(int pages) const
     {
-        const int total = atoi(store->Query("SELECT COUNT(*) FROM title_genre WHERE genre = 100").c_str());
-        return "var perPage = " + std::to_string((total + pages - 1) / pages) + ";";
+        const int total = Number("SELECT COUNT(*) FROM title_genre WHERE genre = 100");
+        return "perPage = " + std::to_string((total + pages - 1) / pages) + ";";
     }
 
     using Strings = std::vector<std::string>;
-    std::unique_ptr<Storefront> store;
     std::string go;
 };
 
@@ -105,21 +88,20 @@ TEST_F(Prefetch, PagesAroundTheOneShownNearestFirst)
         std::filesystem::remove_all(store->DataFolder() + "/cache");
         std::filesystem::remove(go);
         // The load time comes first.
-        EXPECT_EQ("", Run(1, row.asked.size() + 1,
-                          PerPage(row.pages) +
-                              Init("titles(" + std::to_string(row.shown) + ", function () { until(quit); });")));
+        EXPECT_EQ("",
+                  Run(1, row.asked.size() + 1,
+                      PerPage(row.pages) + "titles(" + std::to_string(row.shown) + ", function () { until(quit); });"));
         EXPECT_EQ(row.asked, Pages("getTitlesByNavigation"));
     }
 }
 
 TEST_F(Prefetch, ThePageTurnedToIsThere)
 {
-    EXPECT_EQ(
-        "2\n3\n",
-        Run(1, 10,
-            PerPage(10) + Init("titles(1, function () { until(function () {"
-                               "titles(2, function (page) { report(page.CurrentPageNumber);"
-                               "titles(3, function (page) { report(page.CurrentPageNumber); quit(); }); }); }); });")));
+    EXPECT_EQ("2\n3\n",
+              Run(1, 10,
+                  PerPage(10) + "titles(1, function () { until(function () {"
+                                "titles(2, function (page) { report(page.CurrentPageNumber);"
+                                "titles(3, function (page) { report(page.CurrentPageNumber); quit(); }); }); }); });"));
     const Strings pages = Pages("getTitlesByNavigation");
     EXPECT_EQ(1, std::count(pages.begin(), pages.end(), "2"));
     EXPECT_EQ(1, std::count(pages.begin(), pages.end(), "3"));
@@ -127,10 +109,9 @@ TEST_F(Prefetch, ThePageTurnedToIsThere)
 
 TEST_F(Prefetch, TheUsersListsAreTheirOwnKind)
 {
-    EXPECT_EQ("",
-              Run(4, 3,
-                  Init("call('getMyVideos', {CurrentPageNumber: 1, ItemsPerPage: 1, purchasetype: 2, typefilter: 0, "
-                       "watchstatus: 3}, function () { until(quit); });")));
+    EXPECT_EQ("", Run(4, 3,
+                      "ask('getMyVideos', {CurrentPageNumber: 1, ItemsPerPage: 1, purchasetype: 2, typefilter: 0, "
+                      "watchstatus: 3}, function () { until(quit); });"));
     EXPECT_EQ((Strings{"1", "2", "3"}), Pages("getMyStreamingVideos"));
 }
 
@@ -144,7 +125,7 @@ TEST_F(Prefetch, NothingIsFetchedAheadWithoutNeed)
         size_t requests;
     } rows[] = {
         {1,
-         "call('searchForTitle', {CurrentPageNumber: 1, ItemsPerPage: 2, purchasetype: 2, typefilter: 0, query: "
+         "ask('searchForTitle', {CurrentPageNumber: 1, ItemsPerPage: 2, purchasetype: 2, typefilter: 0, query: "
          "'the'}, quit)",
          "", 2},
         {1, "perPage = 10; titles(1, quit)", "getTitlesByNavigation=code:3", 2},
@@ -152,11 +133,10 @@ TEST_F(Prefetch, NothingIsFetchedAheadWithoutNeed)
         {1, "perPage = 10000; titles(1, quit)", "", 2},
     };
     for (const auto& row : rows) {
-        std::string error;
-        if (*row.fault) store->AddFault(row.fault, error);
+        if (*row.fault) Fault(row.fault);
         store->ClearLog();
         std::filesystem::remove_all(store->DataFolder() + "/cache");
-        Run(row.data, row.requests, Init(row.script));
+        Run(row.data, row.requests, row.script);
         EXPECT_EQ(row.requests, store->Log().size()) << row.script;
     }
 }
@@ -165,11 +145,11 @@ TEST_F(Prefetch, BoxArtComesWhileTheScriptIsIdle)
 {
     const std::string season =
         store->Query("SELECT season FROM title WHERE season > 0 GROUP BY season ORDER BY season LIMIT 1");
-    const int episodes = atoi(store->Query("SELECT COUNT(*) FROM title WHERE season = " + season).c_str());
+    const int episodes = Number("SELECT COUNT(*) FROM title WHERE season = " + season);
     // Load time, listings, and the images of all episodes but the first.
-    EXPECT_EQ("", Run(3, static_cast<size_t>(2 + episodes - 1),
-                      Init("call('getAllTvEpisodeListings', {titleid: " + season +
-                           "}, function () { ws.idle(); until(quit); });")));
+    EXPECT_EQ(
+        "", Run(3, static_cast<size_t>(2 + episodes - 1),
+                "ask('getAllTvEpisodeListings', {titleid: " + season + "}, function () { ws.idle(); until(quit); });"));
     std::vector<std::string> prefixes;
     for (const LoggedRequest& request : store->Log()) {
         if (request.service == "boxart") prefixes.push_back(request.operation);
@@ -185,16 +165,15 @@ TEST_F(Prefetch, BoxArtComesWhileTheScriptIsIdle)
 // A page that nobody waits for may hang: the customer's own call does not.
 TEST_F(Prefetch, AForegroundCallWins)
 {
-    std::string error;
-    ASSERT_TRUE(store->AddFault("getTitlesByNavigation=ok", error));
-    ASSERT_TRUE(store->AddFault("getTitlesByNavigation=ok,delay=1500", error));
-    EXPECT_EQ("answered\n",
-              Run(1, 3,
-                  PerPage(10) +
-                      Init("titles(1, function () { until(function () {"
-                           "var asked = new Date().getTime();"
-                           "call('getTitleListing', {titleid: 12}, function () {"
-                           "report(new Date().getTime() - asked < 1000 ? 'answered' : 'late'); quit(); }); }); });")));
+    Fault("getTitlesByNavigation=ok");
+    Fault("getTitlesByNavigation=ok,delay=1500");
+    EXPECT_EQ(
+        "answered\n",
+        Run(1, 3,
+            PerPage(10) + "titles(1, function () { until(function () {"
+                          "var asked = new Date().getTime();"
+                          "ask('getTitleListing', {titleid: 12}, function () {"
+                          "report(new Date().getTime() - asked < 1000 ? 'answered' : 'late'); quit(); }); }); });"));
 }
 
 }  // namespace

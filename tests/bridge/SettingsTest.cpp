@@ -1,41 +1,23 @@
 // The settings class as a movie sees it.
-#include <gtest/gtest.h>
-#include <stdlib.h>
+#include <sstream>
 
-#include <filesystem>
-#include <fstream>
-
-#include "Deployment.h"
+#include "../library/SettingsFolder.h"
 #include "MovieRun.h"
 
 namespace {
 
-class MovieSettings : public testing::Test {
+class MovieSettings : public SettingsFolder {
 protected:
-    void SetUp() override
-    {
-        char name[] = "/tmp/zvmoviecfgXXXXXX";
-        ASSERT_TRUE(mkdtemp(name));
-        folder = name;
-        const std::string deployment = folder + "/deployment";
-        std::ofstream(deployment) << "device_key_file = " << folder << "/device.key\n";
-        setenv("ZV_DEPLOYMENT", deployment.c_str(), 1);
-        ASSERT_TRUE(Deployment::Load());
-    }
-    void TearDown() override { std::filesystem::remove_all(folder); }
-
     std::string Report(const std::string& script) const
     {
         const MovieRun run = RunMovie("var folder = '" + folder +
-                                      "/';\n"
+                                      "';\n"
                                       "var cfg = new com.orvex.ZVCfgLib();\n"
                                       "function show(value) { report(JSON.stringify(value)); }\n" +
                                       script);
         EXPECT_TRUE(run.succeeded);
         return run.Text();
     }
-
-    std::string folder;
 };
 
 TEST_F(MovieSettings, AreKeptFromMovieToMovie)
@@ -52,34 +34,17 @@ TEST_F(MovieSettings, AreKeptFromMovieToMovie)
 
 TEST_F(MovieSettings, ArgumentsMustBeThereAndOfTheirKind)
 {
-    const char* kWrong[] = {"setFile()",
-                            "setFile(5)",
-                            "setFile(null)",
-                            "setFile('')",
-                            "setFile('a\\0b')",
-                            "read()",
-                            "read('k')",
-                            "read('k', 1)",
-                            "read(1, true)",
-                            "read('k\\0', true)",
-                            "read({}, true)",
-                            "write('k', 'v')",
-                            "write('k', 5, true)",
-                            "write('k', null, false)",
-                            "write('k', 'v', 'true')",
-                            "write('k', 'v\\0w', true)",
-                            "selectEnv()",
-                            "selectEnv('1')",
-                            "selectEnv(1.5)",
-                            "selectEnv(NaN)",
-                            "selectEnv(4294967296)"};
+    std::istringstream wrong(
+        "setFile() setFile(5) setFile(null) setFile('') setFile('a\\0b') read() read('k') read('k',1) read(1,true) "
+        "read('k\\0',true) read({},true) write('k','v') write('k',5,true) write('k',null,false) write('k','v','true') "
+        "write('k','v\\0w',true) selectEnv() selectEnv('1') selectEnv(1.5) selectEnv(NaN) selectEnv(4294967296)");
     std::string script = "cfg.setFile(folder + 'settings.xml');\n", expected;
-    for (const char* call : kWrong) {
-        script += std::string("report('") + "' + cfg." + call + ");\n";
+    for (std::string call; wrong >> call;) {
+        script += "report(cfg." + call + ");\n";
         expected += "-3\n";
     }
     EXPECT_EQ(expected, Report(script));
-    EXPECT_FALSE(std::filesystem::exists(folder + "/settings.xml"));
+    EXPECT_FALSE(std::filesystem::exists(file));
 }
 
 TEST_F(MovieSettings, WithoutAFileThereIsNothingToReadOrWrite)
@@ -98,7 +63,7 @@ TEST_F(MovieSettings, TheEnvironmentStandsInAFileBesideTheSettings)
                      "show(cfg.selectEnv(4)); show(env.read('EnvNum', false)); show(cfg.read('k', false));\n"
                      "show(cfg.clearEnv()); show(env.read('EnvNum', false)); show(cfg.read('k', false));\n"
                      "show(cfg.clearEnv());\n"));
-    EXPECT_FALSE(std::filesystem::exists(folder + "/env.xml"));
+    EXPECT_FALSE(std::filesystem::exists(folder + "env.xml"));
 }
 
 }  // namespace

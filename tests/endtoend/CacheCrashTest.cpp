@@ -1,16 +1,14 @@
 // A player that is switched off in the middle of anything starts with a whole cache.
 #include <signal.h>
-#include <sqlite3.h>
 #include <time.h>
 
 #include <filesystem>
-#include <fstream>
 #include <random>
-#include <sstream>
 
+#include "../foundation/TempFolder.h"
+#include "../library/CacheFile.h"
+#include "../library/Store.h"
 #include "Movie.h"
-#include "Storefront.h"
-#include "ZVWSLib.h"
 
 namespace {
 
@@ -39,38 +37,14 @@ call('init', {APIKey: 'desktop', UserName: 'customer', Password: 'secret', Desti
 });
 )";
 
-std::string Contents(const fs::path& file)
+void CheckCache(const TempFolder& folder, int& images)
 {
-    std::ostringstream text;
-    text << std::ifstream(file, std::ios::binary).rdbuf();
-    return text.str();
-}
-
-std::string IntegrityOf(const fs::path& file)
-{
-    sqlite3* database = nullptr;
-    std::string result = "does not open";
-    if (sqlite3_open(file.c_str(), &database) == SQLITE_OK) {
-        sqlite3_exec(
-            database, "PRAGMA integrity_check",
-            [](void* text, int, char** values, char**) {
-                *static_cast<std::string*>(text) = values[0];
-                return 0;
-            },
-            &result, nullptr);
-    }
-    sqlite3_close(database);
-    return result;
-}
-
-void CheckCache(const fs::path& folder, int& images)
-{
-    for (const auto& entry : fs::directory_iterator(folder)) {
+    for (const auto& entry : fs::directory_iterator(folder / "cache")) {
         const fs::path& file = entry.path();
         if (file.extension() == ".zv") {
-            EXPECT_EQ("ok", IntegrityOf(file));
+            EXPECT_EQ("ok ", CacheFile(file).Query("PRAGMA integrity_check"));
         } else if (file.extension() == ".jpg") {
-            const std::string image = Contents(file);
+            const std::string image = folder.Read("cache/" + file.filename().string());
             ++images;
             ASSERT_GT(image.size(), 4u) << file;
             EXPECT_EQ("\xff\xd8", image.substr(0, 2)) << file;
@@ -79,15 +53,14 @@ void CheckCache(const fs::path& folder, int& images)
     }
 }
 
-TEST(CacheCrash, AKilledPlayerLeavesAWholeCache)
+using CacheCrash = Store;
+
+TEST_F(CacheCrash, AKilledPlayerLeavesAWholeCache)
 {
     const int kRounds = 40;
-    std::string error;
-    const auto store = Storefront::Start(StorefrontOptions(), error);
-    ASSERT_TRUE(store) << error;
-    const Folder folder;
+    const TempFolder folder;
     const std::string movie = folder.Write("movie.js", kMovie);
-    const std::string cache = folder.Path("cache");
+    const std::string cache = folder / "cache";
     std::mt19937 random(7);  // fixed: what varies is the machine
     std::uniform_int_distribution<long> delay(0, 150000000);
     int images = 0;
@@ -101,7 +74,7 @@ TEST(CacheCrash, AKilledPlayerLeavesAWholeCache)
         nanosleep(&pause, nullptr);
         kill(player.Pid(), SIGKILL);
         player.WaitForEnd();
-        CheckCache(cache, images);
+        CheckCache(folder, images);
     }
     EXPECT_GT(images, kRounds) << "the players were killed before they did anything";
     EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_clearLocalCache(cache.c_str()));

@@ -1,9 +1,7 @@
 // All methods of com.orvex.ZVWSLib from a movie in the real process. Each result is written as JSON by the movie, which
 // keeps the order of the properties, and compared with what the simulator's database says, also as JSON.
-#include <gtest/gtest.h>
-
+#include "../library/Store.h"
 #include "Movie.h"
-#include "Storefront.h"
 
 namespace {
 
@@ -18,8 +16,7 @@ const std::string kProducts =
     "(SELECT json_group_array(json_object('SkuID', sku, 'PurchaseType', type, 'Price', price, 'RentalPeriod', period, "
     "'AvailableAssets', json('[{\"FileProfile\":1},{\"FileProfile\":2}]'), 'AvailableAudioProfiles', "
     "json_array(json_object('AssetAudioID', sku * 2, 'FileLocation', 'audio/' || sku || '.ac3', 'ContainsVideo', "
-    "json('false'), "
-    "'AudioAssetProfile', 1)), 'ExpireDate', replace(replace(expires, '/', '-'), ' ', 'T') || '.000Z')) "
+    "json('false'), 'AudioAssetProfile', 1)), 'ExpireDate', replace(replace(expires, '/', '-'), ' ', 'T') || '.000Z')) "
     "FROM (SELECT * FROM product WHERE title = t.id ORDER BY sku))";
 
 // The properties of a title listing, for json_object; `t` is the title's row.
@@ -27,10 +24,9 @@ std::string Title(const std::string& position)
 {
     return "'TitleID', t.id, 'TitleName', t.name, 'BoxArtPrefix', t.prefix, 'TitlePosition', " + position +
            ", 'EpisodeNumber', t.episode, 'CHVRSRating', nullif(t.chvrs, ''), 'LoyaltyPointsForBuy', CAST(t.id % 100 "
-           "AS TEXT), "
-           "'LoyaltyPointsForRent', CAST(t.id % 10 AS TEXT), 'BonusAssets', (SELECT "
-           "json_group_array(json_object('BonusAssetID', "
-           "id, 'Profile', profile, 'BonusType', 0)) FROM bonus WHERE title = t.id), 'IsTvListing', " +
+           "AS TEXT), 'LoyaltyPointsForRent', CAST(t.id % 10 AS TEXT), 'BonusAssets', (SELECT "
+           "json_group_array(json_object('BonusAssetID', id, 'Profile', profile, 'BonusType', 0)) FROM bonus WHERE "
+           "title = t.id), 'IsTvListing', " +
            Flag("t.is_tv") + ", 'MPAARating', nullif(t.rating, ''), 'IsTHXMediaDirectorEnabled', " + Flag("t.thx") +
            ", 'IsTHXMediaDirectorEnabledForTrailer', json('false'), 'AvailableProducts', " + kProducts;
 }
@@ -38,8 +34,8 @@ std::string Title(const std::string& position)
 const std::string kDetails =
     ", 'ResponseCode', 0, 'ResponseMessage', 'OK', 'Synopsis', nullif(synopsis, ''), 'UserRating', stars, 'Directors', "
     "nullif(directors, ''), 'Actors', nullif(actors, ''), 'Writers', nullif(writers, ''), 'Producers', "
-    "nullif(producers, ''), "
-    "'Copyright', nullif(copyright, ''), 'RunTime', nullif(runtime, ''), 'RatingReason', nullif(reason, '')";
+    "nullif(producers, ''), 'Copyright', nullif(copyright, ''), 'RunTime', nullif(runtime, ''), 'RatingReason', "
+    "nullif(reason, '')";
 
 std::string Details(const std::string& where)
 {
@@ -65,8 +61,7 @@ std::string Purchased(const std::string& pass)
            (pass.empty()
                 ? "0, 'Status', 3, 'RentalPeriod', '48 hours', 'PassID', 0, 'PlayStatus', 0, 'StartTimeSeconds', 0"
                 : "p_type, 'Status', watch, 'RentalPeriod', CASE WHEN p_type = 0 THEN '48 hours' ELSE '' END, "
-                  "'PassID', "
-                  "pass, 'PlayStatus', status, 'StartTimeSeconds', position");
+                  "'PassID', pass, 'PlayStatus', status, 'StartTimeSeconds', position");
 }
 
 std::string PurchasedPage(const std::string& pass, const std::string& rows, const std::string& more)
@@ -115,15 +110,13 @@ std::vector<Row> Rows(const Storefront& store)
     const std::string bonus = store.Query("SELECT MIN(id) FROM bonus");
     const std::string recommended =
         "SELECT DISTINCT title FROM title_genre WHERE genre = (SELECT MAX(genre) FROM title_genre WHERE title = 12) "
-        "AND title > "
-        "12 ORDER BY title LIMIT 5";
+        "AND title > 12 ORDER BY title LIMIT 5";
     const std::string wishRows =
         "SELECT title.*, row_number() OVER (ORDER BY name, id) AS row FROM wish JOIN title ON title = id ORDER BY "
         "name, id";
     const std::string passRows =
         "SELECT title.*, pass.id AS pass, pass.type AS p_type, watch, status, position, row_number() OVER (ORDER BY "
-        "pass.id) AS row "
-        "FROM pass JOIN title ON title.id = pass.title ORDER BY pass.id";
+        "pass.id) AS row FROM pass JOIN title ON title.id = pass.title ORDER BY pass.id";
     return {
         {"getNavigation", "{}",
          "SELECT json_group_array(json_object('ID', id, 'Name', name, 'Visible', " + Flag("visible") +
@@ -146,8 +139,7 @@ std::vector<Row> Rows(const Storefront& store)
         {"getTvEpisodeListByTitleID", "{titleid: " + season + "}",
          Object(kOk +
                 ", 'Episodes', (SELECT json_group_array(json_object('EpisodeID', id, 'EpisodeName', name, "
-                "'EpisodeNumber', "
-                "episode)) FROM (SELECT * FROM title WHERE season = " +
+                "'EpisodeNumber', episode)) FROM (SELECT * FROM title WHERE season = " +
                 season + " ORDER BY episode))")},
         {"getAllTvEpisodeListings", "{titleid: " + season + "}",
          "SELECT json_group_array(json_object(" + Title("1") + kDetails +
@@ -217,8 +209,9 @@ const struct {
 } kAtOnce[] = {
     {"getUserAgent", "ws.getUserAgent()", "\"ZVSDK: F|A ZVMODEL:M\""},
     {"getDeviceEnv", "ws.getDeviceEnv()", "2"},
-    {"getAvailableEnvLists", "ws.getAvailableEnvLists().map(function (e) { return [e.endpoint, e.envNum]; })",
-     "[[\"apistg\",0],[\"stg\",1],[\"production\",2],[\"default\",3]]"},
+    {"getAvailableEnvLists",
+     "ws.getAvailableEnvLists().map(function (e) { return [e.endpoint, e.envNum, e.isDefault]; })",
+     "[[\"apistg\",0,null],[\"stg\",1,null],[\"production\",2,true],[\"default\",3,null]]"},
     {"getSysInfo", "[ws.getSysInfo('x'), ws.getSysInfo(), ws.getSysInfo(1, 2), ws.getSysInfo(5)]",
      "[\"x\",\"\",\"\",\"5\"]"},
     {"fileExist", "[com.orvex.ZVWSLib.fileExist('/'), com.orvex.ZVWSLib.fileExist('/no/such/file')]", "[true,false]"},
@@ -265,11 +258,10 @@ var calls = [
 )";
 }
 
-TEST(Methods, AnswerWhatTheStoreHolds)
+using Methods = Store;
+
+TEST_F(Methods, AnswerWhatTheStoreHolds)
 {
-    std::string error;
-    const auto store = Storefront::Start(StorefrontOptions(), error);
-    ASSERT_TRUE(store) << error;
     const std::vector<Row> rows = Rows(*store);
     // What later rows change is read before, and what they change to, after the movie has ended.
     std::vector<std::string> expected;

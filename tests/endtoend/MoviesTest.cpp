@@ -1,20 +1,11 @@
 // The movies that come with the project, and what a movie sees when the store is not as it should be.
-#include <gtest/gtest.h>
-
+#include "../library/Store.h"
 #include "Movie.h"
-#include "Storefront.h"
 
 namespace {
 
-class Demonstration : public testing::Test {
+class Demonstration : public Store {
 protected:
-    void SetUp() override
-    {
-        std::string error;
-        store = Storefront::Start(StorefrontOptions(), error);
-        ASSERT_TRUE(store) << error;
-    }
-
     MovieOutput Run(const std::string& movie, const std::string& deployment = "")
     {
         return RunMovieFile(std::string(ZV_MOVIES) + "/" + movie,
@@ -26,14 +17,20 @@ protected:
         EXPECT_EQ(error, output.After("script error: ").substr(0, error.size())) << output.Text();
     }
 
-    std::unique_ptr<Storefront> store;
+    // After a run that shall have ended well.
+    void ExpectWell(const MovieOutput& output) const
+    {
+        EXPECT_EQ(0, output.status);
+        ExpectScriptErrors(output, "(none)");
+        for (const LoggedRequest& request : store->Log())
+            EXPECT_EQ("", request.violation) << request.operation;
+    }
 };
 
 TEST_F(Demonstration, TheStoreIsShown)
 {
     const MovieOutput output = Run("storefront.js");
-    EXPECT_EQ(0, output.status);
-    ExpectScriptErrors(output, "(none)");
+    ExpectWell(output);
     EXPECT_EQ("", output.After("Genres"));
     EXPECT_EQ(store->Query("SELECT '1 of ' || ((COUNT(*) + 9) / 10) || ' (' || COUNT(*) || ' titles)' FROM title_genre "
                            "WHERE genre = 100"),
@@ -41,19 +38,14 @@ TEST_F(Demonstration, TheStoreIsShown)
     EXPECT_EQ(
         store->Query("SELECT synopsis FROM title WHERE id = (SELECT MIN(title) FROM title_genre WHERE genre = 100)"),
         output.After("    Synopsis    "));
-    for (const LoggedRequest& request : store->Log())
-        EXPECT_EQ("", request.violation) << request.operation;
 }
 
 TEST_F(Demonstration, AnEveningChangesTheAccount)
 {
     const MovieOutput output = Run("evening.js");
-    EXPECT_EQ(0, output.status);
-    ExpectScriptErrors(output, "(none)");
+    ExpectWell(output);
     EXPECT_EQ("0 goes on at 1234 s", output.After("loadLastStreamingAssetLocation: "));
     EXPECT_EQ("1234", store->Query("SELECT position FROM pass ORDER BY id DESC LIMIT 1"));
-    for (const LoggedRequest& request : store->Log())
-        EXPECT_EQ("", request.violation) << request.operation;
 }
 
 TEST_F(Demonstration, AStoreThatCannotBeTrustedOrReachedEndsTheMovieWithAnError)
@@ -62,8 +54,7 @@ TEST_F(Demonstration, AStoreThatCannotBeTrustedOrReachedEndsTheMovieWithAnError)
     ExpectScriptErrors(Run("storefront.js"), "Error: init failed with status -2011");
     ExpectScriptErrors(Run("storefront.js", "/no/such/file"), "Error: init failed with status -1900");
     store->SetCertificate(CertificateKind::Good);
-    std::string error;
-    ASSERT_TRUE(store->AddFault("getTitlesByNavigation=http:503", error));
+    Fault("getTitlesByNavigation=http:503");
     ExpectScriptErrors(Run("storefront.js"), "Error: getTitles failed with status -4503");
     ExpectScriptErrors(Run("storefront.js"), "(none)");
 }

@@ -3,14 +3,12 @@
 #include "Peer.h"
 #include "Target.h"
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
+void TestInput(std::string_view input)
 {
-    std::string_view input = AsText(data, size);
     const std::string name = TakeLine(input);
     Peer nobody("");
     PeerSession session;
     session.cache().Preset(input);
     CallResult result;
     MakeCall(name, session.handle(), result);
-    return 0;
 }

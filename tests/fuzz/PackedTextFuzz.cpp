@@ -47,10 +47,9 @@ void RoundTrip(const ZVString& plain)
 
 }  // namespace
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
+void TestInput(std::string_view input)
 {
-    const ZVString text(reinterpret_cast<const char*>(data), size);
+    const ZVString text(input.data(), input.size());
     Unpack(text);
     RoundTrip(text);
-    return 0;
 }

@@ -4,23 +4,20 @@
 #include <errno.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <vector>
 
 #include "Target.h"
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
+void TestInput(std::string_view input)
 {
     int ends[2];
     Require(socketpair(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0, ends) == 0, "a pair of sockets can be had");
     std::vector<Packet> whole;
-    const uint8_t* const end = data + size;
-    while (data != end) {
-        const size_t announced = *data++;
-        const size_t length = std::min<size_t>(announced, end - data);
-        if (send(ends[0], data, length, MSG_DONTWAIT | MSG_NOSIGNAL) == -1) break;  // the queue is full
-        if (length == sizeof(Packet)) memcpy(whole.emplace_back().data(), data, length);
-        data += length;
+    while (!input.empty()) {
+        const std::string_view packet = input.substr(1, static_cast<unsigned char>(input.front()));
+        input.remove_prefix(1 + packet.size());
+        if (send(ends[0], packet.data(), packet.size(), MSG_DONTWAIT | MSG_NOSIGNAL) == -1) break;  // the queue is full
+        if (packet.size() == sizeof(Packet)) memcpy(whole.emplace_back().data(), packet.data(), packet.size());
     }
     close(ends[0]);
     for (const Packet& packet : whole) {
@@ -31,5 +28,4 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
     NETWORK_MSG_STUB_MESSAGE message;
     Require(ReceivePacket(ends[1], message) == ECONNRESET, "the end is seen");
     close(ends[1]);
-    return 0;
 }

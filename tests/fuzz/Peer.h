@@ -5,6 +5,7 @@
 #include <string>
 #include <string_view>
 
+#include "CacheMgr.h"
 #include "SessionImpl.h"
 
 /// Answers every connection with the same bytes and swallows what is sent. One exists at a time.
@@ -37,28 +38,15 @@ private:
     int m_Open = 0;
 };
 
-/// What a session stored, by table and key.
-class MemoryCache : public CacheInterface {
+/// What a session stored, by table and key. The rest is a cache that was never opened, which has nothing.
+class MemoryCache : public CacheMgr {
 public:
     /// Every table answers with `text`, a few times.
     void Preset(std::string_view text);
     bool empty() const { return m_Texts.empty(); }
 
-    int Open(const ZV_WS_CacheParam2&) override { return 0; }
-    int Close() override { return 0; }
     bool ReadMetaData(const ZVString& name, const ZVString& key, ZVString& value) override;
     bool WriteMetaData(const ZVString& name, const ZVString& key, const ZVString& value) override;
-    bool UpdateLastCacheLoadTime(const ZVString&) override { return true; }
-    bool WriteBoxArt(const ZVString&, ZV_WS_BoxArtSize, unsigned int, const ZVString&, unsigned int,
-                     const ZVString&) override
-    {
-        return true;
-    }
-    bool ReadBoxArt(const ZVString&, ZV_WS_BoxArtSize, unsigned int&, ZVString&, unsigned int&, ZVString&) override
-    {
-        return false;
-    }
-    bool SetBoxArtNeedUpdate() override { return true; }
     bool ReadUserData(const ZVString& name, const ZVString& key, ZVString& value) override
     {
         return ReadMetaData(name, key, value);
@@ -67,16 +55,8 @@ public:
     {
         return WriteMetaData(name, key, value);
     }
-    bool PurgeUserData(const ZVString&) override
-    {
-        m_Texts.clear();
-        return true;
-    }
     bool ReadWishlistFlag(int, bool&) override { return false; }
-    bool WriteWishlistFlag(int, bool) override { return true; }
-    bool WriteWishlistFlags(const ZVWS_IntVector&, const ZVWS_BoolVector&) override { return true; }
-    bool RemoveWishlistFlag(int) override { return true; }
-    bool RemoveAllWishlistFlags() override { return true; }
+    bool WriteWishlistFlag(int, bool) override { return false; }
 
 private:
     std::map<std::string, ZVString> m_Texts;

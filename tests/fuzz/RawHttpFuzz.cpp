@@ -106,23 +106,18 @@ private:
 
 }  // namespace
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
+void TestInput(std::string_view input)
 {
     static const ClockHost clock;
-    std::string_view input = AsText(data, size);
     char kind[32] = "";
     unsigned int piece = 65536;
     sscanf(TakeLine(input).c_str(), "%31s %u", kind, &piece);
     const std::string name = kind;
-    if (name == "clock") {
-        clock.Ask(input);
-        return 0;
-    }
+    if (name == "clock") return clock.Ask(input);
     Peer peer(input, piece);
     PeerSession session;
     if (name == "discovery") Discovery(session.session());
     if (name == "bandwidth") Bandwidth(session.handle());
     if (name == "image-memory") ImageToMemory(session.handle());
     if (name == "image-file") ImageToFile(session.session());
-    return 0;
 }

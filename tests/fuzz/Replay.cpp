@@ -2,7 +2,6 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
-#include <vector>
 
 #include "Target.h"
 
@@ -16,10 +15,10 @@ void Replay(const std::filesystem::path& path, int& count)
         return;
     }
     std::ifstream file(path, std::ios::binary);
-    const std::vector<char> bytes((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
+    const std::string bytes((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
     if (!file) return;
     fprintf(stderr, "replay: %s\n", path.c_str());  // the last one named is the one that failed
-    LLVMFuzzerTestOneInput(reinterpret_cast<const uint8_t*>(bytes.data()), bytes.size());
+    TestInput(bytes);
     ++count;
 }
 

@@ -201,11 +201,10 @@ private:
 
 }  // namespace
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
+void TestInput(std::string_view input)
 {
-    RunScript(Script(AsText(data, size)).Make(), "", [](IStagecraft& runtime) {
+    RunScript(Script(input).Make(), "", [](IStagecraft& runtime) {
         runtime.RegisterExtensionClass<ZVWSLibAE>();
         runtime.RegisterExtensionClass<Probe>();
     });
-    return 0;
 }

@@ -1,16 +1,14 @@
-// What the fuzz targets share. A target is one LLVMFuzzerTestOneInput in one file; under the fuzzer it gets inputs
-// without end, in the other builds those that are kept in seeds/.
+// What the fuzz targets share. A target is one TestInput in one file; under the fuzzer it gets inputs without end, in
+// the other builds those that are kept in seeds/.
 #pragma once
 
-#include <stddef.h>
-#include <stdint.h>
 #include <stdio.h>
 #include <stdlib.h>
 
 #include <string>
 #include <string_view>
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size);
+void TestInput(std::string_view input);
 
 /// Ends the run when a property does not hold.
 inline void Require(bool holds, const char* what)
@@ -27,9 +25,4 @@ inline std::string TakeLine(std::string_view& text)
     std::string line(text.substr(0, end));
     text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
     return line;
-}
-
-inline std::string_view AsText(const uint8_t* data, size_t size)
-{
-    return std::string_view(reinterpret_cast<const char*>(data), size);
 }

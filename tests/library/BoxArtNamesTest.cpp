@@ -25,12 +25,4 @@ TEST(BoxArtNamesTest, OneSizeHasAFolderOfAnotherName)
     }
 }
 
-TEST(BoxArtNamesTest, FilesLieBesideTheDatabase)
-{
-    EXPECT_STREQ("/a/b/ABC135.jpg", ZVUtilities::GetBoxArtImageFileName("/a/b/c.zv", "ABC", BOX_ART_SIZE_135S).c_str());
-    EXPECT_STREQ("./ABC95.jpg", ZVUtilities::GetBoxArtImageFileName("", "ABC", BOX_ART_SIZE_95).c_str());
-    EXPECT_DEATH(ZVUtilities::GetBoxArtImageFileName(nullptr, "ABC", BOX_ART_SIZE_95),
-                 "\\(path != 0\\) && \\(boxartprefix != 0\\)");
-}
-
 }  // namespace

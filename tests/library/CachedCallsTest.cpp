@@ -18,12 +18,12 @@ constexpr unsigned int kAll = ZV_WS_CacheParam::CacheData_Metadata | ZV_WS_Cache
 
 class Cached : public Store {
 protected:
-    ZV_WS_Status Begin(CacheType type, unsigned int data = kAll)
+    ZV_WS_Status Begin(CacheType type, unsigned int data = kAll, unsigned int limit = 0)
     {
         ZV_WS_release(&session);
         folder = store->DataFolder() + "/cache";
         ZV_WS_SetupParams setup = Setup();
-        setup.CacheParam = {type, data, 0, folder.c_str()};
+        setup.CacheParam = {type, data, limit, folder.c_str()};
         const ZV_WS_Status status = Initialize(setup);
         store->ClearLog();
         return status;
@@ -50,21 +50,15 @@ protected:
     std::string folder;
 };
 
-template <class Record>
-std::function<ZV_WS_Status(ZV_WS_Session*)> Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Record*))
-{
-    return [call](ZV_WS_Session* session) {
-        Owned<Record> record;
-        return call(session, &record);
-    };
-}
+using Call = std::function<ZV_WS_Status(ZV_WS_Session*)>;
 
-template <class Record>
-std::function<ZV_WS_Status(ZV_WS_Session*)> Asking(ZV_WS_Status (*call)(ZV_WS_Session*, int, Record*), int id)
+template <class... Parameters, class... Arguments>
+Call Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), Arguments... arguments)
 {
+    using Output = std::remove_pointer_t<std::tuple_element_t<sizeof...(Arguments), std::tuple<Parameters...>>>;
     return [=](ZV_WS_Session* session) {
-        Owned<Record> record;
-        return call(session, id, &record);
+        Owned<Output> record;
+        return call(session, arguments..., &record);
     };
 }
 
@@ -72,50 +66,30 @@ std::function<ZV_WS_Status(ZV_WS_Session*)> Asking(ZV_WS_Status (*call)(ZV_WS_Se
 TEST_F(Cached, TheSecondTimeNothingIsSent)
 {
     const ZV_WS_Pagination page = Page(1, 5);
-    const std::vector<std::function<ZV_WS_Status(ZV_WS_Session*)>> calls = {
+    const int season = Number("SELECT MIN(id) FROM title WHERE is_tv = 1");
+    const auto any = PURCHASE_TYPE_ANY;
+    const auto all = TITLE_TYPE_FILTER_ANY;
+    const Call calls[] = {
         Asking(ZV_WS_getNavigation),
-        [&](ZV_WS_Session* s) {
-            Owned<ZV_WS_TitlesResponse> record;
-            const ZV_WS_Status status = ZV_WS_getTitles(s, 1, &page, PURCHASE_TYPE_ANY, &record);
-            EXPECT_EQ(5u, record.Titles.size);
-            return status;
-        },
+        Asking(ZV_WS_getTitles, 1, &page, any),
         Asking(ZV_WS_getTitleListing, 12),
         Asking(ZV_WS_getTvEpisodeListing, Number("SELECT MIN(id) FROM title WHERE season > 0")),
-        Asking(ZV_WS_getTvEpisodeListByTitleID, Number("SELECT MIN(id) FROM title WHERE is_tv = 1")),
-        Asking(ZV_WS_getAllTvEpisodeListings, Number("SELECT MIN(id) FROM title WHERE is_tv = 1")),
-        [](ZV_WS_Session* s) {
-            Owned<ZV_WS_TranslateTivoExternalIDResponse> record;
-            return ZV_WS_translateTivoExternalID(s, "EXT31", &record);
-        },
+        Asking(ZV_WS_getTvEpisodeListByTitleID, season),
+        Asking(ZV_WS_getAllTvEpisodeListings, season),
+        Asking(ZV_WS_translateTivoExternalID, "EXT31"),
         Asking(ZV_WS_translateSkuID, Number("SELECT MIN(sku) FROM product")),
-        [&](ZV_WS_Session* s) {
-            Owned<ZV_WS_TitlesResponse> record;
-            return ZV_WS_searchForTitle(s, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, "harbour", &record);
-        },
-        [&](ZV_WS_Session* s) {
-            Owned<ZV_WS_TitlesResponse> record;
-            return ZV_WS_searchForTitleDetail(s, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, "harbour", &record);
-        },
+        Asking(ZV_WS_searchForTitle, &page, any, all, "harbour"),
+        Asking(ZV_WS_searchForTitleDetail, &page, any, all, "harbour"),
         Asking(ZV_WS_getRecommendedTitles, 12),
         Asking(ZV_WS_getEmailAddress),
         Asking(ZV_WS_getBillingInfo),
         Asking(ZV_WS_getSettingsPageInfo),
-        [&](ZV_WS_Session* s) {
-            Owned<ZV_WS_WishlistItemsResponse> record;
-            return ZV_WS_getWishlistItems(s, SORT_ORDER_RATING, &page, TITLE_TYPE_FILTER_ANY, &record);
-        },
-        [&](ZV_WS_Session* s) {
-            Owned<ZV_WS_MyVideosResponse> record;
-            const ZV_WS_Status status =
-                ZV_WS_getMyVideos(s, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, WATCH_STATUS_UNDEFINED, &record);
-            EXPECT_EQ(3u, record.Titles.size);
-            return status;
-        },
+        Asking(ZV_WS_getWishlistItems, SORT_ORDER_RATING, &page, all),
+        Asking(ZV_WS_getMyVideos, &page, any, all, WATCH_STATUS_UNDEFINED),
     };
     for (const CacheType type : {CacheType_Memory, CacheType_File}) {
         ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
-        for (size_t i = 0; i < calls.size(); ++i) {
+        for (size_t i = 0; i < std::size(calls); ++i) {
             store->ClearLog();
             EXPECT_EQ(ZV_WS_Status_ok, calls[i](&session)) << i;
             EXPECT_EQ(1u, store->Log().size()) << i;
@@ -132,11 +106,9 @@ TEST_F(Cached, DownloadedVideosAreNeverCached)
     ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
     store->ClearLog();
     const ZV_WS_Pagination page = Page(1, 5);
-    for (int i = 0; i < 2; ++i) {
-        Owned<ZV_WS_MyVideosResponse> videos;
-        EXPECT_EQ(ZV_WS_Status_ok,
-                  ZV_WS_getMyVideos(&session, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, 3, &videos));
-    }
+    const Call ask = Asking(ZV_WS_getMyVideos, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, 3);
+    for (int i = 0; i < 2; ++i)
+        EXPECT_EQ(ZV_WS_Status_ok, ask(&session));
     EXPECT_EQ(2u, store->Log().size());
 }
 
@@ -421,10 +393,7 @@ TEST_F(BoxArt, AFileWithoutItsRowIsReplaced)
 // The oldest titles make room, also when somebody has removed their files.
 TEST_F(BoxArt, EvictionFindsItsFilesGone)
 {
-    ZV_WS_SetupParams setup = Setup();
-    folder = store->DataFolder() + "/cache";
-    setup.CacheParam = {CacheType_File, ZV_WS_CacheParam::CacheData_BoxArtImage, 358400, folder.c_str()};
-    ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File, ZV_WS_CacheParam::CacheData_BoxArtImage, 358400));
     for (int title = 1; title <= 40; ++title) {
         char prefix[16];
         snprintf(prefix, sizeof prefix, "ZV%05d", title);

@@ -7,8 +7,6 @@
 #include <string>
 #include <vector>
 
-#include "CacheMgr.h"
-
 namespace {
 
 typedef _ZV1__getTitleListingResponse Response;
@@ -150,22 +148,6 @@ TEST(SerializerTest, OneSerializerServesSeveralTexts)
     EXPECT_TRUE(text == whole);
 }
 
-TEST(SerializerTest, PassesThroughTheCache)
-{
-    CacheMgr cache;
-    ZV_WS_CacheParam2 param;
-    param.type = CacheType_Memory;
-    param.flags = 1;
-    ASSERT_EQ(0, cache.Open(param));
-    ZVString text;
-    EXPECT_TRUE(cache.WriteMetaData("getTitleListing", "-4", Written(true)));
-    EXPECT_TRUE(cache.ReadMetaData("getTitleListing", "-4", text));
-    Serializer serializer(true, false);
-    Response response;
-    ASSERT_TRUE(serializer.Read(text, response));
-    EXPECT_EQ(-4, response.getTitleListingResult->TitleID);
-}
-
 // ---- Texts that are no answers
 
 TEST(SerializerTest, RefusesEveryTextCutShort)
@@ -249,34 +231,6 @@ TEST(SerializerTest, RefusesWhatGrowsWithoutEnd)
             EXPECT_EQ(row.reads, response.getTitleListingResult != nullptr) << row.what;
         }
     }
-}
-
-// ---- The hooks
-
-TEST(SerializerTest, ReceivesFromTheFrontOfTheText)
-{
-    Serializer serializer(true, false);
-    serializer.SetXML(Bytes(std::string("ab\0cde", 6)));
-    char buffer[8] = {};
-    EXPECT_EQ(0u, serializer.frecv(&serializer, buffer, 0));
-    EXPECT_EQ(6u, serializer.GetXML().length());
-    EXPECT_EQ(4u, serializer.frecv(&serializer, buffer, 4));
-    EXPECT_EQ(std::string("ab\0c", 4), std::string(buffer, 4));
-    EXPECT_TRUE(serializer.GetXML() == "de");
-    EXPECT_EQ(2u, serializer.frecv(&serializer, buffer, sizeof buffer));
-    EXPECT_EQ(0u, serializer.frecv(&serializer, buffer, sizeof buffer));
-
-    EXPECT_EQ(SOAP_OK, serializer.fsend(&serializer, "x\0y", 3));
-    EXPECT_EQ(SOAP_OK, serializer.fsend(&serializer, "z", 1));
-    EXPECT_EQ(std::string("x\0yz", 4), Text(serializer.GetXML()));
-}
-
-TEST(SerializerDeathTest, HooksNeedAContext)
-{
-    Serializer serializer(true, false);
-    char buffer[1];
-    EXPECT_DEATH(serializer.fsend(nullptr, "x", 1), "Private/Serializer.*pSerializer != 0");
-    EXPECT_DEATH(serializer.frecv(nullptr, buffer, 1), "Private/Serializer.*pSerializer != 0");
 }
 
 }  // namespace

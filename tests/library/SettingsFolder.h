@@ -1,35 +1,24 @@
 // A folder for settings files and a device key of its own.
 #pragma once
 
-#include <gtest/gtest.h>
-#include <stdlib.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <filesystem>
-#include <fstream>
 #include <sstream>
 #include <string>
 #include <vector>
 
+#include "../foundation/TempFolder.h"
 #include "CfgXMLFile.h"
 #include "Deployment.h"
 
 class SettingsFolder : public testing::Test {
 protected:
-    void SetUp() override
-    {
-        char name[] = "/tmp/zvsettingsXXXXXX";
-        ASSERT_TRUE(mkdtemp(name));
-        folder = name;
-        file = folder + "/settings.xml";
-        UseKeyFile(folder + "/device.key");
-    }
-    void TearDown() override { std::filesystem::remove_all(folder); }
+    void SetUp() override { UseKeyFile(folder + "device.key"); }
 
     void UseKeyFile(const std::string& path)
     {
-        const std::string deployment = folder + "/deployment";
+        const std::string deployment = folder + "deployment";
         Put(deployment, "device_key_file = " + path + "\n");
         setenv("ZV_DEPLOYMENT", deployment.c_str(), 1);
         ASSERT_TRUE(Deployment::Load());
@@ -87,6 +76,7 @@ protected:
         return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
     }
 
-    std::string folder;
-    std::string file;
+    const TempFolder temp;
+    const std::string folder = temp / "";
+    std::string file = folder + "settings.xml";
 };

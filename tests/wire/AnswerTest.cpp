@@ -9,11 +9,12 @@ namespace {
 const char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
 const char kSoap12[] = "http://www.w3.org/2003/05/soap-envelope";
 
-std::string Envelope(const std::string& body, const std::string& version = kSoap11, const std::string& header = "")
+std::string Envelope(const std::string& body, const std::string& version = kSoap11)
 {
     return "<?xml version=\"1.0\" encoding=\"utf-8\"?><s:Envelope xmlns:s=\"" + version +
-           "\" xmlns:xsi=\"http://www.w3.org/2001/XMLSchema-instance\">" + header +
-           "<s:Body xmlns=\"http://api.zorvane.example/api/\">" + body + "</s:Body></s:Envelope>";
+           "\" xmlns:xsi=\"http://www.w3.org/2001/XMLSchema-instance\">"
+           "<s:Body xmlns=\"http://api.zorvane.example/api/\">" +
+           body + "</s:Body></s:Envelope>";
 }
 
 const char kListing[] =
@@ -42,11 +43,8 @@ struct Listing {
                               [&](RealTimeBrowse& service) { return service.getTitleListing(&request, &response); });
         answered = response.getTitleListingResult != nullptr;
         if (result == SOAP_OK && answered) ZVUtilities::Convert(response.getTitleListingResult, record);
-        fault = exchange.service().soap_fault_string() ? exchange.service().soap_fault_string() : "";
     }
     ~Listing() { ZV_WS_release(&record); }
-
-    std::string fault;
 };
 
 TEST(Answer, RecordsAreReadWholeInBothVersions)
@@ -59,8 +57,6 @@ TEST(Answer, RecordsAreReadWholeInBothVersions)
         EXPECT_EQ(42, r.TitleID);
         EXPECT_STREQ("L\xC3\xA9on & friends", r.TitleName);
         EXPECT_EQ(nullptr, r.BoxArtPrefix);
-        EXPECT_EQ(3, r.TitlePosition);
-        EXPECT_EQ(0, r.EpisodeNumber);
         EXPECT_TRUE(r.IsTvListing);
         EXPECT_STREQ("Two <lines>", r.Synopsis);
         ASSERT_EQ(1u, r.BonusAssets.size);
@@ -68,83 +64,44 @@ TEST(Answer, RecordsAreReadWholeInBothVersions)
         EXPECT_EQ(FILE_PROFILE_HIGHDEFINITION, r.BonusAssets.BonusAsset[0].Profile);
         ASSERT_EQ(2u, r.AvailableProducts.size);
         const ZV_WS_ProductListing& product = r.AvailableProducts.ProductListing[0];
-        EXPECT_EQ(PURCHASE_TYPE_BUY, product.PurchaseType);
-        EXPECT_STREQ("4.90", product.Price);
         ASSERT_EQ(2u, product.AvailableAssets.size);
         EXPECT_EQ(FILE_PROFILE_HIGHDEFINITION, product.AvailableAssets.FileProfile[1]);
         EXPECT_EQ(0u, product.AvailableAudioProfiles.size);
-        EXPECT_EQ(nullptr, product.AvailableAudioProfiles.AudioFile);
         EXPECT_EQ(nullptr, r.AvailableProducts.ProductListing[1].Price);
     }
 }
 
-TEST(Answer, UnmarkedHeadersAreSkippedAndMarkedOnesRefused)
+// What damage does to an answer, the library's tests see with the simulator's faults; these are whole and not the
+// answer.
+TEST(Answer, AnswersToSomethingElseFail)
 {
-    const std::string plain = "<s:Header><x:Trace xmlns:x=\"urn:x\">1</x:Trace></s:Header>";
-    EXPECT_EQ(SOAP_OK, Listing(HttpAnswer(Envelope(kListing, kSoap11, plain))).result);
-    const std::string marked = "<s:Header><x:Trace xmlns:x=\"urn:x\" s:mustUnderstand=\"1\">1</x:Trace></s:Header>";
-    EXPECT_EQ(SOAP_MUSTUNDERSTAND, Listing(HttpAnswer(Envelope(kListing, kSoap11, marked))).result);
-}
-
-TEST(Answer, FaultsOfBothVersionsGiveTheSameText)
-{
-    const std::string fault11 =
-        Envelope("<s:Fault xmlns=\"\"><faultcode>s:Server</faultcode><faultstring>shop closed</faultstring></s:Fault>");
-    const std::string fault12 = Envelope(
-        "<s:Fault><s:Code><s:Value>s:Receiver</s:Value></s:Code>"
-        "<s:Reason><s:Text xml:lang=\"en\">shop closed</s:Text></s:Reason></s:Fault>",
-        kSoap12);
-    for (const std::string& fault : {fault11, fault12}) {
-        const Listing listing(HttpAnswer(fault, "500 Internal Server Error"));
-        EXPECT_EQ("shop closed", listing.fault);
-        EXPECT_EQ(-6012, ZVUtilities::To_ZV_WS_Status(listing.result)) << listing.result;
-    }
-}
-
-TEST(Answer, UnusableAnswersFail)
-{
-    const std::string good = Envelope(kListing);
-    const struct {
-        const char* what;
-        std::string answer;
-        int status;
-    } rows[] = {
-        {"unknown enumeration text", HttpAnswer(std::string(good).replace(good.find("buy"), 3, "let")), -1004},
-        {"cut short", HttpAnswer(good).substr(0, 700), -2012},
-        {"no answer at all", "", -2012},
-        {"another element", HttpAnswer(Envelope("<getNothingResponse/>")), -4200},
-        {"no XML", HttpAnswer("hello"), -4200},
-        {"busy", HttpAnswer("", "503 Busy"), -4503},
-        {"moved", HttpAnswer("", "302 Found"), -4302},
-    };
-    for (const auto& row : rows) {
-        const Listing listing(row.answer);
-        EXPECT_EQ(row.status, ZVUtilities::To_ZV_WS_Status(listing.result)) << row.what << ": " << listing.result;
+    for (const char* body : {"<getNothingResponse/>", "<getTitleListingResult/>"}) {
+        const Listing listing(HttpAnswer(Envelope(body)));
+        EXPECT_NE(SOAP_OK, listing.result) << body;
+        EXPECT_FALSE(listing.answered) << body;
     }
     const Listing empty(HttpAnswer(Envelope("<getTitleListingResponse/>")));
     EXPECT_EQ(SOAP_OK, empty.result);
     EXPECT_FALSE(empty.answered);
 }
 
+// The service's yes or no is a text, of which one spelling means yes.
 TEST(Answer, OddlyTypedResults)
 {
     const struct {
-        const char* literal;
+        const char* content;
         bool enabled;
-    } rows[] = {{"<IsAdultVerificationEnabled>true</IsAdultVerificationEnabled>", true},
-                {"<IsAdultVerificationEnabled>True</IsAdultVerificationEnabled>", false},
-                {"<IsAdultVerificationEnabled><flag>true</flag></IsAdultVerificationEnabled>", false},
-                {"<IsAdultVerificationEnabled/>", false},
-                {"", false}};
+    } rows[] = {{"true", true}, {"True", false}, {"<flag>true</flag>", false}, {"", false}, {nullptr, false}};
     for (const auto& row : rows) {
+        const std::string name = "IsAdultVerificationEnabled";
+        const std::string element = row.content ? "<" + name + ">" + row.content + "</" + name + ">" : "";
         Exchange<DownloadAPI> exchange;
         _ZV1__checkAdultVerificationEnabled request;
         _ZV1__checkAdultVerificationEnabledResponse response;
-        const std::string body = std::string(
-                                     "<checkAdultVerificationEnabledResponse><checkAdultVerificationEnabledResult>"
-                                     "<ResponseCode>0</ResponseCode>") +
-                                 row.literal +
-                                 "</checkAdultVerificationEnabledResult></checkAdultVerificationEnabledResponse>";
+        const std::string body =
+            "<checkAdultVerificationEnabledResponse><checkAdultVerificationEnabledResult><ResponseCode>0</"
+            "ResponseCode>" +
+            element + "</checkAdultVerificationEnabledResult></checkAdultVerificationEnabledResponse>";
         ASSERT_EQ(SOAP_OK,
                   exchange.Run("checkAdultVerificationEnabled", HttpAnswer(Envelope(body)), [&](DownloadAPI& service) {
                       return service.checkAdultVerificationEnabled(&request, &response);
@@ -152,30 +109,9 @@ TEST(Answer, OddlyTypedResults)
         ZV_WS_CheckAdultVerificationEnabledResponse record;
         Records::Tag(record);
         ZVUtilities::Convert(response.checkAdultVerificationEnabledResult, record);
-        EXPECT_EQ(row.enabled, record.IsAdultVerificationEnabled) << row.literal;
+        EXPECT_EQ(row.enabled, record.IsAdultVerificationEnabled) << element;
         ZV_WS_release(&record);
     }
-}
-
-TEST(Answer, ConfigurationKeysAreAttributes)
-{
-    Exchange<StreamAPI> exchange;
-    _ZV1__getConfig request;
-    _ZV1__getConfigResponse response;
-    ASSERT_EQ(SOAP_OK, exchange.Run("getConfig",
-                                    HttpAnswer(Envelope("<getConfigResponse><getConfigResult><ConfigurationSet>"
-                                                        "<Configuration Key=\"a\"><Value>1</Value></Configuration>"
-                                                        "<Configuration Key=\"b\"/></ConfigurationSet>"
-                                                        "</getConfigResult></getConfigResponse>")),
-                                    [&](StreamAPI& service) { return service.getConfig(&request, &response); }));
-    ZV_WS_ConfigResponse record;
-    Records::Tag(record);
-    ZVUtilities::Convert(response.getConfigResult, record);
-    ASSERT_EQ(2u, record.size);
-    EXPECT_STREQ("1", record.ConfigurationItem[0].Value);
-    EXPECT_STREQ("b", record.ConfigurationItem[1].Key);
-    EXPECT_EQ(nullptr, record.ConfigurationItem[1].Value);
-    ZV_WS_release(&record);
 }
 
 }  // namespace

@@ -73,8 +73,6 @@ public:
     }
     std::string Body() const { return Between("<SOAP-ENV:Body>", "</SOAP-ENV:Body>"); }
 
-    Service& service() { return m_Service; }
-
 private:
     static SOAP_SOCKET Open(soap*, const char*, const char*, int) { return s_Client; }
 
