@@ -150,6 +150,12 @@ TEST_F(Session, OldTlsIsRefused)
     options.oldTls = true;
     Open(options);
     EXPECT_EQ(ZV_WS_Status_connection_error, Initialize());
+    ZV_WS_SetupParams setup = Setup();
+    setup.EnvNum = ENVNUM_PRODUCTION;  // nothing is asked
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+    Owned<ZV_WS_GenreArray> genres;
+    EXPECT_EQ(-5030, ZV_WS_getNavigation(&session, &genres));
+    EXPECT_TRUE(store->Log().empty());
 }
 
 TEST_F(Session, DuplicatesWorkOnTheirOwn)
