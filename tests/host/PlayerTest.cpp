@@ -51,37 +51,6 @@ Lines Traces(const std::string& movie)
     return traces;
 }
 
-TEST(ZVPlayerLibAETest, HasItsMethodsInOrder)
-{
-    const char* const kNames[] = {"Initialize",
-                                  "Shutdown",
-                                  "GetVersion",
-                                  "CreatePlayer",
-                                  "ReleasePlayer",
-                                  "Play",
-                                  "Pause",
-                                  "Stop",
-                                  "GetPlaybackTime",
-                                  "GetPlaybackState",
-                                  "GetDuration",
-                                  "GetCurrentBandwidth",
-                                  "RegisterEventHandler",
-                                  "THX_ProcessContentDescriptors",
-                                  "THX_IsSupportedOnDevice",
-                                  "getSupported3DFormats",
-                                  "getConfigured3DFormat",
-                                  "set3DMode",
-                                  "SetLogAreaIDsConfig"};
-    AEArray<ZVPlayerLibAE::Method> methods;
-    ZVPlayerLibAE::GetMethods(methods);
-    ASSERT_EQ(std::size(kNames), methods.size());
-    for (size_t i = 0; i < methods.size(); ++i) {
-        EXPECT_STREQ(kNames[i], methods[i].m_pName);
-        EXPECT_EQ(ZVPlayerLibAE::Method::kMemberFunction, methods[i].m_type);
-    }
-    EXPECT_FALSE(ZVPlayerLibAE::FiresEvents());
-}
-
 TEST(ZVPlayerLibAETest, Codes)
 {
     EXPECT_EQ(
