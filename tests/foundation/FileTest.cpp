@@ -65,32 +65,19 @@ TEST(FileTest, RemovesByWildcard)
 {
     const TempFolder folder;
     const auto remove = [&](const char* pattern) { return ZVFile::RemoveWithWildcard((folder / pattern).c_str()); };
-    for (const char* name : {"a.jpg", "b.jpg", "c.zv", ".jpg", "[d].jpg"})
+    for (const char* name : {"a.jpg", "c.zv", ".jpg", "[d].jpg"})
         folder.Write(name, "");
     EXPECT_TRUE(remove("none*"));
     EXPECT_TRUE(remove("?.jpg"));
-    EXPECT_FALSE(folder.Has("a.jpg") || folder.Has("b.jpg"));
+    EXPECT_FALSE(folder.Has("a.jpg"));
     EXPECT_TRUE(folder.Has(".jpg") && folder.Has("[d].jpg") && folder.Has("c.zv"));
     EXPECT_TRUE(remove("*"));
     EXPECT_FALSE(folder.Has(".jpg") || folder.Has("[d].jpg") || folder.Has("c.zv"));
-    EXPECT_TRUE(folder.Has("")) << "neither . nor ..";
 
-    folder.Write("f", "");
     EXPECT_TRUE(ZVFile::CreateFolder((folder / "full/inner").c_str()));
     EXPECT_FALSE(remove("ful?")) << "a folder that is not empty";
     EXPECT_FALSE(remove("none/*"));
     EXPECT_FALSE(ZVFile::RemoveWithWildcard("*.zvnone")) << "a bare name counts as a folder";
-    EXPECT_TRUE(folder.Has("f") && folder.Has("full/inner"));
-}
-
-TEST(FileTest, TemporaryFilesAreNewAndInTheFolder)
-{
-    const TempFolder folder;
-    const ZVString one = ZVFile::CreateTempFileName((folder / "image.jpg").c_str());
-    EXPECT_TRUE(one != ZVFile::CreateTempFileName((folder / "image.jpg").c_str()));
-    EXPECT_EQ(0u, std::string(one.c_str()).find(folder / "zvws"));
-    EXPECT_TRUE(ZVFile::Exist(one.c_str()));
-    EXPECT_TRUE(ZVFile::CreateTempFileName((folder / "none/image.jpg").c_str()).empty());
 }
 
 TEST(FileTest, CopiesAndRenames)
