@@ -178,26 +178,18 @@ TEST_F(CrashTest, SegvLeavesTheProcessPaused)
     }
 }
 
-TEST_F(CrashTest, WorkerThreadIsNamed)
-{
-    Process host({ZV_STAGECRAFT, "5"}, Variables());
-    ASSERT_TRUE(host.WaitForLine("running"));
-    ASSERT_TRUE(host.WaitForLine("[ZV_FLASH] NETWORK_MSG_STUB_INIT !"));
-    const pid_t listener = Thread(host.Pid(), "zv_ipc_listen");
-    ASSERT_GT(listener, 0);
-    syscall(SYS_tgkill, host.Pid(), listener, SIGSEGV);
-    char comm[64];
-    snprintf(comm, sizeof(comm), "Pid: %d, comm: %20s", static_cast<int>(host.Pid()), "zv_ipc_listen");
-    EXPECT_TRUE(host.WaitForLine(comm));
-}
-
+// With a core dump the process ends, here by a fault of another thread, which the report names.
 TEST_F(CrashTest, CoreDumpModeIsSetByTheEnvironment)
 {
     Process host({ZV_STAGECRAFT, "5"}, Variables({{"ZV_CORE_DUMP", "1"}}));
     ASSERT_TRUE(host.WaitForLine("running"));
-    kill(host.Pid(), SIGABRT);
-    ASSERT_TRUE(host.WaitForLine(" Abort signal"));
-    ASSERT_TRUE(host.WaitForLine("backtrace:"));
+    ASSERT_TRUE(host.WaitForLine("[ZV_FLASH] NETWORK_MSG_STUB_INIT !"));
+    const pid_t listener = Thread(host.Pid(), "zv_ipc_listen");
+    ASSERT_GT(listener, 0);
+    syscall(SYS_tgkill, host.Pid(), listener, SIGABRT);
+    char comm[64];
+    snprintf(comm, sizeof(comm), "Pid: %d, comm: %20s", static_cast<int>(host.Pid()), "zv_ipc_listen");
+    EXPECT_TRUE(host.WaitForLine(comm));
     ASSERT_TRUE(WaitUntilGivenBack(host.Pid(), SIGABRT));
     kill(host.Pid(), SIGABRT);  // as the fault itself would repeat
     EXPECT_EQ(SIGABRT, WTERMSIG(host.WaitForEnd()));

@@ -145,30 +145,19 @@ std::string Check(const xmlNode* element, const std::string& type)
     const std::string here = NameOf(element) + ": ";
     if (!IsArray(type) && !kRecords.count(type))
         return FitsScalar(type, TextOf(element)) ? "" : here + "no " + type + ": " + TextOf(element);
-    const std::vector<ChildRule> rules = RulesOf(type);
-    size_t next = 0;
-    bool repeating = false;
-    for (const xmlNode* child = xmlFirstElementChild(const_cast<xmlNode*>(element)); child;
-         child = xmlNextElementSibling(const_cast<xmlNode*>(child))) {
-        if (!repeating || NameOf(child) != rules[next].name) {
-            while (next < rules.size() && rules[next].name != NameOf(child)) {
-                if (!rules[next].optional && !rules[next].repeated) return here + "no " + rules[next].name;
-                ++next;
-            }
+    const xmlNode* child = xmlFirstElementChild(const_cast<xmlNode*>(element));
+    for (const ChildRule& rule : RulesOf(type)) {
+        int count = 0;
+        for (; child && NameOf(child) == rule.name && (count == 0 || rule.repeated); ++count) {
+            if (strcmp("http://api.zorvane.example/api/", reinterpret_cast<const char*>(child->ns->href)) != 0)
+                return here + rule.name + " is of another namespace";
+            const std::string wrong = Check(child, rule.type);
+            if (!wrong.empty()) return here + wrong;
+            child = xmlNextElementSibling(const_cast<xmlNode*>(child));
         }
-        if (next == rules.size()) return here + NameOf(child) + " is unknown or out of order";
-        if (std::string("http://api.zorvane.example/api/") != reinterpret_cast<const char*>(child->ns->href)) {
-            return here + NameOf(child) + " is of another namespace";
-        }
-        const std::string wrong = Check(child, rules[next].type);
-        if (!wrong.empty()) return here + wrong;
-        repeating = rules[next].repeated;
-        if (!repeating) ++next;
+        if (count == 0 && !rule.optional && !rule.repeated) return here + "no " + rule.name;
     }
-    for (; next < rules.size(); ++next) {
-        if (!rules[next].optional && !rules[next].repeated) return here + "no " + rules[next].name;
-    }
-    return "";
+    return child ? here + NameOf(child) + " is unknown or out of order" : "";
 }
 
 // What is wrong with an answer whose result is of the type.
