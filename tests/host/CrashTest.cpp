@@ -32,24 +32,6 @@ char* Unreadable()
     return page;
 }
 
-void Illegal()
-{
-#if defined(__x86_64__)
-    asm volatile("ud2");
-#else
-    raise(SIGILL);
-#endif
-}
-
-void Divide()
-{
-#if defined(__x86_64__)
-    asm volatile("xorl %%ecx, %%ecx; movl $1, %%eax; cltd; idivl %%ecx" ::: "eax", "ecx", "edx");
-#else
-    raise(SIGFPE);
-#endif
-}
-
 void Touch()
 {
     *static_cast<volatile char*>(Unreadable() + 8) = 1;
@@ -67,11 +49,12 @@ void Overflow()
     Deepen(0);
 }
 
-// As a fault repeats; abort() itself takes the default action after the first.
-void Abort()
+// As a fault repeats.
+template <int kSignal>
+void RaiseTwice()
 {
-    raise(SIGABRT);
-    raise(SIGABRT);
+    raise(kSignal);
+    raise(kSignal);
 }
 
 // The action that SIGSEGV had before start-up: every fatal signal ends with it.
@@ -104,9 +87,9 @@ TEST(FaultDeathTest, IsReported)
         bool backtrace;
     } rows[] = {{SIGSEGV, Touch, "Invalid memory reference" + pc + "addr: " + address, false},
                 {SIGSEGV, Overflow, "Invalid memory reference" + pc + "addr: 0x[0-9a-f]+\n", false},
-                {SIGILL, Illegal, "Illegal Instruction" + pc + "inst: 0x[0-9a-f]{8}\n", true},
-                {SIGFPE, Divide, "Floating point exception" + pc + "inst: 0x[0-9a-f]{8}\n", true},
-                {SIGABRT, Abort, " Abort signal\n\n", true}};
+                {SIGILL, RaiseTwice<SIGILL>, "Illegal Instruction" + pc + "inst: 0x[0-9a-f]{8}\n", true},
+                {SIGFPE, RaiseTwice<SIGFPE>, "Floating point exception" + pc + "inst: 0x[0-9a-f]{8}\n", true},
+                {SIGABRT, RaiseTwice<SIGABRT>, " Abort signal\n\n", true}};
     for (const auto& row : rows) {
         // No line of registers has a "k".
         const std::string report = "^\n" + row.title + "\nPid: [0-9]+, comm: +host_tests\npc : \\[<[^k]*\n" +
@@ -197,23 +180,21 @@ TEST_F(CrashTest, CoreDumpModeIsSetByTheEnvironment)
 
 TEST_F(CrashTest, SecondInterruptEndsTheProcess)
 {
-    const struct {
-        int signal;
-        const char* text;
-    } kSignals[] = {{SIGINT, "Interrupt from keyboard"}, {SIGTERM, "Termination signal"}};
-    for (const auto& row : kSignals) {
+    const std::pair<int, const char*> signals[] = {{SIGINT, "Interrupt from keyboard"},
+                                                   {SIGTERM, "Termination signal"}};
+    for (const auto& [signal, text] : signals) {
         Process host({ZV_STAGECRAFT, "5"}, Variables());
         ASSERT_TRUE(host.WaitForLine("running"));
         ASSERT_TRUE(host.WaitForLine("[ZV_FLASH] NETWORK_MSG_STUB_INIT !"));
         kill(host.Pid(), SIGPIPE);  // ignored
-        kill(host.Pid(), row.signal);
+        kill(host.Pid(), signal);
         ASSERT_TRUE(host.WaitForLine("Using default signal handler."));
-        ASSERT_TRUE(WaitUntilGivenBack(host.Pid(), row.signal));
-        kill(host.Pid(), row.signal);
-        EXPECT_EQ(row.signal, WTERMSIG(host.WaitForEnd()));
+        ASSERT_TRUE(WaitUntilGivenBack(host.Pid(), signal));
+        kill(host.Pid(), signal);
+        EXPECT_EQ(signal, WTERMSIG(host.WaitForEnd()));
         Lines lines = host.Output();  // the listen thread may print on meanwhile
         lines.erase(std::remove(lines.begin(), lines.end(), "[ZV_FLASH] IPC enter "), lines.end());
-        EXPECT_EQ((Lines{"", row.text, "", "Using default signal handler."}), Lines(lines.end() - 4, lines.end()));
+        EXPECT_EQ((Lines{"", text, "", "Using default signal handler."}), Lines(lines.end() - 4, lines.end()));
     }
 }
 

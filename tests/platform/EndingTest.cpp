@@ -8,18 +8,13 @@ namespace {
 
 TEST_F(RuntimeTest, MoviesEndAndNothingFollows)
 {
-    const struct {
-        const char* pScript;
-        Lines expected;
-    } rows[] = {
+    const std::pair<const char*, Lines> rows[] = {
         {"probe.log('script');", {"script"}},
-        {"quit(); probe.log('runs on'); setTimeout(function() { probe.log('never'); }, 0); probe.startUpdates();",
-         {"runs on"}},
-        {"probe.run('end'); probe.log('runs on'); probe.startUpdates();", {"runs on"}},
-        {"probe.run('stop'); probe.log('runs on'); probe.startUpdates();", {"runs on"}},
-        {"setInterval(function() { quit(); probe.log('timer'); }, 0); setInterval(function() { probe.log('never'); }, "
-         "0);",
-         {"timer"}},
+        {"quit(); probe.log('on'); setTimeout(function() { probe.log('never'); }, 0); probe.startUpdates();", {"on"}},
+        {"probe.run('end'); probe.log('on'); probe.startUpdates();", {"on"}},
+        {"probe.run('stop'); probe.log('on'); probe.startUpdates();", {"on"}},
+        {"setInterval(function() { quit(); probe.log('on'); }, 0); setInterval(function() { probe.log('never'); }, 0);",
+         {"on"}},
         {"setTimeout(function() { probe.run('stop'); probe.log('on'); }, 0);"
          "setTimeout(function() { probe.log('never'); }, 0);",
          {"on"}},
@@ -37,9 +32,8 @@ TEST_F(RuntimeTest, MoviesEndAndNothingFollows)
         Probe::s_lines.push_back("end in update");
         call.pWindow->EndMovie();
     };
-    for (const auto& row : rows) {
-        EXPECT_EQ(Logged(row.pScript), row.expected) << row.pScript;
-    }
+    for (const auto& [pScript, expected] : rows)
+        EXPECT_EQ(Logged(pScript), expected) << pScript;
 }
 
 TEST_F(RuntimeTest, AfterTheEndNothingIsCalled)
