@@ -16,8 +16,7 @@
 
 struct Reply {
     int status = 0;  ///< 0 when no whole header came
-    std::string head, body;
-    std::string rest;  ///< what came behind the announced length
+    std::string head = {}, body = {};
 
     std::string Header(const std::string& name) const
     {
@@ -61,31 +60,16 @@ public:
     {
         return BIO_write(m_Bio, bytes.data(), static_cast<int>(bytes.size())) == static_cast<int>(bytes.size());
     }
-    /// One answer: to its Content-Length, to the end without one, or until the connection fails.
+    /// All that comes; requests ask for the connection's end.
     Reply Receive()
     {
-        Reply reply;
         std::string got;
-        const auto more = [&] {
-            char piece[64 * 1024];
-            const int size = BIO_read(m_Bio, piece, sizeof piece);
-            if (size > 0) got.append(piece, static_cast<size_t>(size));
-            return size > 0;
-        };
-        size_t end;
-        while ((end = got.find("\r\n\r\n")) == std::string::npos) {
-            if (!more()) return reply;
-        }
-        reply.head = got.substr(0, end + 2);
-        reply.status = reply.head.compare(0, 9, "HTTP/1.1 ") == 0 ? atoi(reply.head.c_str() + 9) : 0;
-        const std::string length = reply.Header("Content-Length");
-        const size_t wanted = length.empty() ? std::string::npos : strtoul(length.c_str(), nullptr, 10);
-        got.erase(0, end + 4);
-        while (got.size() < wanted && more()) {
-        }
-        reply.body = got.substr(0, wanted);
-        reply.rest = got.substr(reply.body.size());
-        return reply;
+        char piece[64 * 1024];
+        for (int size; (size = BIO_read(m_Bio, piece, sizeof piece)) > 0;)
+            got.append(piece, static_cast<size_t>(size));
+        const size_t end = got.find("\r\n\r\n");
+        if (end == std::string::npos) return {};
+        return {atoi(got.c_str() + strlen("HTTP/1.1 ")), got.substr(0, end + 2), got.substr(end + 4)};
     }
 
 private:
@@ -152,7 +136,7 @@ struct SoapRequest {
     std::string Head(int port, size_t length) const
     {
         return "POST " + base + service + ".asmx HTTP/1.1\r\nHost: localhost:" + std::to_string(port) +
-               "\r\nUser-Agent: raw\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " +
+               "\r\nConnection: close\r\nUser-Agent: raw\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " +
                std::to_string(length) + "\r\nSOAPAction: \"http://api.zorvane.example/api/" + operation + "\"\r\n\r\n";
     }
     std::string Text(int port) const
@@ -197,7 +181,8 @@ protected:
     {
         return SendBytes(store->HttpPort(), false,
                          method + " " + path + " HTTP/1.1\r\n" + headers +
-                             "Host: localhost\r\nContent-Length: " + std::to_string(body.size()) + "\r\n\r\n" + body);
+                             "Host: localhost\r\nConnection: close\r\nContent-Length: " + std::to_string(body.size()) +
+                             "\r\n\r\n" + body);
     }
     LoggedRequest LastLogged() { return store->Log().back(); }
 
