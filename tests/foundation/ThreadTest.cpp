@@ -33,9 +33,9 @@ TEST(ThreadTest, WaitingAndSafeDestroyLastAsLongAsTheFunction)
 {
     for (const bool destroys : {false, true}) {
         Gate gate;
+        ZVThread::SafeDestroyThread(nullptr);
+        ZVThread::SafeDestroyThread(ZVThread::CreateThread());  // has never run
         ZVThread* thread = ZVThread::CreateThread();
-        ZVThread::SafeDestroyThread(thread);  // has never run
-        thread = ZVThread::CreateThread();
         thread->WaitUntilCompletion();  // returns at once
         EXPECT_FALSE(thread->IsRunning());
         ASSERT_TRUE(thread->Run("gate", Gate::Pass, &gate));
