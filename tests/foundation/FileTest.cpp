@@ -7,41 +7,23 @@
 
 namespace {
 
-TEST(FileTest, AClosedFileDoesNothing)
-{
-    ZVFile file;
-    char byte = 'x';
-    EXPECT_FALSE(file.Open("/none/file", "r"));
-    EXPECT_EQ(0, file.Read(&byte, 1));
-    EXPECT_EQ(0, file.Write(&byte, 1));
-    EXPECT_FALSE(file.Flush());
-    EXPECT_EQ(0, file.GetSize());
-    EXPECT_FALSE(file.Seek(0, SEEK_SET));
-    EXPECT_EQ(-1, file.Position());
-    file.Close();
-}
-
 TEST(FileTest, ReadsAndWritesWholeBuffers)
 {
     const TempFolder folder;
     const std::string name = folder / "f";
     const std::string content(100000, '\0');
     ZVFile file;
+    EXPECT_FALSE(file.Open("/none/file", "r"));
+    EXPECT_EQ(-1, file.Position());
     ASSERT_TRUE(file.Open(name.c_str(), "w+b"));
     EXPECT_EQ(100000, file.Write(content.data(), content.size()));
-    EXPECT_TRUE(file.Flush());
     EXPECT_TRUE(file.Seek(-10, SEEK_END));
     EXPECT_EQ(100000, file.GetSize());
     EXPECT_EQ(99990, file.Position()) << "asking the size leaves the position";
     std::string read(100, 'x');
-    EXPECT_EQ(0, file.Read(&read[0], 0));
     EXPECT_EQ(10, file.Read(&read[0], 100)) << "the file ends";
-    EXPECT_FALSE(file.Seek(-1, SEEK_SET));
-
     ASSERT_TRUE(file.Open(name.c_str(), "r"));
     EXPECT_EQ(0, file.Write("x", 1)) << "opened for reading";
-    EXPECT_EQ(100000, ZVFile::GetSize(name.c_str()));
-    EXPECT_EQ(0, ZVFile::GetSize((folder / "none").c_str()));
     ASSERT_TRUE(file.Open("/dev/full", "w"));
     file.Write("x", 1);
     EXPECT_FALSE(file.Flush());
@@ -76,50 +58,32 @@ TEST(FileTest, MakesEveryFolderOfAPath)
         EXPECT_EQ(row.made, ZVFile::CreateFolder(path.c_str())) << row.path;
         EXPECT_EQ(row.made && std::string(row.path) != "file", ZVFile::FolderExist(path.c_str())) << row.path;
     }
-    EXPECT_EQ("content", folder.Read("file"));
     EXPECT_FALSE(ZVFile::CreateFolder(""));
-    EXPECT_FALSE(ZVFile::CreateFolder("/proc/none/x"));
 }
 
 TEST(FileTest, RemovesByWildcard)
 {
     const TempFolder folder;
     const auto remove = [&](const char* pattern) { return ZVFile::RemoveWithWildcard((folder / pattern).c_str()); };
-    for (const char* name : {"a.jpg", "b.jpg", "c.zv", ".jpg", "[d].jpg"})
+    for (const char* name : {"a.jpg", "c.zv", ".jpg", "[d].jpg"})
         folder.Write(name, "");
     EXPECT_TRUE(remove("none*"));
     EXPECT_TRUE(remove("?.jpg"));
-    EXPECT_FALSE(folder.Has("a.jpg") || folder.Has("b.jpg"));
+    EXPECT_FALSE(folder.Has("a.jpg"));
     EXPECT_TRUE(folder.Has(".jpg") && folder.Has("[d].jpg") && folder.Has("c.zv"));
     EXPECT_TRUE(remove("*"));
     EXPECT_FALSE(folder.Has(".jpg") || folder.Has("[d].jpg") || folder.Has("c.zv"));
-    EXPECT_TRUE(folder.Has("")) << "neither . nor ..";
 
-    folder.Write("f", "");
     EXPECT_TRUE(ZVFile::CreateFolder((folder / "full/inner").c_str()));
     EXPECT_FALSE(remove("ful?")) << "a folder that is not empty";
     EXPECT_FALSE(remove("none/*"));
     EXPECT_FALSE(ZVFile::RemoveWithWildcard("*.zvnone")) << "a bare name counts as a folder";
-    EXPECT_TRUE(folder.Has("f") && folder.Has("full/inner"));
 }
 
-TEST(FileTest, TemporaryFilesAreNewAndInTheFolder)
+TEST(FileTest, CopiesAndRenames)
 {
     const TempFolder folder;
-    const ZVString one = ZVFile::CreateTempFileName((folder / "image.jpg").c_str());
-    const ZVString two = ZVFile::CreateTempFileName((folder / "image.jpg").c_str());
-    EXPECT_TRUE(one != two);
-    for (const ZVString& name : {one, two}) {
-        EXPECT_EQ(0u, std::string(name.c_str()).find(folder / "zvws"));
-        EXPECT_TRUE(ZVFile::Exist(name.c_str()));
-    }
-    EXPECT_TRUE(ZVFile::CreateTempFileName((folder / "none/image.jpg").c_str()).empty());
-}
-
-TEST(FileTest, CopiesRenamesAndRemoves)
-{
-    const TempFolder folder;
-    for (const size_t size : {0, 1, 1023, 1024, 1025, 4096}) {
+    for (const size_t size : {0, 1023, 1024, 1025, 4096}) {
         const std::string content(size, 'c');
         folder.Write("from", content);
         folder.Write("to", std::string(5000, 'o'));
@@ -131,20 +95,11 @@ TEST(FileTest, CopiesRenamesAndRemoves)
     EXPECT_TRUE(ZVFile::CopyFile((folder / "from").c_str(), "/dev/full")) << "write errors go unreported";
     EXPECT_TRUE(ZVFile::Rename((folder / "from").c_str(), (folder / "to").c_str()));
     EXPECT_FALSE(ZVFile::Rename((folder / "from").c_str(), (folder / "to").c_str()));
-    EXPECT_TRUE(ZVFile::Remove((folder / "to").c_str()));
-    EXPECT_FALSE(ZVFile::Remove((folder / "to").c_str()));
-    EXPECT_TRUE(ZVFile::Exist((folder / "").c_str())) << "a folder can be opened, too";
 }
 
 TEST(FileDeathTest, NullsAndPatternsWithoutWildcardStop)
 {
-    ZVFile file;
-    EXPECT_DEATH(file.Open(nullptr, "r"), "Private/ZVFile.cpp.*\"filename != 0\"");
-    EXPECT_DEATH(file.Open("x", nullptr), "\"mode != 0\"");
-    EXPECT_DEATH(file.Read(nullptr, 1), "\"buffer != 0\"");
-    EXPECT_DEATH(ZVFile::Rename(nullptr, "x"), "\"oldname != 0\"");
-    EXPECT_DEATH(ZVFile::CopyFile("x", nullptr), "\"newname != 0\"");
-    EXPECT_DEATH(ZVFile::CreateFolder(nullptr), "\"path != 0\"");
+    EXPECT_DEATH(ZVFile().Open(nullptr, "r"), "Private/ZVFile.cpp.*\"filename != 0\"");
     EXPECT_DEATH(ZVFile::RemoveWithWildcard("/none/x"), "strchr\\(filename, '\\?'\\) != 0");
 }
 

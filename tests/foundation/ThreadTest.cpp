@@ -29,37 +29,28 @@ void Count(void* counter)
     ++*static_cast<std::atomic<int>*>(counter);
 }
 
-TEST(ThreadTest, RunsWhileItsFunctionRuns)
+TEST(ThreadTest, WaitingAndSafeDestroyLastAsLongAsTheFunction)
 {
-    Gate gate;
-    ZVThread* thread = ZVThread::CreateThread();
-    EXPECT_FALSE(thread->IsRunning());
-    thread->WaitUntilCompletion();  // returns at once
-    ASSERT_TRUE(thread->Run("gate", Gate::Pass, &gate));
-    gate.entered.get_future().wait();
-    EXPECT_TRUE(thread->IsRunning());
-    auto waiter = std::async(std::launch::async, [&] {
-        thread->WaitUntilCompletion();
-        return gate.left.load();
-    });
-    gate.mayLeave.set_value();
-    EXPECT_TRUE(waiter.get());
-    EXPECT_FALSE(thread->IsRunning());
-    ZVThread::SafeDestroyThread(thread);
-}
-
-TEST(ThreadTest, SafeDestroyWaitsForAFunctionThatRuns)
-{
-    Gate gate;
-    ZVThread* thread = ZVThread::CreateThread();
-    ASSERT_TRUE(thread->Run("gate", Gate::Pass, &gate));
-    gate.entered.get_future().wait();
-    auto destroyer = std::async(std::launch::async, [&] {
+    for (const bool destroys : {false, true}) {
+        Gate gate;
+        ZVThread::SafeDestroyThread(nullptr);
+        ZVThread::SafeDestroyThread(ZVThread::CreateThread());  // has never run
+        ZVThread* thread = ZVThread::CreateThread();
+        thread->WaitUntilCompletion();  // returns at once
+        EXPECT_FALSE(thread->IsRunning());
+        ASSERT_TRUE(thread->Run("gate", Gate::Pass, &gate));
+        gate.entered.get_future().wait();
+        EXPECT_TRUE(thread->IsRunning());
+        auto waiter = std::async(std::launch::async, [&] {
+            destroys ? ZVThread::SafeDestroyThread(thread) : thread->WaitUntilCompletion();
+            return gate.left.load();
+        });
+        gate.mayLeave.set_value();
+        EXPECT_TRUE(waiter.get());
+        if (destroys) continue;
+        EXPECT_FALSE(thread->IsRunning());
         ZVThread::SafeDestroyThread(thread);
-        return gate.left.load();
-    });
-    gate.mayLeave.set_value();
-    EXPECT_TRUE(destroyer.get());
+    }
 }
 
 TEST(ThreadTest, SafeDestroyWaitsForAFunctionThatHasNotBegun)
@@ -71,20 +62,6 @@ TEST(ThreadTest, SafeDestroyWaitsForAFunctionThatHasNotBegun)
         ZVThread::SafeDestroyThread(thread);
         ASSERT_EQ(1, count);
     }
-}
-
-TEST(ThreadTest, SafeDestroyTakesWhatNeverRanAndWhatHasFinished)
-{
-    ZVThread::SafeDestroyThread(nullptr);
-    ZVThread::DestroyThread(nullptr);
-    ZVThread::SafeDestroyThread(ZVThread::CreateThread());
-
-    std::atomic<int> count{0};
-    ZVThread* thread = ZVThread::CreateThread();
-    ASSERT_TRUE(thread->Run("count", Count, &count));
-    while (count == 0 || thread->IsRunning())
-        sched_yield();
-    ZVThread::SafeDestroyThread(thread);
 }
 
 TEST(ThreadTest, AThreadOutlivesItsObject)

@@ -1,37 +1,7 @@
-// The media player's stand-in: its clock alone, and its script class in a movie.
+// The media player's stand-in, its script class in a movie.
 #include "HostLines.h"
-#include "PlaybackClock.h"
 
 namespace {
-
-TEST(PlaybackClockTest, FollowsTheClock)
-{
-    typedef ZVPlayerLibAE P;
-    const PlaybackClock::Time start{};
-    const auto at = [&](int milliseconds) { return start + std::chrono::milliseconds(milliseconds); };
-    PlaybackClock clock;
-    const auto expect = [&](int time, P::PlaybackState state, int64_t position) {
-        EXPECT_EQ(state, clock.StateAt(at(time))) << time;
-        EXPECT_EQ(position, clock.PositionAt(at(time))) << time;
-    };
-    expect(0, P::kNoPlayer, 0);
-    clock.Open(1000);
-    expect(50, P::kStopped, 0);
-    clock.PlayFrom(0, at(100));
-    expect(100, P::kPlaying, 0);
-    expect(1099, P::kPlaying, 999);
-    expect(1100, P::kEnded, 1000);
-    expect(9000, P::kEnded, 1000);
-    clock.PlayFrom(400, at(10000));
-    clock.Pause(at(10100));
-    expect(20000, P::kPaused, 500);
-    clock.PlayFrom(500, at(20000));
-    expect(20500, P::kEnded, 1000);
-    clock.Stop();
-    expect(20500, P::kStopped, 0);
-    clock.Close();
-    expect(20500, P::kNoPlayer, 0);
-}
 
 // Runs the movie with `p`, a player object, and `say`, which joins its arguments to a line.
 Lines Traces(const std::string& movie)
@@ -49,37 +19,6 @@ Lines Traces(const std::string& movie)
         if (line.compare(0, 2, "> ") == 0) traces.push_back(line.substr(2));
     }
     return traces;
-}
-
-TEST(ZVPlayerLibAETest, HasItsMethodsInOrder)
-{
-    const char* const kNames[] = {"Initialize",
-                                  "Shutdown",
-                                  "GetVersion",
-                                  "CreatePlayer",
-                                  "ReleasePlayer",
-                                  "Play",
-                                  "Pause",
-                                  "Stop",
-                                  "GetPlaybackTime",
-                                  "GetPlaybackState",
-                                  "GetDuration",
-                                  "GetCurrentBandwidth",
-                                  "RegisterEventHandler",
-                                  "THX_ProcessContentDescriptors",
-                                  "THX_IsSupportedOnDevice",
-                                  "getSupported3DFormats",
-                                  "getConfigured3DFormat",
-                                  "set3DMode",
-                                  "SetLogAreaIDsConfig"};
-    AEArray<ZVPlayerLibAE::Method> methods;
-    ZVPlayerLibAE::GetMethods(methods);
-    ASSERT_EQ(std::size(kNames), methods.size());
-    for (size_t i = 0; i < methods.size(); ++i) {
-        EXPECT_STREQ(kNames[i], methods[i].m_pName);
-        EXPECT_EQ(ZVPlayerLibAE::Method::kMemberFunction, methods[i].m_type);
-    }
-    EXPECT_FALSE(ZVPlayerLibAE::FiresEvents());
 }
 
 TEST(ZVPlayerLibAETest, Codes)

@@ -47,15 +47,6 @@ TEST_F(QueueTest, WordsAreLittleEndian)
     EXPECT_EQ("513 65536", Received());
 }
 
-TEST_F(QueueTest, WhatIsNoMessageIsDropped)
-{
-    for (const size_t length : {0, 0, 1, 15, 17, 4096}) {
-        m_player.SendBytes(std::string(length, 'x'));
-    }
-    m_player.Send(3);
-    EXPECT_EQ("3 0", Received());
-}
-
 TEST_F(QueueTest, MessagesSentBeforeThePlayerWentArrive)
 {
     m_player.SendBytes("");

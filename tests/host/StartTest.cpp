@@ -3,60 +3,49 @@
 
 namespace {
 
-struct Variant {
-    const char* argument;  // null: none
+#define FILES(start) \
+    "configurationFile=/misc/zorvane/" start "credentials.xml&settingsFile=/misc/zorvane/" start "preference.xml"
+
+const struct {
+    const char* argument;  // null: none, so that the program's path is the last one
     const char* printed;
     const char* movie;
     const char* flashVars;
-};
+} kVariants[] = {{"0", "0", "alpha", FILES("north/alpha") "&defaultCountryID=1&defaultRegionCode=00"},
+                 {"1", "1", "alpha", FILES("south/alpha") "&defaultCountryID=41&defaultRegionCode=00"},
+                 {"2", "2", "beta", FILES("beta")},
+                 {"3rest", "3", "gamma", FILES("gamma")},
+                 {"4", "4", "delta", FILES("delta")},
+                 {"5", "5", "gen", FILES("gen")},
+                 {"6", "6", "gen", FILES("gen")},
+                 {"/", "-1", "gen", FILES("gen")},
+                 {"", "-48", "gen", FILES("gen")},
+                 {nullptr, "-1", "gen", FILES("gen")}};
 
-class VariantTest : public testing::TestWithParam<Variant> {};
-
-Lines CommandLine(const Variant& variant)
-{
-    return variant.argument ? Lines{ZV_STAGECRAFT, "first", variant.argument} : Lines{ZV_STAGECRAFT};
-}
-
-// The movie that the player would show is named by the runtime, which does not find it here.
-TEST_P(VariantTest, ChoosesTheMovie)
-{
-    Process host(CommandLine(GetParam()), {});
-    EXPECT_EQ(0, host.WaitForEnd());
-    EXPECT_EQ(std::string("[ZV_FLASH]ZV UI type = ") + GetParam().printed + " ", host.Output().at(0));
-    EXPECT_EQ(Lines{std::string("stagecraft: cannot read the movie /usr/share/zorvane/zvcesdk2_") + GetParam().movie +
-                    ".swf: No such file or directory"},
-              host.Errors());
-}
-
-TEST_P(VariantTest, ChoosesTheFlashVariables)
+TEST(VariantTest, ChoosesMovieAndFlashVariables)
 {
     const Folder folder;
     const std::string movie = folder.Write("movie.js",
                                            "var pairs = []; for (var name in flashvars) "
                                            "pairs.push(name + '=' + flashvars[name]); trace(pairs.join('&'));");
-    Process usual(CommandLine(GetParam()), {{"STAGECRAFT_MOVIE", movie}});
-    EXPECT_TRUE(usual.WaitForLine(GetParam().flashVars));
-    EXPECT_EQ(0, usual.WaitForEnd());
-
-    Process replaced(CommandLine(GetParam()), {{"STAGECRAFT_MOVIE", movie}, {"ZV_FLASHVARS", "a=%31&b=x"}});
+    for (const auto& row : kVariants) {
+        const Lines command = row.argument ? Lines{ZV_STAGECRAFT, "first", row.argument} : Lines{ZV_STAGECRAFT};
+        // The movie that the player would show is named by the runtime, which does not find it here.
+        Process host(command, {});
+        EXPECT_EQ(0, host.WaitForEnd());
+        EXPECT_EQ(std::string("[ZV_FLASH]ZV UI type = ") + row.printed + " ", host.Output().at(0));
+        EXPECT_EQ(Lines{std::string("stagecraft: cannot read the movie /usr/share/zorvane/zvcesdk2_") + row.movie +
+                        ".swf: No such file or directory"},
+                  host.Errors());
+        Process other(command, {{"STAGECRAFT_MOVIE", movie}});
+        EXPECT_TRUE(other.WaitForLine(row.flashVars));
+        EXPECT_EQ(0, other.WaitForEnd());
+    }
+    Process replaced({ZV_STAGECRAFT, "0"}, {{"STAGECRAFT_MOVIE", movie}, {"ZV_FLASHVARS", "a=%31&b=x"}});
     EXPECT_TRUE(replaced.WaitForLine("a=1&b=x"));
     EXPECT_EQ(0, replaced.WaitForEnd());
     EXPECT_EQ("** a=%31&b=x **", replaced.Output().at(0));
 }
-
-#define FILES(start) \
-    "configurationFile=/misc/zorvane/" start "credentials.xml&settingsFile=/misc/zorvane/" start "preference.xml"
-INSTANTIATE_TEST_SUITE_P(
-    Types, VariantTest,
-    testing::Values(Variant{"0", "0", "alpha", FILES("north/alpha") "&defaultCountryID=1&defaultRegionCode=00"},
-                    Variant{"1", "1", "alpha", FILES("south/alpha") "&defaultCountryID=41&defaultRegionCode=00"},
-                    Variant{"2", "2", "beta", FILES("beta")}, Variant{"3rest", "3", "gamma", FILES("gamma")},
-                    Variant{"4", "4", "delta", FILES("delta")}, Variant{"5", "5", "gen", FILES("gen")},
-                    Variant{"6", "6", "gen", FILES("gen")}, Variant{"/", "-1", "gen", FILES("gen")},
-                    Variant{"", "-48", "gen", FILES("gen")},
-                    // the program's path is the last argument then
-                    Variant{nullptr, "-1", "gen", FILES("gen")}),
-    [](const testing::TestParamInfo<Variant>& info) { return "Row" + std::to_string(info.index); });
 
 TEST(DrmTest, FailureStartsNothingElse)
 {

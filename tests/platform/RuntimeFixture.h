@@ -6,7 +6,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <functional>
+#include <optional>
 #include <string>
 #include <thread>
 #include <vector>
@@ -40,19 +42,19 @@ public:
 
     void OnUpdate(StageWindow* pWindow, ASObject& object) override;
 
-    static Lines s_lines;
-    static std::function<void(const Invocation&)> s_run;  // what run() does; empty: nothing
-    static std::function<void(const Invocation&)> s_onUpdate;
-    static std::thread::id s_mainThread;
-    static int s_constructed;
-    static int s_deleted;
+    static inline Lines s_lines;
+    static inline std::function<void(const Invocation&)> s_run;  // what run() does; empty: nothing
+    static inline std::function<void(const Invocation&)> s_onUpdate;
+    static inline std::thread::id s_mainThread;
+    static inline int s_constructed;
+    static inline int s_deleted;
 
 private:
     void Log(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
     void Run(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
-    void Name(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
-    void StartUpdates(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
-    void StopUpdates(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
+    void Name(StageWindow*, ASObject&, ASValueArray&, ASValue& result) { result = ASValue::String(m_name.c_str()); }
+    void StartUpdates(StageWindow*, ASObject& object, ASValueArray&, ASValue&) { object.StartUpdates(); }
+    void StopUpdates(StageWindow*, ASObject& object, ASValueArray&, ASValue&) { object.StopUpdates(); }
 
     const std::string m_name;
 };
@@ -60,15 +62,19 @@ private:
 // Sets a variable of the environment, or removes it (null), until the end of the scope.
 class Environment {
 public:
-    Environment(const char* pName, const char* pValue);
-    ~Environment();
+    Environment(const char* pName, const char* pValue) : m_name(pName)
+    {
+        const char* pPrevious = getenv(pName);
+        if (pPrevious) m_previous = pPrevious;
+        pValue ? setenv(pName, pValue, 1) : unsetenv(pName);
+    }
+    ~Environment() { m_previous ? setenv(m_name.c_str(), m_previous->c_str(), 1) : unsetenv(m_name.c_str()); }
     Environment(const Environment&) = delete;
     Environment& operator=(const Environment&) = delete;
 
 private:
     const std::string m_name;
-    std::string m_previous;
-    bool m_hadPrevious;
+    std::optional<std::string> m_previous;
 };
 
 class RuntimeTest : public ::testing::Test {
@@ -104,5 +110,8 @@ private:
     Environment m_noOtherMovie{"STAGECRAFT_MOVIE", nullptr};
 };
 
-// As the script writes them: for comparisons whose failure is readable.
-const char* TypeName(const ASValue& value);
+inline const char* TypeName(const ASValue& value)
+{
+    static const char* const kNames[] = {"undefined", "null", "boolean", "number", "string", "object"};
+    return kNames[value.GetType()];
+}

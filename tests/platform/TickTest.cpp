@@ -41,32 +41,16 @@ TEST_F(RuntimeTest, UpdatesChangeDuringATick)
         (Lines{"1 probe", "tick", "2 probe", "tick", "3 probe", "4 other", "tick", "5 probe", "tick"}));
 }
 
-TEST_F(RuntimeTest, UpdatesNeedAnInstance)
-{
-    Probe::s_run = [](const Invocation& call) {
-        call.arguments[0].GetObject()->StartUpdates();
-        call.arguments[0].GetObject()->StopUpdates();
-        call.arguments[0].GetObject()->StartUpdates();
-    };
-    EXPECT_EQ(Logged("probe.run({}); probe.run(Object.create(probe)); probe.stopUpdates();"), Lines{});
-}
-
+// Those of one tick, which comes late.
 TEST_F(RuntimeTest, TimersRunInTheOrderTheyAreDue)
 {
     EXPECT_EQ(Logged("function log(text) { return function() { probe.log(text); }; }"
-                     "setTimeout(log('late'), 60); setTimeout(log('first'), 0); setTimeout(log('second'), 0);"
-                     "setTimeout(log('middle'), 30); setTimeout(log('negative'), -5); setTimeout(log('nan'), 'x');"
+                     "setTimeout(log('late'), 20); setTimeout(log('first'), 0); setTimeout(log('second'), 0);"
+                     "setTimeout(log('middle'), 10); setTimeout(log('negative'), -5); setTimeout(log('nan'), 'x');"
                      "setTimeout(log('none'));"
-                     "setTimeout(function(a, b) { probe.log(a, b, arguments.length); }, 90, 'extra', 2);"),
-              (Lines{"first", "second", "negative", "nan", "none", "middle", "late", "extra 2 2"}));
-}
-
-TEST_F(RuntimeTest, TimersOfOneTickRunInTheOrderTheyAreDue)
-{
-    EXPECT_EQ(Logged("function log(text) { return function() { probe.log(text); }; }"
-                     "setTimeout(log('second'), 20); setTimeout(log('third'), 20); setTimeout(log('first'), 10);"
+                     "setTimeout(function(a, b) { probe.log(a, b, arguments.length); }, 30, 'extra', 2);"
                      "var start = Date.now(); while (Date.now() < start + 60) {}"),
-              (Lines{"first", "second", "third"}));
+              (Lines{"first", "second", "negative", "nan", "none", "middle", "late", "extra 2 2"}));
 }
 
 TEST_F(RuntimeTest, TimersAreCleared)
@@ -95,34 +79,18 @@ TEST_F(RuntimeTest, TimersStartedByTimersWaitForALaterTick)
 // Bounds from below only: a machine may always be slower.
 TEST_F(RuntimeTest, TimeIsKept)
 {
-    using Clock = std::chrono::steady_clock;
     const struct {
         const char* pRate;
         const char* pScript;
-        std::chrono::milliseconds least;
-    } rows[] = {
-        {"50", "var n = 0, i = setInterval(function() { if (++n == 10) clearInterval(i); }, 0);",
-         std::chrono::milliseconds(190)},
-        {"200", "setTimeout(function() { probe.log('x'); }, 150);", std::chrono::milliseconds(150)},
-        {"200", "var n = 0, i = setInterval(function() { if (++n == 3) clearInterval(i); }, 50);",
-         std::chrono::milliseconds(150)},
-        {nullptr, "var n = 0, i = setInterval(function() { if (++n == 6) clearInterval(i); }, 0);",
-         std::chrono::milliseconds(190)},
-    };
+        int least;  // milliseconds
+    } rows[] = {{"50", "var n = 0, i = setInterval(function() { if (++n == 10) clearInterval(i); }, 0);", 190},
+                {"200", "var n = 0, i = setInterval(function() { if (++n == 3) clearInterval(i); }, 50);", 150},
+                {nullptr, "var n = 0, i = setInterval(function() { if (++n == 6) clearInterval(i); }, 0);", 190}};
     for (const auto& row : rows) {
         const Environment rate("STAGECRAFT_FPS", row.pRate);
-        const auto start = Clock::now();
+        const auto start = std::chrono::steady_clock::now();
         Logged(row.pScript);
-        EXPECT_GE(Clock::now() - start, row.least) << row.pScript;
-    }
-}
-
-TEST_F(RuntimeTest, AWrongRateIsToldAndNotUsed)
-{
-    for (const char* pRate : {"0", "-3", "fast", "30x", "nan", "1e9"}) {
-        const Environment rate("STAGECRAFT_FPS", pRate);
-        EXPECT_EQ(Play("setTimeout(function() {}, 0);").m_nErrorValue, AEError::OK);
-        EXPECT_NE(m_errors.find(pRate), std::string::npos) << m_errors;
+        EXPECT_GE(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(row.least)) << row.pScript;
     }
 }
 

@@ -1,107 +1,65 @@
-// Every operation's answer against the contract's records: children, their order, those that are never left out, their
-// types.
+// Every operation's answer against the contract's records: children, their order, those that are never left out.
 #include <libxml/parser.h>
 
-#include <algorithm>
 #include <map>
-#include <set>
 #include <sstream>
 
 #include "RawClient.h"
 
 namespace {
 
-// A child as "Name:type" with "*" behind one that may be left out and "+" behind one that repeats from zero. Types: i
-// int, h short, b boolean, s text, d decimal, else an enumeration or a record below.
+// A child as "Name" or "Name:Record" with "*" behind one that may be left out; "ArrayOf" makes a record of any type.
+// "<" takes another record's children first. What their texts must be is the client's to notice, which reads every
+// answer.
 const std::map<std::string, std::string> kRecords = {
-    {"StandardResponse", "ResponseCode:i ResponseMessage:s*"},
-    {"Genre", "ID:i Name:s* Visible:b ParentId:i"},
-    {"ArrayOfGenre", "Genre:Genre+"},
+    {"StandardResponse", "ResponseCode ResponseMessage*"},
+    {"Genre", "ID Name* Visible ParentId"},
     {"GenreRequest", "Genres:ArrayOfGenre*"},
-    {"GetGenreLabelResponse", "ResponseCode:i ResponseMessage:s* Label:s* LabelMessage:s*"},
+    {"GetGenreLabelResponse", "<StandardResponse Label* LabelMessage*"},
     {"TitleListing",
-     "TitleID:i TitleName:s* BoxArtPrefix:s* TitlePosition:h EpisodeNumber:i BonusAssets:ArrayOfBonusAsset* "
-     "IsTvListing:b "
-     "MPAARating:s* AvailableProducts:ArrayOfProductListing* IsTHXMediaDirectorEnabled:b "
-     "IsTHXMediaDirectorEnabledForTrailer:b CHVRSRating:s* LoyaltyPointsForBuy:s* LoyaltyPointsForRent:s*"},
-    {"ArrayOfTitleListing", "TitleListing:TitleListing+"},
+     "TitleID TitleName* BoxArtPrefix* TitlePosition EpisodeNumber BonusAssets:ArrayOfBonusAsset* IsTvListing "
+     "MPAARating* AvailableProducts:ArrayOfProductListing* IsTHXMediaDirectorEnabled "
+     "IsTHXMediaDirectorEnabledForTrailer CHVRSRating* LoyaltyPointsForBuy* LoyaltyPointsForRent*"},
     {"TitleListingResponse",
-     "<TitleListing ResponseCode:i ResponseMessage:s* Synopsys:s* UserRating:i Directors:s* Actors:s* Writers:s* "
-     "Producers:s* "
-     "Copyright:s* RunTime:s* IsAvailInUserWishList:b RatingReason:s*"},
-    {"ArrayOfTitleListingResponse", "TitleListingResponse:TitleListingResponse+"},
+     "<TitleListing ResponseCode ResponseMessage* Synopsys* UserRating Directors* Actors* Writers* Producers* "
+     "Copyright* RunTime* IsAvailInUserWishList RatingReason*"},
     {"TitleListingPurchased",
-     "<TitleListing EpisodeID:i TvListingTitleID:i PurchaseType:PurchaseType Status:WatchStatus RentalPeriod:s* "
-     "PassID:i "
-     "PlayStatus:StreamStatus StartTimeSeconds:i"},
-    {"ArrayOfTitleListingPurchased", "TitleListingPurchased:TitleListingPurchased+"},
-    {"TitleListingPurchasedForPass", "<TitleListingPurchased ResponseCode:i ResponseMessage:s*"},
-    {"ArrayOfTitleListingPurchasedForPass", "TitleListingPurchasedForPass:TitleListingPurchasedForPass+"},
+     "<TitleListing EpisodeID TvListingTitleID PurchaseType Status RentalPeriod* PassID PlayStatus "
+     "StartTimeSeconds"},
+    {"TitleListingPurchasedForPass", "<TitleListingPurchased ResponseCode ResponseMessage*"},
     {"BonusAsset", ""},
-    {"ArrayOfBonusAsset", "BonusAsset:BonusAsset+"},
     {"ProductListing",
-     "SkuID:i PurchaseType:PurchaseType Price:d* AvailableAssets:ArrayOfFileProfile* ExpireDate:s* "
-     "AvailableAudioProfiles:ArrayOfAudioFile* RentalPeriod:i"},
-    {"ArrayOfProductListing", "ProductListing:ProductListing+"},
-    {"ArrayOfFileProfile", "FileProfile:FileProfile+"},
-    {"AudioFile", "AssetAudioID:i FileLocation:s* ContainsVideo:b AudioAssetProfile:AudioProfile"},
-    {"ArrayOfAudioFile", "AudioFile:AudioFile+"},
+     "SkuID PurchaseType Price* AvailableAssets:ArrayOfFileProfile* ExpireDate* "
+     "AvailableAudioProfiles:ArrayOfAudioFile* RentalPeriod"},
+    {"AudioFile", "AssetAudioID FileLocation* ContainsVideo AudioAssetProfile"},
     {"GetTitlesResponse",
-     "ResponseCode:i ResponseMessage:s* GenreID:i CurrentPageNumber:h ItemsPerPage:h TotalPages:h TotalItems:h "
-     "Titles:ArrayOfTitleListing*"},
-    {"ArrayOfGetTitlesResponse", "GetTitlesResponse:GetTitlesResponse+"},
-    {"TvEpisode", "EpisodeID:i EpisodeName:s* EpisodeNumber:i"},
-    {"ArrayOfTvEpisode", "TvEpisode:TvEpisode+"},
-    {"TvEpisodeList", "ResponseCode:i ResponseMessage:s* Episodes:ArrayOfTvEpisode*"},
-    {"RecommendedTitlesResponse", "ResponseCode:i ResponseMessage:s* Titles:ArrayOfTitleListing*"},
-    {"TranslateSkuIdResponse", "ResponseCode:i ResponseMessage:s* TitleId:i"},
-    {"TranslatedTivoExternalIdResponse", "ResponseCode:i ResponseMessage:s* TivoExternalId:s* TitleId:i"},
-    {"FileTypeRecord",
-     "File_DRMProvider:DRMProvider File_AccessType:AccessType File_FileProfile:FileProfile "
-     "File_VideoFormat:VideoFormat "
-     "File_FileExtension:FileExtension"},
+     "<StandardResponse GenreID CurrentPageNumber ItemsPerPage TotalPages TotalItems Titles:ArrayOfTitleListing*"},
+    {"TvEpisode", "EpisodeID EpisodeName* EpisodeNumber"},
+    {"TvEpisodeList", "<StandardResponse Episodes:ArrayOfTvEpisode*"},
+    {"RecommendedTitlesResponse", "<StandardResponse Titles:ArrayOfTitleListing*"},
+    {"TranslateSkuIdResponse", "<StandardResponse TitleId"},
+    {"TranslatedTivoExternalIdResponse", "<StandardResponse TivoExternalId* TitleId"},
+    {"FileTypeRecord", "File_DRMProvider File_AccessType File_FileProfile File_VideoFormat File_FileExtension"},
     {"GetMyVideosResponse",
-     "ResponseCode:i ResponseMessage:s* Titles:ArrayOfTitleListingPurchased* CurrentPageNumber:h ItemsPerPage:h "
-     "TotalPages:h "
-     "TotalItems:h"},
-    {"GetWishlistItemsResponse", "<GetMyVideosResponse SortOrder:i"},
-    {"Configuration", "Value:s*"},
-    {"ArrayOfConfiguration", "Configuration:Configuration+"},
-    {"GetConfigResponse", "ResponseCode:i ResponseMessage:s* ConfigurationSet:ArrayOfConfiguration*"},
-    {"SettingsPageInfo", "ResponseCode:i ResponseMessage:s* Account:s* DeviceID:s* DeviceName:s*"},
-    {"GetEmailAddressResponse", "ResponseCode:i ResponseMessage:s* EmailAddress:s*"},
-    {"BillingInfoResponse", "ResponseCode:i ResponseMessage:s* CCLastFour:s* CCTypeId:i CCType:s*"},
-    {"BalanceResponse", "ResponseCode:i ResponseMessage:s* Balance:i"},
+     "<StandardResponse Titles:ArrayOfTitleListingPurchased* CurrentPageNumber ItemsPerPage TotalPages TotalItems"},
+    {"GetWishlistItemsResponse", "<GetMyVideosResponse SortOrder"},
+    {"Configuration", "Value*"},
+    {"GetConfigResponse", "<StandardResponse ConfigurationSet:ArrayOfConfiguration*"},
+    {"SettingsPageInfo", "<StandardResponse Account* DeviceID* DeviceName*"},
+    {"GetEmailAddressResponse", "<StandardResponse EmailAddress*"},
+    {"BillingInfoResponse", "<StandardResponse CCLastFour* CCTypeId CCType*"},
+    {"BalanceResponse", "<StandardResponse Balance"},
     {"BillingInfoAndPPCBalanceResponse", "BillingInfo:BillingInfoResponse* PPCardBalance:BalanceResponse*"},
-    {"CalcOrderTaxResponse", "ResponseCode:i ResponseMessage:s* SubTotal:d* TotalPrice:d* Tax:d*"},
-    {"PurchaseResponse", "ResponseCode:i ResponseMessage:s* PassID:i TransactionId:i TransactionAuthNum:s*"},
-    {"CheckRentalExpirationResponse", "ResponseCode:i ResponseMessage:s* ShouldDisplay:b HoursRemaining:i"},
-    {"CheckAdultVerificationEnabledResponse", "ResponseCode:i ResponseMessage:s* IsAdultVerificationEnabled:s*"},
-    {"CheckAdultVerificationPinResponse", "ResponseCode:i ResponseMessage:s* IsPinVerified:b"},
+    {"CalcOrderTaxResponse", "<StandardResponse SubTotal* TotalPrice* Tax*"},
+    {"PurchaseResponse", "<StandardResponse PassID TransactionId TransactionAuthNum*"},
+    {"CheckRentalExpirationResponse", "<StandardResponse ShouldDisplay HoursRemaining"},
+    {"CheckAdultVerificationEnabledResponse", "<StandardResponse IsAdultVerificationEnabled*"},
+    {"CheckAdultVerificationPinResponse", "<StandardResponse IsPinVerified"},
     {"GetStreamingAssetLocationResponse",
-     "ResponseCode:i ResponseMessage:s* StreamingAssetLocation:s* AssetID:i StreamID:s* DRMServerURL:s* "
-     "DRMACKServerURL:s* "
-     "Status:StreamStatus StartTimeSeconds:i HeartbeatURL:s* HeartbeatPollInSeconds:i"},
-    {"THXMediaDirectorResponse", "ResponseCode:i ResponseMessage:s* LongFormat:s* ShortFormat:s*"},
-    {"AuthorizeDeviceResponse", "ResponseCode:i ResponseMessage:s* AuthToken:s*"},
-};
-
-const std::map<std::string, std::set<std::string>> kEnumerations = {
-    {"PurchaseType", {"rent", "buy", "any"}},
-    {"WatchStatus", {"WatchNow", "RentAgain", "NotAvailable", "Undefined"}},
-    {"StreamStatus", {"play", "stopped", "paused", "resumeplay", "errorinplayback"}},
-    {"AudioProfile",
-     {"Stereo_Standard", "Dolby_Stereo_AC3", "Dolby_Digital_Plus_Stereo", "Dolby_Digital_Plus_51", "DTS_Express_Stereo",
-      "DTS_Express_51"}},
-    {"FileProfile",
-     {"UNKNOWN", "STANDARD", "HIGH_DEFINITION", "PORTABLE", "PORTABLE_STANDARD", "TEMP5", "PORTABLE_WIDE",
-      "STANDARD_DEFINITION_3D", "HIGH_DEFINITION_3D", "STANDARD_DEFINITION_REALD_3D", "HIGH_DEFINITION_REALD_3D"}},
-    {"AccessType", {"UNKNOWN", "DOWNLOAD", "STREAM"}},
-    {"DRMProvider",
-     {"UNKNOWN", "WMDRM_10", "TIVO_DRM", "WIDEVINE", "WMDRM_7", "WMDRM_9", "FLUX", "DIVX", "Intel_MV", "RTMPE",
-      "FLASH_ACCESS", "PLAY_READY"}},
-    {"VideoFormat", {"UNKNOWN", "WMV9", "MPEG2_TIVO", "MPEG2_Standard", "VC1", "DIVX", "H264", "FLUX"}},
-    {"FileExtension", {"AUTOPOPULATE", "UNKNOWN", "WMV", "MPEG", "MP4", "FLUX", "AVI", "QT", "FLV", "RM", "DIVX"}},
+     "<StandardResponse StreamingAssetLocation* AssetID StreamID* DRMServerURL* DRMACKServerURL* Status "
+     "StartTimeSeconds HeartbeatURL* HeartbeatPollInSeconds"},
+    {"THXMediaDirectorResponse", "<StandardResponse LongFormat* ShortFormat*"},
+    {"AuthorizeDeviceResponse", "<StandardResponse AuthToken*"},
 };
 
 struct ChildRule {
@@ -109,8 +67,14 @@ struct ChildRule {
     bool optional, repeated;
 };
 
+bool IsArray(const std::string& type)
+{
+    return type.compare(0, 7, "ArrayOf") == 0;
+}
+
 std::vector<ChildRule> RulesOf(const std::string& record)
 {
+    if (IsArray(record)) return {{record.substr(7), record.substr(7), false, true}};
     std::vector<ChildRule> rules;
     std::istringstream words(kRecords.at(record));
     for (std::string word; words >> word;) {
@@ -118,9 +82,13 @@ std::vector<ChildRule> RulesOf(const std::string& record)
             rules = RulesOf(word.substr(1));
             continue;
         }
-        const size_t colon = word.find(':');
-        ChildRule rule{word.substr(0, colon), word.substr(colon + 1), word.back() == '*', word.back() == '+'};
-        if (rule.optional || rule.repeated) rule.type.pop_back();
+        ChildRule rule{word, "", word.back() == '*', false};
+        if (rule.optional) rule.name.pop_back();
+        const size_t colon = rule.name.find(':');
+        if (colon != std::string::npos) {
+            rule.type = rule.name.substr(colon + 1);
+            rule.name.resize(colon);
+        }
         rules.push_back(rule);
     }
     return rules;
@@ -131,57 +99,25 @@ std::string NameOf(const xmlNode* node)
     return reinterpret_cast<const char*>(node->name);
 }
 
-std::string TextOf(const xmlNode* node)
-{
-    xmlChar* text = xmlNodeGetContent(node);
-    std::string copy = reinterpret_cast<const char*>(text);
-    xmlFree(text);
-    return copy;
-}
-
-bool FitsScalar(const std::string& type, const std::string& text)
-{
-    if (type == "s") return true;
-    if (type == "b") return text == "true" || text == "false" || text == "0" || text == "1";
-    const auto enumeration = kEnumerations.find(type);
-    if (enumeration != kEnumerations.end()) return enumeration->second.count(text) == 1;
-    char* end = nullptr;
-    const double number = strtod(text.c_str(), &end);
-    if (text.empty() || *end) return false;
-    if (type == "d") return text.find_first_not_of("0123456789.") == std::string::npos;
-    return text.find('.') == std::string::npos && (type == "i" || (number >= -32768 && number <= 32767));
-}
-
 // What is wrong with the element as a value of the type; empty when nothing is.
 std::string Check(const xmlNode* element, const std::string& type)
 {
     const std::string here = NameOf(element) + ": ";
-    if (!kRecords.count(type))
-        return FitsScalar(type, TextOf(element)) ? "" : here + "no " + type + ": " + TextOf(element);
-    const std::vector<ChildRule> rules = RulesOf(type);
-    size_t next = 0;
-    bool repeating = false;
-    for (const xmlNode* child = xmlFirstElementChild(const_cast<xmlNode*>(element)); child;
-         child = xmlNextElementSibling(const_cast<xmlNode*>(child))) {
-        if (!repeating || NameOf(child) != rules[next].name) {
-            while (next < rules.size() && rules[next].name != NameOf(child)) {
-                if (!rules[next].optional && !rules[next].repeated) return here + "no " + rules[next].name;
-                ++next;
-            }
+    if (!IsArray(type) && !kRecords.count(type))
+        return xmlChildElementCount(const_cast<xmlNode*>(element)) ? here + "no plain text" : "";
+    const xmlNode* child = xmlFirstElementChild(const_cast<xmlNode*>(element));
+    for (const ChildRule& rule : RulesOf(type)) {
+        int count = 0;
+        for (; child && NameOf(child) == rule.name && (count == 0 || rule.repeated); ++count) {
+            if (strcmp("http://api.zorvane.example/api/", reinterpret_cast<const char*>(child->ns->href)) != 0)
+                return here + rule.name + " is of another namespace";
+            const std::string wrong = Check(child, rule.type);
+            if (!wrong.empty()) return here + wrong;
+            child = xmlNextElementSibling(const_cast<xmlNode*>(child));
         }
-        if (next == rules.size()) return here + NameOf(child) + " is unknown or out of order";
-        if (std::string("http://api.zorvane.example/api/") != reinterpret_cast<const char*>(child->ns->href)) {
-            return here + NameOf(child) + " is of another namespace";
-        }
-        const std::string wrong = Check(child, rules[next].type);
-        if (!wrong.empty()) return here + wrong;
-        repeating = rules[next].repeated;
-        if (!repeating) ++next;
+        if (count == 0 && !rule.optional && !rule.repeated) return here + "no " + rule.name;
     }
-    for (; next < rules.size(); ++next) {
-        if (!rules[next].optional && !rules[next].repeated) return here + "no " + rules[next].name;
-    }
-    return "";
+    return child ? here + NameOf(child) + " is unknown or out of order" : "";
 }
 
 // What is wrong with an answer whose result is of the type.
@@ -208,7 +144,7 @@ const char kBoth[] = "";
 struct Row {
     const char* service;
     const char* operation;
-    const char* type;
+    const char* type;      // of the result; empty when that is a text
     std::string children;  // of a request that is answered well
     std::string refused;   // of one that is not; empty when the operation refuses nothing
     int code = 1;          // of that refusal
@@ -235,9 +171,9 @@ std::vector<Row> Rows()
     const std::string ints = "<z:int>1</z:int><z:int>2</z:int>";
     return {
         {kBrowse, "getFileType", "FileTypeRecord", "", ""},
-        {kBrowse, "shouldUpdateCache", "i", one("UTCTime", "then"), ""},
+        {kBrowse, "shouldUpdateCache", "", one("UTCTime", "then"), ""},
         {kBrowse, "getRecommendedTitles", "RecommendedTitlesResponse", one("TitleId", "12"), one("TitleId", "0")},
-        {kBrowse, "getLastCacheLoadTimeUTC", "s", "", ""},
+        {kBrowse, "getLastCacheLoadTimeUTC", "", "", ""},
         {kBrowse, "translateSkuId", "TranslateSkuIdResponse", one("SkuId", "SKU"), one("SkuId", "1")},
         {kBrowse, "translateTivoExternalId", "TranslatedTivoExternalIdResponse", one("TivoExternalId", "EXT12"),
          one("TivoExternalId", "none")},
@@ -257,7 +193,7 @@ std::vector<Row> Rows()
         {kBrowse, "searchForTitleDetail", "GetTitlesResponse", Paged(one("Query", "the"), 1, anyAny, true), ""},
         {kBrowse, "getNavigation", "GenreRequest", "", ""},
         {kBoth, "checkRentalExpiration", "CheckRentalExpirationResponse", one("PassId", "1"), one("PassId", "999")},
-        {kBoth, "GetCountryID", "i", "", ""},
+        {kBoth, "GetCountryID", "", "", ""},
         {kBoth, "getConfig", "GetConfigResponse", "", ""},
         {kBoth, "checkAdultVerificationPin", "CheckAdultVerificationPinResponse", one("Pin", "0042"), ""},
         {kBoth, "checkAdultVerificationEnabled", "CheckAdultVerificationEnabledResponse", "", ""},
@@ -276,19 +212,19 @@ std::vector<Row> Rows()
         {kBoth, "getEmailAddress", "GetEmailAddressResponse", "", ""},
         {kBoth, "showPrePaidCardBalance", "BalanceResponse", "", ""},
         {kBoth, "getBillingInfo", "BillingInfoResponse", "", ""},
-        {kAccount, "checkForPurchasedTitle", "b", one("TitleID", "12"), ""},
+        {kAccount, "checkForPurchasedTitle", "", one("TitleID", "12"), ""},
         {kAccount, "getMyVideos", "GetMyVideosResponse", Paged("", 1, all), Paged("", 0, all), 2},
         {kStream, "getMyStreamingVideos", "GetMyVideosResponse", Paged("", 1, all), Paged("", 0, all), 2},
         {kBoth, "doPurchaseSavedbilling", "PurchaseResponse", one("SkuID", "SKU") + buy, one("SkuID", "9022") + buy,
          22},
         {kBoth, "deactivateDevice", "StandardResponse", "", ""},
         {kBoth, "authorizeDevice", "AuthorizeDeviceResponse", one("PIN", "123456"), one("PIN", "000000"), 2},
-        {kBoth, "checkAuthToken", "b", one("AuthToken", "x"), ""},
+        {kBoth, "checkAuthToken", "", one("AuthToken", "x"), ""},
         {kStream, "getTHXMediaDirectorBonusAsset", "THXMediaDirectorResponse", one("BonusAssetID", "BONUS") + bonus,
          one("BonusAssetID", "1") + bonus, 2},
         {kStream, "getTHXMediaDirector", "THXMediaDirectorResponse", pass + loud, noPass + loud, 2},
         {kStream, "setAudioDefaultProperty", "StandardResponse", loud, ""},
-        {kStream, "getAudioDefaultProperty", "AudioProfile", "", ""},
+        {kStream, "getAudioDefaultProperty", "", "", ""},
         {kStream, "calcOrderTax", "CalcOrderTaxResponse", one("SKUID", "SKU"), one("SKUID", "9111"), 11},
         {kStream, "ReturnTimeout", "StandardResponse", "", ""},
         {kStream, "ReturnError", "StandardResponse", "", ""},
@@ -300,8 +236,8 @@ std::vector<Row> Rows()
          Children({{"StreamID", "stream-1"}, {"Status", "paused"}, {"StopTimeSeconds", "90"}}),
          Children({{"StreamID", "none"}, {"Status", "paused"}, {"StopTimeSeconds", "90"}})},
         {kStream, "getBillingInfoAndPPCBalance", "BillingInfoAndPPCBalanceResponse", "", ""},
-        {kStream, "checkForPurchasedStream", "b", one("SkuID", "SKU"), ""},
-        {kStream, "checkForPurchasedStreamByTitleID", "b", one("TitleID", "12"), ""},
+        {kStream, "checkForPurchasedStream", "", one("SkuID", "SKU"), ""},
+        {kStream, "checkForPurchasedStreamByTitleID", "", one("TitleID", "12"), ""},
         {kStream, "getTitleListingsPurchasedForPasses", "ArrayOfTitleListingPurchasedForPass",
          "<z:Passes>" + ints + "</z:Passes>", ""},
         {kStream, "removeAllMyPurchases", "StandardResponse", one("password", "secret"), one("password", "guess")},
@@ -357,47 +293,15 @@ TEST_F(ContractTest, SearchesLookAwayFromCase)
 {
     Begin();
     const auto found = [&](const char* text) {
-        return atoi(Ask(kBrowse, "searchForTitle",
-                        Children({{"Query", text},
-                                  {"ItemsPerPage", "1"},
-                                  {"CurrentPageNumber", "1"},
-                                  {"PurchaseType", "any"},
-                                  {"TitleType", "any"}}))
-                        .Element("TotalItems")
-                        .c_str());
+        const std::string any = Children({{"PurchaseType", "any"}, {"TitleType", "any"}});
+        const std::string search = Paged(Children({{"Query", text}}), 1, any, true);
+        return atoi(Ask(kBrowse, "searchForTitle", search).Element("TotalItems").c_str());
     };
     EXPECT_GT(found("harbour"), 0);
     EXPECT_EQ(found("harbour"), found("HARBOUR"));
     EXPECT_GT(found("Caf\u00e9"), 0);
     EXPECT_EQ(found("Caf\u00e9"), found("cAF\u00c9"));
     EXPECT_EQ(found("&lt;%&gt;"), 0) << "no pattern";
-}
-
-// Pages add up to the whole, each title once, positions counted through.
-TEST_F(ContractTest, PagesAddUp)
-{
-    Begin();
-    std::set<std::string> ids;
-    int pages = 1;
-    int position = 0;
-    for (int page = 1; page <= pages; ++page) {
-        const Reply reply = Ask(kBrowse, "getTitlesByNavigation",
-                                Children({{"GenreID", "101"},
-                                          {"CurrentPageNumber", std::to_string(page)},
-                                          {"ItemsPerPage", "7"},
-                                          {"PurchaseType", "rent"}}));
-        pages = std::min(50, atoi(reply.Element("TotalPages").c_str()));
-        for (size_t at = 0; (at = reply.body.find("<TitleID>", at)) != std::string::npos; ++at) {
-            EXPECT_TRUE(ids.insert(reply.body.substr(at + 9, reply.body.find('<', at + 9) - at - 9)).second);
-            const size_t place = reply.body.find("<TitlePosition>", at) + 15;
-            EXPECT_EQ(++position, atoi(reply.body.c_str() + place));
-        }
-        EXPECT_EQ(std::to_string(page), reply.Element("CurrentPageNumber"));
-        if (page == pages) {
-            EXPECT_EQ(std::to_string(position), reply.Element("TotalItems"));
-        }
-    }
-    EXPECT_GT(ids.size(), 7u);
 }
 
 }  // namespace

@@ -2,13 +2,10 @@
 #pragma once
 
 #include <gtest/gtest.h>
-#include <netinet/in.h>
+#include <openssl/bio.h>
 #include <openssl/evp.h>
-#include <openssl/rand.h>
+#include <openssl/sha.h>
 #include <openssl/ssl.h>
-#include <openssl/x509v3.h>
-#include <sys/socket.h>
-#include <unistd.h>
 
 #include <csignal>
 #include <cstring>
@@ -19,8 +16,7 @@
 
 struct Reply {
     int status = 0;  ///< 0 when no whole header came
-    std::string head, body;
-    bool whole = false;  ///< the body came to its announced or natural end
+    std::string head = {}, body = {};
 
     std::string Header(const std::string& name) const
     {
@@ -41,198 +37,107 @@ struct Reply {
 
 class RawClient {
 public:
-    /// With a CA file over TLS, else plain.
-    explicit RawClient(int port, const std::string& caFile = "")
+    RawClient(int port, bool tls)
     {
         sigset_t pipe;
         sigemptyset(&pipe);
         sigaddset(&pipe, SIGPIPE);
         pthread_sigmask(SIG_BLOCK, &pipe, nullptr);
-        m_Port = port;
-        if (caFile.empty()) return;
-        m_Context = SSL_CTX_new(TLS_client_method());
-        EXPECT_EQ(1, SSL_CTX_load_verify_locations(m_Context, caFile.c_str(), nullptr));
-        SSL_CTX_set_verify(m_Context, SSL_VERIFY_PEER, nullptr);
-        SSL_CTX_set_min_proto_version(m_Context, TLS1_2_VERSION);
-        SSL_CTX_set_max_proto_version(m_Context, TLS1_2_VERSION);  // sessions are there as soon as the handshake is
+        const std::string address = "127.0.0.1:" + std::to_string(port);
+        m_Bio = tls ? BIO_new_ssl_connect(m_Context) : BIO_new(BIO_s_connect());
+        BIO_set_conn_hostname(m_Bio, address.c_str());
+        EXPECT_EQ(1, BIO_do_connect(m_Bio)) << address;
     }
     ~RawClient()
     {
-        Close();
-        SSL_SESSION_free(m_Session);
+        BIO_free_all(m_Bio);
         SSL_CTX_free(m_Context);
     }
     RawClient(const RawClient&) = delete;
     RawClient& operator=(const RawClient&) = delete;
 
-    /// Connects and shakes hands as a strict client would; the session of an earlier connection is offered again.
-    bool Connect(const char* name = "localhost")
-    {
-        Close();
-        m_Socket = socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
-        const timeval limit{10, 0};
-        setsockopt(m_Socket, SOL_SOCKET, SO_RCVTIMEO, &limit, sizeof limit);
-        sockaddr_in address{};
-        address.sin_family = AF_INET;
-        address.sin_port = htons(static_cast<uint16_t>(m_Port));
-        address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
-        if (connect(m_Socket, reinterpret_cast<sockaddr*>(&address), sizeof address)) return false;
-        if (!m_Context) return true;
-        m_Ssl = SSL_new(m_Context);
-        SSL_set_fd(m_Ssl, m_Socket);
-        SSL_set1_host(m_Ssl, name);
-        SSL_set_hostflags(m_Ssl, X509_CHECK_FLAG_NO_PARTIAL_WILDCARDS | X509_CHECK_FLAG_NEVER_CHECK_SUBJECT);
-        if (m_Session) SSL_set_session(m_Ssl, m_Session);
-        const bool connected = SSL_connect(m_Ssl) == 1;
-        verify_result = SSL_get_verify_result(m_Ssl);
-        if (connected) {
-            SSL_SESSION_free(m_Session);
-            m_Session = SSL_get1_session(m_Ssl);
-        }
-        return connected;
-    }
-    void Close()
-    {
-        if (m_Ssl && SSL_is_init_finished(m_Ssl)) SSL_shutdown(m_Ssl);
-        SSL_free(m_Ssl);
-        m_Ssl = nullptr;
-        if (m_Socket >= 0) close(m_Socket);
-        m_Socket = -1;
-        m_Buffer.clear();
-    }
     bool Send(const std::string& bytes)
     {
-        if (m_Ssl) return SSL_write(m_Ssl, bytes.data(), static_cast<int>(bytes.size())) > 0;
-        return send(m_Socket, bytes.data(), bytes.size(), MSG_NOSIGNAL) == static_cast<ssize_t>(bytes.size());
+        return BIO_write(m_Bio, bytes.data(), static_cast<int>(bytes.size())) == static_cast<int>(bytes.size());
     }
-    /// What one receive gives; empty at the end.
-    std::string ReceiveSome()
-    {
-        char piece[64 * 1024];
-        const ssize_t size = m_Ssl ? SSL_read(m_Ssl, piece, sizeof piece) : recv(m_Socket, piece, sizeof piece, 0);
-        return size > 0 ? std::string(piece, static_cast<size_t>(size)) : "";
-    }
-    /// One answer: to its Content-Length, to the end without one, or until the connection fails.
+    /// All that comes; requests ask for the connection's end.
     Reply Receive()
     {
-        Reply reply;
-        size_t end;
-        while ((end = m_Buffer.find("\r\n\r\n")) == std::string::npos) {
-            const std::string more = ReceiveSome();
-            if (more.empty()) return reply;
-            m_Buffer += more;
-        }
-        reply.head = m_Buffer.substr(0, end + 2);
-        reply.status = reply.head.compare(0, 9, "HTTP/1.1 ") == 0 ? atoi(reply.head.c_str() + 9) : 0;
-        const std::string length = reply.Header("Content-Length");
-        const size_t wanted = length.empty() ? std::string::npos : strtoul(length.c_str(), nullptr, 10);
-        m_Buffer.erase(0, end + 4);
-        std::string more = "-";
-        while (m_Buffer.size() < wanted && !more.empty())
-            m_Buffer += more = ReceiveSome();
-        reply.whole = length.empty() || m_Buffer.size() >= wanted;
-        reply.body = m_Buffer.substr(0, wanted);
-        m_Buffer.erase(0, reply.body.size());
-        return reply;
+        std::string got;
+        char piece[64 * 1024];
+        for (int size; (size = BIO_read(m_Bio, piece, sizeof piece)) > 0;)
+            got.append(piece, static_cast<size_t>(size));
+        const size_t end = got.find("\r\n\r\n");
+        if (end == std::string::npos) return {};
+        return {atoi(got.c_str() + strlen("HTTP/1.1 ")), got.substr(0, end + 2), got.substr(end + 4)};
     }
-    /// What came after the last answer.
-    const std::string& Rest() const { return m_Buffer; }
-
-    long verify_result = 0;
 
 private:
-    int m_Port;
-    int m_Socket = -1;
-    SSL_CTX* m_Context = nullptr;
-    SSL* m_Ssl = nullptr;
-    SSL_SESSION* m_Session = nullptr;
-    std::string m_Buffer;
+    SSL_CTX* m_Context = SSL_CTX_new(TLS_client_method());
+    BIO* m_Bio = nullptr;
 };
 
 inline std::string Base64(const std::string& bytes)
 {
     std::string text(bytes.size() / 3 * 4 + 8, '\0');
-    const int size =
-        EVP_EncodeBlock(reinterpret_cast<unsigned char*>(text.data()),
-                        reinterpret_cast<const unsigned char*>(bytes.data()), static_cast<int>(bytes.size()));
-    text.resize(static_cast<size_t>(size));
+    text.resize(static_cast<size_t>(EVP_EncodeBlock(reinterpret_cast<unsigned char*>(text.data()),
+                                                    reinterpret_cast<const unsigned char*>(bytes.data()),
+                                                    static_cast<int>(bytes.size()))));
     return text;
-}
-
-inline std::string Sha1(const std::string& bytes)
-{
-    std::string digest(20, '\0');
-    EVP_Digest(bytes.data(), bytes.size(), reinterpret_cast<unsigned char*>(digest.data()), nullptr, EVP_sha1(),
-               nullptr);
-    return digest;
 }
 
 /// A request whose parts a test may change before it is put together.
 struct SoapRequest {
     std::string service = {};  ///< "RealTimeBrowse", "DownloadAPI" or "StreamAPI"
     std::string operation = {};
-    std::string children = {};  ///< of the request element; the prefix "z" is the service's namespace
-    std::string user = "customer";
+    std::string children = {};   ///< of the request element; the prefix "z" is the service's namespace
+    std::string base = "/api/";  ///< what the path begins with
     std::string password = "secret";
-    std::string device = "desktop-player";
-    int device_type = 48;
-    long long created_offset = 0;   ///< seconds from now
-    std::string nonce = {};         ///< of one's own; else a fresh one
-    std::string http_headers = {};  ///< further lines, each with its end
-
-    std::string Block() const
-    {
-        return service == "RealTimeBrowse" ? "DeviceSettings"
-               : service == "DownloadAPI"  ? "DownloadDeviceRequestSettings"
-                                           : "StreamDeviceRequestSettings";
-    }
+    long long created_offset = 0;  ///< seconds from now
+    std::string nonce = {};        ///< of one's own; else a fresh one
 
     std::string Envelope(int port) const
     {
-        std::string bytes = nonce;
-        if (bytes.empty()) {
-            bytes.resize(20);
-            RAND_bytes(reinterpret_cast<unsigned char*>(bytes.data()), 20);
-        }
+        static int s_Count;
+        const std::string bytes = nonce.empty() ? "number " + std::to_string(++s_Count) : nonce;
         const time_t when = time(nullptr) + created_offset;
         tm parts{};
-        gmtime_r(&when, &parts);
         char created[32];
-        strftime(created, sizeof created, "%Y-%m-%dT%H:%M:%SZ", &parts);
+        strftime(created, sizeof created, "%Y-%m-%dT%H:%M:%SZ", gmtime_r(&when, &parts));
+        const std::string digested = bytes + created + password;
+        std::string digest(SHA_DIGEST_LENGTH, '\0');
+        SHA1(reinterpret_cast<const unsigned char*>(digested.data()), digested.size(),
+             reinterpret_cast<unsigned char*>(digest.data()));
+        const std::string block = service == "RealTimeBrowse" ? "DeviceSettings"
+                                  : service == "DownloadAPI"  ? "DownloadDeviceRequestSettings"
+                                                              : "StreamDeviceRequestSettings";
         const std::string oasis = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-";
-        return "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n"
-               "<e:Envelope xmlns:e=\"http://schemas.xmlsoap.org/soap/envelope/\" "
-               "xmlns:z=\"http://api.zorvane.example/api/\" "
-               "xmlns:u=\"" +
-               oasis + "wssecurity-utility-1.0.xsd\" xmlns:s=\"" + oasis +
-               "wssecurity-secext-1.0.xsd\" "
-               "xmlns:a=\"http://schemas.xmlsoap.org/ws/2004/08/addressing\"><e:Header>"
-               "<s:Security e:mustUnderstand=\"1\"><s:UsernameToken u:Id=\"User\"><s:Username>" +
-               user +
-               "</s:Username>"
-               "<s:Password Type=\"" +
-               oasis + "username-token-profile-1.0#PasswordDigest\">" + Base64(Sha1(bytes + created + password)) +
+        const std::string addressing = "http://schemas.xmlsoap.org/ws/2004/08/addressing";
+        return R"(<?xml version="1.0" encoding="UTF-8"?>
+<e:Envelope xmlns:e="http://schemas.xmlsoap.org/soap/envelope/" xmlns:z="http://api.zorvane.example/api/" xmlns:u=")" +
+               oasis + R"(wssecurity-utility-1.0.xsd" xmlns:s=")" + oasis + R"(wssecurity-secext-1.0.xsd" xmlns:a=")" +
+               addressing +
+               R"("><e:Header><s:Security e:mustUnderstand="1"><s:UsernameToken u:Id="User">)"
+               R"(<s:Username>customer</s:Username><s:Password Type=")" +
+               oasis + "username-token-profile-1.0#PasswordDigest\">" + Base64(digest) +
                "</s:Password><s:Nonce EncodingType=\"" + oasis + "soap-message-security-1.0#Base64Binary\">" +
                Base64(bytes) + "</s:Nonce><u:Created>" + created +
                "</u:Created></s:UsernameToken></s:Security><a:MessageID>uuid:" + operation +
-               "</a:MessageID>"
-               "<a:ReplyTo "
-               "e:mustUnderstand=\"1\"><a:Address>http://schemas.xmlsoap.org/ws/2004/08/addressing/role/anonymous"
-               "</a:Address></a:ReplyTo><a:To e:mustUnderstand=\"true\">https://localhost:" +
-               std::to_string(port) + "/api/" + service +
-               ".asmx</a:To><a:Action e:mustUnderstand=\"1\">http://api.zorvane.example/api/" + operation +
-               "</a:Action><z:" + Block() +
-               " e:mustUnderstand=\"1\"><z:APIKey>desktop</z:APIKey><z:DestinationUniqueID>" + device +
-               "</z:DestinationUniqueID><z:DestinationTypeID>" + std::to_string(device_type) +
-               "</z:DestinationTypeID></z:" + Block() + "></e:Header><e:Body><z:" + operation + ">" + children +
-               "</z:" + operation + "></e:Body></e:Envelope>";
+               R"(</a:MessageID><a:ReplyTo e:mustUnderstand="1"><a:Address>)" + addressing +
+               R"(/role/anonymous</a:Address></a:ReplyTo><a:To e:mustUnderstand="true">https://localhost:)" +
+               std::to_string(port) + base + service +
+               R"(.asmx</a:To><a:Action e:mustUnderstand="1">http://api.zorvane.example/api/)" + operation +
+               "</a:Action><z:" + block +
+               R"( e:mustUnderstand="1"><z:APIKey>desktop</z:APIKey><z:DestinationUniqueID>desktop-player)"
+               "</z:DestinationUniqueID><z:DestinationTypeID>48</z:DestinationTypeID></z:" +
+               block + "></e:Header><e:Body><z:" + operation + ">" + children + "</z:" + operation +
+               "></e:Body></e:Envelope>";
     }
     std::string Head(int port, size_t length) const
     {
-        return "POST /api/" + service + ".asmx HTTP/1.1\r\nHost: localhost:" + std::to_string(port) +
-               "\r\nUser-Agent: raw\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " +
-               std::to_string(length) + "\r\nSOAPAction: \"http://api.zorvane.example/api/" + operation + "\"\r\n" +
-               http_headers + "\r\n";
+        return "POST " + base + service + ".asmx HTTP/1.1\r\nHost: localhost:" + std::to_string(port) +
+               "\r\nConnection: close\r\nUser-Agent: raw\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " +
+               std::to_string(length) + "\r\nSOAPAction: \"http://api.zorvane.example/api/" + operation + "\"\r\n\r\n";
     }
     std::string Text(int port) const
     {
@@ -250,8 +155,6 @@ protected:
         store = Storefront::Start(options, error);
         ASSERT_TRUE(store) << error;
     }
-    std::string CaFile() const { return store->DataFolder() + "/ca.pem"; }
-
     void Order(const std::string& fault)
     {
         std::string error;
@@ -259,29 +162,27 @@ protected:
     }
 
     /// One request on a connection of its own.
+    static Reply SendBytes(int port, bool tls, const std::string& bytes)
+    {
+        RawClient client(port, tls);
+        EXPECT_TRUE(client.Send(bytes));
+        return client.Receive();
+    }
     Reply Send(const SoapRequest& request)
     {
-        RawClient client(store->HttpsPort(), CaFile());
-        EXPECT_TRUE(client.Connect());
-        EXPECT_TRUE(client.Send(request.Text(store->HttpsPort())));
-        return client.Receive();
+        return SendBytes(store->HttpsPort(), true, request.Text(store->HttpsPort()));
     }
-    Reply Ask(const std::string& service, const std::string& operation, const std::string& children = "",
-              const std::string& user = "customer")
+    Reply Ask(const std::string& service, const std::string& operation, const std::string& children = "")
     {
-        SoapRequest request{service, operation, children};
-        request.user = user;
-        return Send(request);
+        return Send({service, operation, children});
     }
-    Reply Plain(const std::string& path, const std::string& headers = "User-Agent: ZVWSLib\r\n",
-                const std::string& method = "GET", const std::string& body = "")
+    Reply Plain(const std::string& path, const std::string& headers = "", const std::string& method = "GET",
+                const std::string& body = "")
     {
-        RawClient client(store->HttpPort());
-        EXPECT_TRUE(client.Connect());
-        EXPECT_TRUE(client.Send(method + " " + path + " HTTP/1.1\r\n" + headers +
-                                "Host: localhost\r\nContent-Length: " + std::to_string(body.size()) + "\r\n\r\n" +
-                                body));
-        return client.Receive();
+        return SendBytes(store->HttpPort(), false,
+                         method + " " + path + " HTTP/1.1\r\n" + headers +
+                             "Host: localhost\r\nConnection: close\r\nContent-Length: " + std::to_string(body.size()) +
+                             "\r\n\r\n" + body);
     }
     LoggedRequest LastLogged() { return store->Log().back(); }
 

@@ -20,13 +20,7 @@ protected:
             "RealTimeBrowse", "getTitlesByNavigation",
             Children({{"GenreID", "1"}, {"CurrentPageNumber", "1"}, {"ItemsPerPage", "2"}, {"PurchaseType", "any"}})};
     }
-    Reply SendBytes(const std::string& bytes)
-    {
-        RawClient client(store->HttpsPort(), CaFile());
-        EXPECT_TRUE(client.Connect());
-        EXPECT_TRUE(client.Send(bytes));
-        return client.Receive();
-    }
+    Reply SendText(const std::string& text) { return SendBytes(store->HttpsPort(), true, text); }
 };
 
 TEST_F(RequestCheckTest, AGoodRequestIsAnsweredAndLogged)
@@ -55,8 +49,8 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
     } rows[] = {
         {"POST ", "PUT ", "not POST"},
         {"text/xml; charset=utf-8", "application/soap+xml; charset=utf-8", "content type"},
+        {"User-Agent: raw\r\n", "", "no user agent"},
         {"SOAPAction: \"", "X-Action: \"", "SOAPAction"},
-        {"SOAPAction: \"http", "SOAPAction: \"HTTP", "SOAPAction"},
         {"e=\"http://schemas.xmlsoap.org/soap/envelope/\"", "e=\"http://www.w3.org/2003/05/soap-envelope\"",
          "no SOAP 1.1 envelope"},
         {"</e:Envelope>", "</e:Envelop>", "no XML"},
@@ -75,11 +69,9 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
         {"<a:MessageID>uuid:getTitlesByNavigation</a:MessageID>", "", "block 2 must be MessageID"},
         {"<a:To e:", "<z:Extra>x</z:Extra><a:To e:", "block 4 must be To"},
         {"<z:APIKey>desktop", "<z:APIKey>laptop", "API key"},
-        {"<z:APIKey>desktop</z:APIKey>", "", "API key"},
         {"<z:DestinationUniqueID>desktop-player", "<z:DestinationUniqueID>", "DestinationUniqueID"},
         {"<z:DestinationTypeID>48", "<z:DestinationTypeID>forty", "DestinationTypeID"},
         {"<z:APIKey>desktop</z:APIKey>", "<z:AuthToken>t</z:AuthToken><z:APIKey>desktop</z:APIKey>", "out of order"},
-        {"<z:GenreID>1</z:GenreID>", "", "GenreID is missing"},
         {"<z:GenreID>1<", "<z:GenreID>one<", "no xsd:int"},
         {"<z:GenreID>1<", "<z:GenreID>99999999999<", "no xsd:int"},
         {"<z:PurchaseType>any", "<z:PurchaseType>Any", "PurchaseType has no value \"Any\""},
@@ -103,7 +95,7 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
             Replace(envelope, row.from, row.to);
             head = request.Head(port, envelope.size());
         }
-        const Reply reply = SendBytes(head + envelope);
+        const Reply reply = SendText(head + envelope);
         EXPECT_EQ(500, reply.status);
         EXPECT_NE(std::string::npos, reply.body.find("<faultcode>soap:Client</faultcode>"));
         EXPECT_NE(std::string::npos, LastLogged().violation.find(row.reason)) << LastLogged().violation;
@@ -119,7 +111,7 @@ TEST_F(RequestCheckTest, TheOtherServicesBlocksAndOperationsAreRefused)
     for (const char* tag : {"<z:", "</z:"}) {
         Replace(envelope, std::string(tag) + "DeviceSettings", std::string(tag) + "StreamDeviceRequestSettings");
     }
-    EXPECT_EQ(500, SendBytes(request.Head(port, envelope.size()) + envelope).status);
+    EXPECT_EQ(500, SendText(request.Head(port, envelope.size()) + envelope).status);
     EXPECT_EQ("header block 6 must be DeviceSettings", LastLogged().violation);
 
     for (const char* service : {"DownloadAPI", "StreamAPI"})
@@ -187,12 +179,8 @@ TEST_F(RequestCheckTest, SecretsStayOutOfTheLog)
 TEST_F(RequestCheckTest, TheAdultCataloguePathOfStagingIsServedToo)
 {
     SoapRequest request = Titles();
-    const int port = store->HttpsPort();
-    std::string envelope = request.Envelope(port);
-    Replace(envelope, "/api/RealTimeBrowse.asmx", "/kac/api/RealTimeBrowse.asmx");
-    std::string head = request.Head(port, envelope.size());
-    Replace(head, "/api/RealTimeBrowse.asmx", "/kac/api/RealTimeBrowse.asmx");
-    EXPECT_EQ(200, SendBytes(head + envelope).status);
+    request.base = "/kac/api/";
+    EXPECT_EQ(200, Send(request).status);
 }
 
 }  // namespace
