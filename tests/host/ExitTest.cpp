@@ -58,21 +58,33 @@ TEST_F(ExitTest, ActiveExitThatNobodyAcknowledges)
 // Nothing that the network does keeps the process: it is gone within three seconds, and the player system hears of it.
 TEST_F(ExitTest, RequestedCloseWhileACallHangs)
 {
-    std::string error;
-    const auto store = Storefront::Start(StorefrontOptions(), error);
-    ASSERT_TRUE(store && store->AddFault("discovery=stall", error)) << error;
-    Environment environment = WithMovie(
-        "new com.orvex.ZVWSLib().init([{}, {APIKey: 'desktop', UserName: 'customer', Password: 'secret',"
-        "    DestinationUniqueID: 'd', DestinationTypeID: 1, EnvNum: 3}]); setInterval(function () {}, 10);");
-    environment.emplace_back("ZV_DEPLOYMENT", store->DeploymentFile());
-    Process host({ZV_STAGECRAFT, "5"}, environment);
-    m_player.Accept();
-    ASSERT_TRUE(store->WaitForRequests(1));
-    const auto asked = std::chrono::steady_clock::now();
-    m_player.Send(3);
-    EXPECT_EQ(0, host.WaitForEnd());
-    EXPECT_LT(std::chrono::steady_clock::now() - asked, std::chrono::seconds(3));
-    ExpectReceived({4});
+    const struct {
+        const char* fault;
+        size_t requests;  // that the store has seen when the fault bites
+    } rows[] = {{"connect=stall", 1},       {"discovery=stall", 1},          {"getFileType=stall", 2},
+                {"getNavigation=stall", 3}, {"getNavigation=stall-body", 3}, {"getNavigation=drip:200", 3}};
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.fault);
+        std::string error;
+        const auto store = Storefront::Start(StorefrontOptions(), error);
+        ASSERT_TRUE(store && store->AddFault(row.fault, error)) << error;
+        Environment environment = WithMovie(
+            "var ws = new com.orvex.ZVWSLib();"
+            "ws.init([{onComplete: function () { ws.getNavigation([{}, {}]); }}, {APIKey: 'desktop', UserName: "
+            "'customer',"
+            "    Password: 'secret', DestinationUniqueID: 'd', DestinationTypeID: 1, EnvNum: 3}]);"
+            "setInterval(function () {}, 10);");
+        environment.emplace_back("ZV_DEPLOYMENT", store->DeploymentFile());
+        Process host({ZV_STAGECRAFT, "5"}, environment);
+        m_player.Accept();
+        ASSERT_TRUE(store->WaitForRequests(row.requests));
+        const auto asked = std::chrono::steady_clock::now();
+        m_player.Send(3);
+        EXPECT_EQ(0, host.WaitForEnd());
+        EXPECT_LT(std::chrono::steady_clock::now() - asked, std::chrono::seconds(3));
+        ExpectReceived({4});
+        m_player.Close();
+    }
 }
 
 // The movie is a FIFO: reading it holds the start up until the close has been requested.
@@ -123,6 +135,22 @@ TEST_F(ExitTest, RequestedClose)
                      "player: dropped a packet of 17 bytes, a message has 16"}),
               host.Errors());
     ExpectReceived({4});
+}
+
+TEST_F(ExitTest, FloodOfMessages)
+{
+    Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
+    m_player.Accept();
+    ASSERT_TRUE(host.WaitForLine("running"));
+    const size_t kMany = 500;  // fewer bytes of output than its pipe holds
+    for (size_t i = 0; i < kMany; ++i) {
+        m_player.Send(8);
+    }
+    m_player.Send(3);
+    EXPECT_EQ(0, host.WaitForEnd());
+    std::vector<Lines> messages(kMany, Lines{"[ZV_FLASH] IPC get 8 "});
+    messages.push_back(UninitMessage());
+    EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"running"}) + ReleaseLines(), ListenLines(messages)));
 }
 
 TEST_F(ExitTest, NoQueue)
