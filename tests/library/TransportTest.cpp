@@ -1,7 +1,9 @@
 // What a service can do to a connection, and that the next call works.
 #include <csignal>
 
+#include "Deployment.h"
 #include "Store.h"
+#include "Tls.h"
 
 namespace {
 
@@ -110,6 +112,20 @@ TEST_F(Transport, ADeadKeptConnectionIsReplacedAndItsSessionResumed)
         EXPECT_EQ(4u, store->Log().size()) << fault;
         EXPECT_EQ(ZV_WS_Status_ok, Listing());
     }
+}
+
+// The context lives as long as the process.
+TEST_F(Transport, ConnectionsLeaveNoSessionsInTheirContext)
+{
+    for (int i = 0; i < 5; ++i) {
+        Fault("getTitleListing=no-length");
+        ASSERT_EQ(ZV_WS_Status_ok, Listing());
+    }
+    EXPECT_TRUE(store->Log().back().resumed);
+    SSL_CTX* context = Tls::ContextFor(Deployment::Current().ca_file, "localhost");
+    EXPECT_LE(5, SSL_CTX_sess_connect_good(context));
+    EXPECT_EQ(0, SSL_CTX_sess_number(context));
+    SSL_CTX_free(context);
 }
 
 TEST_F(Transport, WhatChangesSomethingIsSentOnce)
