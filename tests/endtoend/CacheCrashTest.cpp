@@ -4,9 +4,7 @@
 #include <time.h>
 
 #include <filesystem>
-#include <fstream>
 #include <random>
-#include <sstream>
 
 #include "Movie.h"
 #include "Storefront.h"
@@ -39,13 +37,6 @@ call('init', {APIKey: 'desktop', UserName: 'customer', Password: 'secret', Desti
 });
 )";
 
-std::string Contents(const fs::path& file)
-{
-    std::ostringstream text;
-    text << std::ifstream(file, std::ios::binary).rdbuf();
-    return text.str();
-}
-
 std::string IntegrityOf(const fs::path& file)
 {
     sqlite3* database = nullptr;
@@ -70,7 +61,7 @@ void CheckCache(const fs::path& folder, int& images)
         if (file.extension() == ".zv") {
             EXPECT_EQ("ok", IntegrityOf(file));
         } else if (file.extension() == ".jpg") {
-            const std::string image = Contents(file);
+            const std::string image = FileContents(file);
             ++images;
             ASSERT_GT(image.size(), 4u) << file;
             EXPECT_EQ("\xff\xd8", image.substr(0, 2)) << file;
