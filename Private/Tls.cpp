@@ -88,6 +88,7 @@ private:
         SSL_CTX_set_mode(context, SSL_MODE_AUTO_RETRY);
         // A peer that cuts the connection without a TLS goodbye is told from a whole answer by the answer's length.
         SSL_CTX_set_options(context, SSL_OP_NO_RENEGOTIATION | SSL_OP_IGNORE_UNEXPECTED_EOF);
+        // Kept here: the context's own list would grow with every connection.
         SSL_CTX_set_session_cache_mode(context, SSL_SESS_CACHE_CLIENT | SSL_SESS_CACHE_NO_INTERNAL);
         SSL_CTX_sess_set_new_cb(context, KeepSession);
         SSL_CTX_set1_cert_store(context, authorities);

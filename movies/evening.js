@@ -41,6 +41,10 @@ var setup = {
     DestinationTypeID: 48,
     AccessType: 2,
     EnvNum: 3,
+    CacheType: flashvars.cache ? 2 : 0,  // a file cache in that folder, or none
+    CacheData: 7,
+    CacheLimit: 0,
+    CachePath: flashvars.cache || "",
     ApplicationRevision: "1.0",
     firmwareVersion: "1.3.1",
     modelNumber: "desktop"
@@ -80,6 +84,8 @@ run([
             return found.TotalItems + " found, first: " + known.title.TitleName;
         }),
     ask("getTitleListing", function () { return {titleid: known.title.TitleID}; }, function (title) { return title.RunTime; }),
+    ask("getBoxArtImage", function () { return {boxartsize: 6, boxartprefix: known.title.BoxArtPrefix}; },
+        function (place) { return place; }),
     ask("getRecommendedTitles", function () { return {titleid: known.title.TitleID}; },
         function (answer) { return answer.Titles.length + " more like it"; }),
 

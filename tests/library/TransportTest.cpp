@@ -2,7 +2,9 @@
 #include <csignal>
 #include <set>
 
+#include "Deployment.h"
 #include "Store.h"
+#include "Tls.h"
 
 namespace {
 
@@ -90,6 +92,20 @@ TEST_F(Transport, AHostSeesOneFullHandshake)
     EXPECT_EQ(connections.size() - 1, resumed.size());
     for (ZV_WS_Session& copy : copies)
         ZV_WS_release(&copy);
+}
+
+// The context lives as long as the process.
+TEST_F(Transport, ConnectionsLeaveNoSessionsInTheirContext)
+{
+    for (int i = 0; i < 5; ++i) {
+        Fault("getTitleListing=no-length");
+        ASSERT_EQ(ZV_WS_Status_ok, Listing());
+    }
+    EXPECT_TRUE(store->Log().back().resumed);
+    SSL_CTX* context = Tls::ContextFor(Deployment::Current().ca_file, "localhost");
+    EXPECT_LE(5, SSL_CTX_sess_connect_good(context));
+    EXPECT_EQ(0, SSL_CTX_sess_number(context));
+    SSL_CTX_free(context);
 }
 
 TEST_F(Transport, WhatChangesSomethingIsSentOnce)

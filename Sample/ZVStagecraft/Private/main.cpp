@@ -1,5 +1,6 @@
 // zv_stagecraft: the storefront's interface as one process of the player. Its last argument chooses the variant, 0
 // to 5.
+#include <malloc.h>
 #include <stdlib.h>
 
 #include "CrashHandler.h"
@@ -70,6 +71,11 @@ int RunInterface(int uiType, const char* flashVars)
 int main(int argc, char** argv)
 {
     zv_dbg_init();
+#ifdef M_ARENA_MAX
+    // Every call is a thread of its own: heaps for threads would each keep what was freed in them. They wait for the
+    // network, not for each other's allocations.
+    mallopt(M_ARENA_MAX, 1);
+#endif
     const char* coreDump = getenv("ZV_CORE_DUMP");
     _EN_CORE_DUMP = coreDump && coreDump[0] == '1' && coreDump[1] == '\0';
 
