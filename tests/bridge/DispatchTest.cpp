@@ -1,9 +1,10 @@
 // Return codes, delivery and the end of instances, as far as they need no service: a set-up that the library refuses
 // at once goes the whole way through worker and delivery.
+#include <gtest/gtest.h>
 #include <sstream>
 
-#include "../foundation/TempFolder.h"
 #include "MovieRun.h"
+#include "TempFolder.h"
 #include "ZVWSLibAE.h"
 
 namespace {

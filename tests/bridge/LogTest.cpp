@@ -1,9 +1,10 @@
 // The tracer, and the log that a movie sets up.
+#include <gtest/gtest.h>
 #include <algorithm>
 #include <sstream>
 
-#include "../foundation/TempFolder.h"
 #include "MovieRun.h"
+#include "TempFolder.h"
 #include "ZVWSAELog.h"
 #include "ZV_Log.h"
 

@@ -2,7 +2,7 @@
 
 #include <stdlib.h>
 
-#include "../foundation/TempFolder.h"
+#include "TempFolder.h"
 #include "ZVCfgLibAE.h"
 #include "ZVWSLibAE.h"
 #include "stagecraft/IStagecraft.h"

@@ -1,8 +1,8 @@
 // The settings class as a movie sees it.
 #include <sstream>
 
-#include "../library/SettingsFolder.h"
 #include "MovieRun.h"
+#include "SettingsFolder.h"
 
 namespace {
 

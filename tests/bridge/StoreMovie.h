@@ -1,8 +1,8 @@
 // Movies against a storefront of the test's own.
 #pragma once
 
-#include "../library/Store.h"
 #include "MovieRun.h"
+#include "Store.h"
 
 class StoreMovie : public Store {
 protected:

@@ -5,10 +5,10 @@
 #include <filesystem>
 #include <random>
 
-#include "../foundation/TempFolder.h"
-#include "../library/CacheFile.h"
-#include "../library/Store.h"
+#include "CacheFile.h"
 #include "Movie.h"
+#include "Store.h"
+#include "TempFolder.h"
 
 namespace {
 

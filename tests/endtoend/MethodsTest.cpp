@@ -1,7 +1,8 @@
 // All methods of com.orvex.ZVWSLib from a movie in the real process. Each result is written as JSON by the movie, which
 // keeps the order of the properties, and compared with what the simulator's database says, also as JSON.
-#include "../library/Store.h"
 #include "Movie.h"
+#include "Store.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -268,7 +269,7 @@ TEST_F(Methods, AnswerWhatTheStoreHolds)
     for (const Row& row : rows)
         expected.push_back(store->Query(row.expected));
 
-    const Folder folder;
+    const TempFolder folder;
     const MovieOutput output = RunMovieFile(folder.Write("movie.js", Movie(rows)),
                                             {{"ZV_DEPLOYMENT", store->DeploymentFile()}, {"TZ", "UTC"}});
     EXPECT_EQ(0, output.status);

@@ -1,6 +1,6 @@
 // The movies that come with the project, and what a movie sees when the store is not as it should be.
-#include "../library/Store.h"
 #include "Movie.h"
+#include "Store.h"
 
 namespace {
 

@@ -6,6 +6,7 @@
 
 #include "Movie.h"
 #include "Storefront.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -39,7 +40,7 @@ protected:
     // A customer's evening; what it leaves goes into `left`.
     Environment Variables(const std::string& target) const
     {
-        const std::string folder = left.Path("");
+        const std::string folder = left / "";
         return {{"ZV_DEPLOYMENT", store->DeploymentFile()},
                 {"STAGECRAFT_MOVIE", movies.Write("movie.js", kPrelude + FileContents(ZV_MOVIES "/evening.js"))},
                 {"STAGECRAFT_FPS", "1000"},
@@ -52,7 +53,7 @@ protected:
         std::string all;
         for (const std::string& line : ended.Output() + ended.Errors())
             all += line + "\n";
-        for (const auto& entry : fs::recursive_directory_iterator(left.Path(""))) {
+        for (const auto& entry : fs::recursive_directory_iterator(left / "")) {
             if (entry.is_regular_file()) all += entry.path().string() + "\n" + FileContents(entry.path()) + "\n";
         }
         return all;
@@ -76,7 +77,7 @@ protected:
         }
     }
 
-    const Folder movies, left;
+    const TempFolder movies, left;
     std::unique_ptr<Storefront> store;
 };
 

@@ -9,6 +9,7 @@
 
 #include "Movie.h"
 #include "Storefront.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -117,13 +118,13 @@ TEST(Soak, NothingGrows)
     const auto store = Storefront::Start(StorefrontOptions(), error);
     ASSERT_TRUE(store) << error;
     const std::string season = store->Query("SELECT MIN(season) FROM title WHERE season > 0");
-    const Folder folder;
+    const TempFolder folder;
     Process player({ZV_STAGECRAFT, "5"}, {{"ZV_DEPLOYMENT", store->DeploymentFile()},
                                           {"STAGECRAFT_MOVIE", ZV_SOAK_MOVIE},
                                           {"STAGECRAFT_FPS", "1000"},
                                           {"ZV_FLASHVARS", "seed=" + seed + "&calls=" + std::to_string(calls) +
                                                                "&mark=" + std::to_string(mark) + "&season=" + season +
-                                                               "&folder=" + folder.Path("")}});
+                                                               "&folder=" + folder / ""}});
     ASSERT_TRUE(player.WaitForLine("at rest after 0 calls"));
     const Footprint idle = Measure(player.Pid());
     AddFaults(*store, random, mark);

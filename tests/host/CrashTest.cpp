@@ -13,6 +13,7 @@
 #include <fstream>
 
 #include "HostLines.h"
+#include "TempFolder.h"
 
 // The handler's stdio is accepted.
 extern "C" const char* __tsan_default_options()
@@ -128,7 +129,7 @@ protected:
         EXPECT_EQ(0, syscall(SYS_tgkill, process.Pid(), thread, signal));
     }
 
-    Folder m_folder;
+    TempFolder m_folder;
 };
 
 TEST_F(CrashTest, SegvLeavesTheProcessPaused)

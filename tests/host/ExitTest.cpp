@@ -10,6 +10,7 @@
 #include "HostLines.h"
 #include "IpcChannel.h"
 #include "Storefront.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -17,7 +18,7 @@ class ExitTest : public testing::Test {
 protected:
     Environment WithMovie(const std::string& movie)
     {
-        return {{"ZV_IPC_SOCKET", m_folder.Path("player")}, {"STAGECRAFT_MOVIE", m_folder.Write("movie.js", movie)}};
+        return {{"ZV_IPC_SOCKET", m_folder / "player"}, {"STAGECRAFT_MOVIE", m_folder.Write("movie.js", movie)}};
     }
 
     // Everything that the player system must have got, up to the end of the connection.
@@ -29,8 +30,8 @@ protected:
         EXPECT_EQ("", m_player.Receive());
     }
 
-    Folder m_folder;
-    Player m_player{m_folder.Path("player")};
+    TempFolder m_folder;
+    Player m_player{m_folder / "player"};
 };
 
 TEST_F(ExitTest, ActiveExit)
@@ -91,13 +92,13 @@ TEST_F(ExitTest, RequestedCloseWhileACallHangs)
 TEST_F(ExitTest, RequestedCloseBeforeTheMovieHasBegun)
 {
     Environment environment = WithMovie("");
-    environment.back().second = m_folder.Path("fifo");
-    ASSERT_EQ(0, mkfifo(m_folder.Path("fifo").c_str(), 0600));
+    environment.back().second = m_folder / "fifo";
+    ASSERT_EQ(0, mkfifo((m_folder / "fifo").c_str(), 0600));
     Process host({ZV_STAGECRAFT, "5"}, environment);
     m_player.Accept();
     m_player.Send(3);
     ASSERT_TRUE(host.WaitForLine("<ZV_FLASH> ipc listener thread main has exit!"));
-    std::ofstream(m_folder.Path("fifo")) << kRunsOn;
+    std::ofstream(m_folder / "fifo") << kRunsOn;
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines() + ReleaseLines(), ListenLines({UninitMessage()})));
     ExpectReceived({4});
@@ -156,7 +157,7 @@ TEST_F(ExitTest, FloodOfMessages)
 TEST_F(ExitTest, NoQueue)
 {
     Environment environment = WithMovie("setInterval(function () {}, 10);");
-    environment.front().second = m_folder.Path("nobody");
+    environment.front().second = m_folder / "nobody";
     Process host({ZV_STAGECRAFT, "5"}, environment);
     EXPECT_EQ(0, host.WaitForEnd());
     Lines start = StartLines();
@@ -164,15 +165,14 @@ TEST_F(ExitTest, NoQueue)
     const Lines nothingSent = {"[ZV_FLASH] ipc thread already exit, now do nothing! ", "[ZV_FLASH] ZV FLASH Run End "};
     EXPECT_TRUE(IsMerge(host.Output(), start + MovieLines() + FinalizeLines() + nothingSent,
                         ListenLines({ReceiveFailure(ENOTCONN)})));
-    EXPECT_EQ(
-        Lines{"player: no queue to the player system at " + m_folder.Path("nobody") + ": No such file or directory"},
-        host.Errors());
+    EXPECT_EQ(Lines{"player: no queue to the player system at " + m_folder / "nobody" + ": No such file or directory"},
+              host.Errors());
 }
 
 TEST_F(ExitTest, StageWindowSetFails)
 {
     Environment environment = WithMovie("");
-    environment.back().second = m_folder.Path("no movie");
+    environment.back().second = m_folder / "no movie";
     Process host({ZV_STAGECRAFT, "5"}, environment);
     m_player.Accept();
     EXPECT_EQ(Player::Message(5), m_player.Receive());
@@ -186,8 +186,8 @@ TEST_F(ExitTest, StageWindowSetFails)
 // A copy of the program that finds no runtime beside itself; the second time without a queue either.
 TEST_F(ExitTest, RuntimeLibraryMissing)
 {
-    std::filesystem::copy_file(ZV_STAGECRAFT, m_folder.Path("zv_stagecraft"));
-    const Lines arguments = {m_folder.Path("zv_stagecraft"), "5"};
+    std::filesystem::copy_file(ZV_STAGECRAFT, m_folder / "zv_stagecraft");
+    const Lines arguments = {m_folder / "zv_stagecraft", "5"};
     Process host(arguments, WithMovie(kEndsAtOnce));
     m_player.Accept();
     EXPECT_EQ(0, host.WaitForEnd());
@@ -197,7 +197,7 @@ TEST_F(ExitTest, RuntimeLibraryMissing)
               host.Errors());
     ExpectReceived({4});
 
-    Process alone(arguments, {{"ZV_IPC_SOCKET", m_folder.Path("nobody")}});
+    Process alone(arguments, {{"ZV_IPC_SOCKET", m_folder / "nobody"}});
     EXPECT_TRUE(alone.WaitForLine("[ZV_FLASH] IPC:,NETWORK_MSG_STUB_UNINIT_RET failed! ERR = "));
     EXPECT_EQ(0, alone.WaitForEnd());
 }
@@ -205,8 +205,8 @@ TEST_F(ExitTest, RuntimeLibraryMissing)
 // The console for people plays the other side as scripts do, through pipes.
 TEST(PlayerSystemTest, DrivesAHost)
 {
-    const Folder folder;
-    const std::string socket = folder.Path("player");
+    const TempFolder folder;
+    const std::string socket = folder / "player";
     Process player({ZV_PLAYER_SYSTEM, socket}, {});
     ASSERT_TRUE(player.WaitForLine("listening"));
     player.Type("init\nnonsense\nneter");

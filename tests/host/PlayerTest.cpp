@@ -1,12 +1,13 @@
 // The media player's stand-in, its script class in a movie.
 #include "HostLines.h"
+#include "TempFolder.h"
 
 namespace {
 
 // Runs the movie with `p`, a player object, and `say`, which joins its arguments to a line.
 Lines Traces(const std::string& movie)
 {
-    const Folder folder;
+    const TempFolder folder;
     const std::string text =
         "var p = new com.orvex.ZVPlayerLibAE();"
         "function say() { trace('> ' + JSON.stringify([].slice.call(arguments))); }" +

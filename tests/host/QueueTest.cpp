@@ -5,6 +5,7 @@
 #include <thread>
 
 #include "Process.h"
+#include "TempFolder.h"
 #include "player/NetworkStub.h"
 
 namespace {
@@ -13,7 +14,7 @@ class QueueTest : public testing::Test {
 protected:
     QueueTest()
     {
-        setenv("ZV_IPC_SOCKET", m_folder.Path("player").c_str(), 1);
+        setenv("ZV_IPC_SOCKET", (m_folder / "player").c_str(), 1);
         EXPECT_EQ(0, init_network_msg_queue());
         m_player.Accept();
     }
@@ -35,8 +36,8 @@ protected:
         return network_stub_send_ipc_msg(&message);
     }
 
-    Folder m_folder;
-    Player m_player{m_folder.Path("player")};
+    TempFolder m_folder;
+    Player m_player{m_folder / "player"};
 };
 
 TEST_F(QueueTest, WordsAreLittleEndian)

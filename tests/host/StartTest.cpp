@@ -1,5 +1,6 @@
 // What the host makes of its arguments and environment before the movie runs.
 #include "HostLines.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -24,7 +25,7 @@ const struct {
 
 TEST(VariantTest, ChoosesMovieAndFlashVariables)
 {
-    const Folder folder;
+    const TempFolder folder;
     const std::string movie = folder.Write("movie.js",
                                            "var pairs = []; for (var name in flashvars) "
                                            "pairs.push(name + '=' + flashvars[name]); trace(pairs.join('&'));");
@@ -49,9 +50,9 @@ TEST(VariantTest, ChoosesMovieAndFlashVariables)
 
 TEST(DrmTest, FailureStartsNothingElse)
 {
-    const Folder folder;
-    const Player player(folder.Path("player"));
-    Process host({ZV_STAGECRAFT, "5"}, {{"ZV_IPC_SOCKET", folder.Path("player")}, {"ZV_DRM_INIT_RESULT", "-7"}});
+    const TempFolder folder;
+    const Player player(folder / "player");
+    Process host({ZV_STAGECRAFT, "5"}, {{"ZV_IPC_SOCKET", folder / "player"}, {"ZV_DRM_INIT_RESULT", "-7"}});
     EXPECT_EQ(255, WEXITSTATUS(host.WaitForEnd()));
     EXPECT_EQ((Lines{"[ZV_FLASH]ZV UI type = 5 ", "", "[ZV_FLASH] Ipriv_drm_Init fail.ret = -7 "}), host.Output());
     EXPECT_FALSE(player.HasCaller());
@@ -59,7 +60,7 @@ TEST(DrmTest, FailureStartsNothingElse)
 
 TEST(DrmTest, FailureAtTheEndIsSaid)
 {
-    const Folder folder;
+    const TempFolder folder;
     Process host({ZV_STAGECRAFT, "5"},
                  {{"STAGECRAFT_MOVIE", folder.Write("movie.js", kEndsAtOnce)}, {"ZV_DRM_TERMINATE_RESULT", "0x1f"}});
     EXPECT_EQ(0, host.WaitForEnd());

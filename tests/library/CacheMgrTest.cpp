@@ -6,8 +6,8 @@
 #include <string>
 #include <vector>
 
-#include "../foundation/TempFolder.h"
 #include "CacheFile.h"
+#include "TempFolder.h"
 
 namespace {
 

@@ -7,6 +7,7 @@
 #include "Process.h"
 #include "SessionImpl.h"
 #include "Store.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -282,19 +283,19 @@ protected:
     {
         m_Store = std::make_unique<Process>(Faults(), Environment());
         ASSERT_TRUE(m_Store->WaitForLine("ready"));
-        setenv("ZV_DEPLOYMENT", m_Folder.Path("deployment.conf").c_str(), 1);
-        ASSERT_NO_FATAL_FAILURE(Begin(m_Folder.Path("cache")));
+        setenv("ZV_DEPLOYMENT", (m_Folder / "deployment.conf").c_str(), 1);
+        ASSERT_NO_FATAL_FAILURE(Begin(m_Folder / "cache"));
     }
 
     Lines Faults() const
     {
-        Lines arguments = {ZV_STOREFRONT, "--data", m_Folder.Path("")};
+        Lines arguments = {ZV_STOREFRONT, "--data", m_Folder / ""};
         for (const char* fault : {"=ok", "=bomb:64", "=endless"})
             arguments = arguments + Lines{"--fault", std::string(GetParam().operation) + fault};
         return arguments + Lines{"--environment", std::to_string(kEnvironment)};
     }
 
-    Folder m_Folder;
+    TempFolder m_Folder;
     std::unique_ptr<Process> m_Store;
 };
 

@@ -1,4 +1,5 @@
 // Every operation's answer against the contract's records: children, their order, those that are never left out.
+#include <gtest/gtest.h>
 #include <libxml/parser.h>
 
 #include <map>

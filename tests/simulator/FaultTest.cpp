@@ -1,4 +1,6 @@
 // Faults on order: each bites as it says, once for each count, and undoes what it claims has failed.
+#include <gtest/gtest.h>
+
 #include "RawClient.h"
 
 namespace {

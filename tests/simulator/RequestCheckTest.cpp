@@ -1,4 +1,6 @@
 // The strictness of the services: a good request passes, and each departure from the contract is refused by name.
+#include <gtest/gtest.h>
+
 #include "RawClient.h"
 
 namespace {

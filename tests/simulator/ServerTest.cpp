@@ -6,6 +6,7 @@
 
 #include "Process.h"
 #include "RawClient.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -52,9 +53,9 @@ TEST_F(ServerTest, TheEndDoesNotWaitForConnections)
 
 TEST_F(ServerTest, WhatChangedIsThereAfterARestart)
 {
-    const Folder folder;
+    const TempFolder folder;
     StorefrontOptions options;
-    options.dataFolder = folder.Path("data");
+    options.dataFolder = folder / "data";
     Begin(options);
     EXPECT_EQ("0", Ask("StreamAPI", "addItemToWishlist", Children({{"TitleID", "21"}})).Element("ResponseCode"));
     EXPECT_EQ("0", Ask("StreamAPI", "setAudioDefaultProperty", Children({{"AudioSetting", "DTS_Express_51"}}))

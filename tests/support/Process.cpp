@@ -78,24 +78,6 @@ std::vector<char*> Pointers(const Lines& texts)
 
 }  // namespace
 
-Folder::Folder()
-{
-    std::string path = std::filesystem::temp_directory_path() / "zvhostXXXXXX";
-    if (!mkdtemp(path.data())) ADD_FAILURE() << path << ": " << strerror(errno);
-    m_Path = path;
-}
-
-Folder::~Folder()
-{
-    std::filesystem::remove_all(m_Path);
-}
-
-std::string Folder::Write(const std::string& name, const std::string& text) const
-{
-    std::ofstream(Path(name)) << text;
-    return Path(name);
-}
-
 Process::Process(const Lines& arguments, const Environment& environment)
 {
     int input[2], output[2], errors[2];

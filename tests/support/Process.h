@@ -1,4 +1,4 @@
-// The pieces of a host test: a temporary folder, a process whose output is read as it comes, a player system's socket.
+// The pieces of a host test: a process whose output is read as it comes, a player system's socket.
 // Every wait ends with an event, or fails the test after a minute.
 #pragma once
 
@@ -12,22 +12,6 @@
 
 typedef std::vector<std::string> Lines;
 typedef std::vector<std::pair<std::string, std::string>> Environment;
-
-// Removed with what it holds at the end.
-class Folder {
-public:
-    Folder();
-    ~Folder();
-    Folder(const Folder&) = delete;
-    Folder& operator=(const Folder&) = delete;
-
-    std::string Path(const std::string& name) const { return m_Path + "/" + name; }
-    // Writes a file and returns its path.
-    std::string Write(const std::string& name, const std::string& text) const;
-
-private:
-    std::string m_Path;
-};
 
 // Killed at the end when it still runs.
 class Process {

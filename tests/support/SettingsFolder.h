@@ -1,6 +1,7 @@
 // A folder for settings files and a device key of its own.
 #pragma once
 
+#include <gtest/gtest.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -8,9 +9,9 @@
 #include <string>
 #include <vector>
 
-#include "../foundation/TempFolder.h"
 #include "CfgXMLFile.h"
 #include "Deployment.h"
+#include "TempFolder.h"
 
 class SettingsFolder : public testing::Test {
 protected:
