@@ -70,7 +70,8 @@ private:
         SSL_CTX_set_mode(context, SSL_MODE_AUTO_RETRY);
         // A peer that cuts the connection without a TLS goodbye is told from a whole answer by the answer's length.
         SSL_CTX_set_options(context, SSL_OP_NO_RENEGOTIATION | SSL_OP_IGNORE_UNEXPECTED_EOF);
-        SSL_CTX_set_session_cache_mode(context, SSL_SESS_CACHE_CLIENT);
+        // A transport keeps its last session itself; what the context kept beside it would grow with every connection.
+        SSL_CTX_set_session_cache_mode(context, SSL_SESS_CACHE_OFF);
         SSL_CTX_set1_cert_store(context, authorities);
         SSL_CTX_set_verify(context, SSL_VERIFY_PEER, nullptr);
         X509_VERIFY_PARAM* verify = SSL_CTX_get0_param(context);
