@@ -132,7 +132,7 @@ public:
             Make(service, convert, outcome);
             return ZV_WS_Status_ok;
         });
-        if (guarded != ZV_WS_Status_ok) service.transport().Close();  // left in the middle of something
+        if (guarded != ZV_WS_Status_ok) service.transport().Abandon();
         return Finish(service, outcome);
     }
 

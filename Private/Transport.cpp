@@ -99,10 +99,15 @@ bool Transport::UseHost(const char* url)
     return m_Soap.ctx != nullptr;
 }
 
-void Transport::ForgetTls()
+void Transport::ForgetSession()
 {
     if (m_Soap.session) SSL_SESSION_free(m_Soap.session);
     m_Soap.session = nullptr;
+}
+
+void Transport::ForgetTls()
+{
+    ForgetSession();
     if (m_Soap.ctx) SSL_CTX_free(m_Soap.ctx);
     m_Soap.ctx = nullptr;
 }
@@ -135,7 +140,14 @@ bool Transport::KeptConnectionDied() const
 void Transport::EndExchange(int result)
 {
     const bool leftOver = m_Soap.bufidx < m_Soap.buflen;
+    if (result != SOAP_OK && !KeptConnectionDied()) return Abandon();
     if (result != SOAP_OK || leftOver) Close();
+}
+
+void Transport::Abandon()
+{
+    Close();
+    ForgetSession();
 }
 
 void Transport::Close()
@@ -184,8 +196,7 @@ bool Transport::OpenTls(int socket, const char* host, int port, const Patience& 
 {
     const bool isSame = m_Soap.session && strcmp(m_Soap.session_host, host) == 0 && m_Soap.session_port == port;
     m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, isSame ? m_Soap.session : nullptr, patience);
-    if (m_Soap.session) SSL_SESSION_free(m_Soap.session);
-    m_Soap.session = nullptr;
+    ForgetSession();
     if (!m_Soap.ssl) return false;
     m_Soap.imode |= SOAP_ENC_SSL;
     m_Soap.omode |= SOAP_ENC_SSL;

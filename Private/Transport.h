@@ -68,6 +68,9 @@ public:
     /// Closes the connection at once, without waiting for the peer.
     void Close();
 
+    /// Closes it in the middle of something: its TLS session, which may be as incomplete, is not offered again.
+    void Abandon();
+
     /// Any thread: breaks off the exchange that is under way and lets no other begin. For the end of a session whose
     /// call hangs.
     void Abort() ZV_EXCLUDES(m_AbortMutex);
@@ -89,6 +92,7 @@ private:
     static int HeaderHook(soap* context, const char* key, const char* value);
     static int ShutdownHook(soap* context, SOAP_SOCKET socket, int how);
 
+    void ForgetSession();
     void ForgetTls();
 
     soap& m_Soap;
