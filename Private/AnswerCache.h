@@ -1,11 +1,12 @@
 // A call's way to the session's cache: service answers as compressed text, under the call's name and a key of its
-// arguments. A cache that fails is a miss and never fails a call.
+// arguments. A cache that fails, or finds no memory, is a miss and never fails a call.
 #pragma once
 
 #include <memory>
 #include <string>
 #include <type_traits>
 
+#include "CallGuard.h"
 #include "Serializer.h"
 #include "SessionImpl.h"
 
@@ -44,18 +45,26 @@ public:
     template <class Response>
     bool Find(Response& response)
     {
-        ZVString text;
-        if (!Read(text)) return false;
-        m_Serializer = std::make_unique<Serializer>(true, false);
-        return m_Serializer->Read(text, response);
+        bool found = false;
+        GuardCall([&] {
+            ZVString text;
+            if (!Read(text)) return ZV_WS_Status_ok;
+            m_Serializer = std::make_unique<Serializer>(true, false);
+            found = m_Serializer->Read(text, response);
+            return ZV_WS_Status_ok;
+        });
+        return found;
     }
 
     template <class Response>
     void Store(const Response& response)
     {
         if (!m_Entry.table || !m_Session.Caches(m_Entry.kind)) return;
-        ZVString text;
-        if (Serializer(true, false).Write(response, text)) Write(text);
+        GuardCall([&] {
+            ZVString text;
+            if (Serializer(true, false).Write(response, text)) Write(text);
+            return ZV_WS_Status_ok;
+        });
     }
 
 private:

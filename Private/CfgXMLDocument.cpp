@@ -80,6 +80,7 @@ struct CfgXMLReader {
     bool inValue = false;    // its first value is
     bool hasValue = false;
     bool refused = false;
+    bool exhausted = false;  // memory was short, which the parser does not take for an error in the text
 
     template <class Function>
     void Guard(Function&& function)
@@ -87,6 +88,7 @@ struct CfgXMLReader {
         try {
             function();
         } catch (const std::bad_alloc&) {
+            exhausted = true;
             Refuse();
         }
     }
@@ -156,6 +158,8 @@ struct CfgXMLReader {
         if (depth == 3 && inValue) document.m_Elements.back().value.append(Chars(text), static_cast<size_t>(length));
     }
 
+    void Failed(const xmlError& error) { exhausted = exhausted || error.code == XML_ERR_NO_MEMORY; }
+
     static CfgXMLReader& Of(void* reader) { return *static_cast<CfgXMLReader*>(reader); }
     static xmlSAXHandler Handler();
 };
@@ -175,6 +179,7 @@ xmlSAXHandler CfgXMLReader::Handler()
     };
     handler.cdataBlock = handler.characters;
     handler.ignorableWhitespace = handler.characters;
+    handler.serror = [](void* reader, xmlError* error) { Of(reader).Failed(*error); };
     handler.internalSubset = [](void* reader, const xmlChar*, const xmlChar*, const xmlChar*) { Of(reader).Refuse(); };
     return handler;
 }
@@ -196,7 +201,8 @@ bool CfgXMLDocument::Parse(const ZVString& text)
     // Without XML_PARSE_NOENT an "&" in an attribute would arrive as a reference. There are no entities to expand.
     xmlCtxtReadMemory(parser.get(), text.c_str(), static_cast<int>(text.length()), nullptr, nullptr,
                       XML_PARSE_NOENT | XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING);
-    if (parser->wellFormed && !reader.refused) return true;
+    if (reader.exhausted) throw std::bad_alloc();
+    if (parser->wellFormed && !reader.refused && m_RootEnd > 0) return true;
     m_Elements.clear();
     return false;
 }

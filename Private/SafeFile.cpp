@@ -86,17 +86,14 @@ bool SafeFile::Replace(const ZVString& path, const ZVString& text, mode_t mode)
 {
     const ZVString target = Target(path);
     const ZVString fresh = target + ".new";
-    if (!WriteFlushed(fresh.c_str(), text, mode, target.c_str()) || rename(fresh.c_str(), target.c_str()) != 0) {
-        unlink(fresh.c_str());
-        return false;
-    }
+    const int folder = OpenFolderOf(target);  // before the rename: a failure leaves the old file
+    const bool replaced =
+        WriteFlushed(fresh.c_str(), text, mode, target.c_str()) && rename(fresh.c_str(), target.c_str()) == 0;
+    if (!replaced) unlink(fresh.c_str());
     // The rename reaches the disk with the folder. Where a folder cannot be flushed, the file system sees to it.
-    const int folder = OpenFolderOf(target);
-    if (folder >= 0) {
-        fsync(folder);
-        close(folder);
-    }
-    return true;
+    if (replaced && folder >= 0) fsync(folder);
+    if (folder >= 0) close(folder);
+    return replaced;
 }
 
 SafeFile::FolderLock::FolderLock(const ZVString& path) : m_Folder(OpenFolderOf(Target(path)))

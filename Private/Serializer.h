@@ -1,5 +1,5 @@
 // Service answers as text for the cache, and back: a SOAP context that writes to and reads from a string in place of a
-// connection. A local object of one call on one thread.
+// connection. A local object of one call on one thread. Memory exhaustion may be thrown (std::bad_alloc).
 //
 //     ZVString text;
 //     if (Serializer(true, false).Write(response, text)) cache.WriteMetaData(name, key, text);

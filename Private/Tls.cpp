@@ -38,24 +38,25 @@ public:
         ZVMutexLock lock(m_Mutex);
         SSL_CTX*& context = m_Contexts[{caFile, host}];
         if (!context) context = Make(AuthoritiesLocked(caFile), host);
-        if (context) SSL_CTX_up_ref(context);
+        if (!context) return nullptr;
+        m_Sessions[context];  // here, since Keep must not throw
+        SSL_CTX_up_ref(context);
         return context;
     }
 
-    // Takes the reference.
+    // Takes the reference. The TLS library calls this, too.
     void Keep(SSL_CTX* context, SSL_SESSION* session) ZV_EXCLUDES(m_Mutex)
     {
         ZVMutexLock lock(m_Mutex);
-        SSL_SESSION*& newest = m_Sessions[context];
-        SSL_SESSION_free(newest);
-        newest = session;
+        std::swap(m_Sessions.find(context)->second, session);
+        SSL_SESSION_free(session);
     }
 
     SSL_SESSION* Session(SSL_CTX* context) ZV_EXCLUDES(m_Mutex)
     {
         ZVMutexLock lock(m_Mutex);
-        const auto newest = m_Sessions.find(context);
-        return newest == m_Sessions.end() ? nullptr : SSL_SESSION_dup(newest->second);
+        SSL_SESSION* newest = m_Sessions.find(context)->second;
+        return newest ? SSL_SESSION_dup(newest) : nullptr;
     }
 
 private:
@@ -106,7 +107,7 @@ private:
     ZVMutex m_Mutex;
     std::map<std::string, X509_STORE*> m_Authorities ZV_GUARDED_BY(m_Mutex);
     std::map<std::pair<std::string, std::string>, SSL_CTX*> m_Contexts ZV_GUARDED_BY(m_Mutex);
-    std::map<SSL_CTX*, SSL_SESSION*> m_Sessions ZV_GUARDED_BY(m_Mutex);  // of contexts, which live as long
+    std::map<SSL_CTX*, SSL_SESSION*> m_Sessions ZV_GUARDED_BY(m_Mutex);  // of every context
 };
 
 Contexts& TheContexts()
@@ -145,6 +146,11 @@ SSL_CTX* ContextFor(const ZVString& caFile, const ZVString& host)
 SSL_SESSION* SessionFor(SSL_CTX* context)
 {
     return TheContexts().Session(context);
+}
+
+void ForgetSession(SSL_CTX* context)
+{
+    TheContexts().Keep(context, nullptr);
 }
 
 }  // namespace Tls

@@ -22,4 +22,7 @@ SSL_CTX* ContextFor(const ZVString& caFile, const ZVString& host);
 /// resume: a full handshake costs as much as five calls. The caller owns it. Null before the first.
 SSL_SESSION* SessionFor(SSL_CTX* context);
 
+/// Makes the next connection's handshake a full one.
+void ForgetSession(SSL_CTX* context);
+
 }  // namespace Tls

@@ -184,7 +184,10 @@ bool Transport::OpenTls(int socket, const char* host, const Patience& patience)
     SSL_SESSION* const offered = Tls::SessionFor(m_Soap.ctx);
     m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, offered, patience);
     SSL_SESSION_free(offered);
-    if (!m_Soap.ssl) return false;
+    if (!m_Soap.ssl) {
+        Tls::ForgetSession(m_Soap.ctx);  // perhaps it was what the peer did not like
+        return false;
+    }
     m_Soap.imode |= SOAP_ENC_SSL;
     m_Soap.omode |= SOAP_ENC_SSL;
     return true;

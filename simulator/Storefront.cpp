@@ -2,6 +2,7 @@
 
 #include <arpa/inet.h>
 #include <libxml/parser.h>
+#include <netinet/tcp.h>
 #include <signal.h>
 #include <stdlib.h>
 #include <sys/socket.h>
@@ -272,6 +273,9 @@ void Simulator::Accept(int listener, bool tls)
             return;
         }
         if (descriptor < 0) continue;
+        // An answer would wait up to 40 ms for the peer's word that it has the session tickets sent before.
+        const int on = 1;
+        setsockopt(descriptor, IPPROTO_TCP, TCP_NODELAY, &on, sizeof on);
         const unsigned long number = ++m_Connections;
         m_Open.insert(descriptor);
         Reap();

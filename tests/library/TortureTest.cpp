@@ -1,0 +1,440 @@
+// Memory that runs out at every single allocation of a call, and a disk that is full at every single write.
+//
+// The functions of the C library through which all memory and most writes go, those of shared libraries too, are this
+// program's own: they count what the thread under test does, and let the n-th fail, or all from it on.
+#include <errno.h>
+#include <limits.h>
+#include <openssl/crypto.h>
+#include <signal.h>
+#include <sys/fsuid.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <sys/syscall.h>
+
+#include <functional>
+
+#include "Records.h"
+#include "SessionImpl.h"
+#include "SettingsFolder.h"
+#include "Store.h"
+
+namespace {
+
+struct Counter {
+    int error;
+    bool counts = false, all = false;
+    long made = 0, failAt = 0;
+
+    bool Passes()
+    {
+        if (!counts || ++made < failAt || failAt == 0 || (made > failAt && !all)) return true;
+        errno = error;
+        return false;
+    }
+};
+thread_local Counter t_Memory = {ENOMEM}, t_Disk = {ENOSPC};
+thread_local long t_Blocks = 0;  // made and not freed; on other threads than the one that tests it means nothing
+
+// The result of `call`, in which memory or disk fails. With 0 nothing does.
+template <class Call>
+auto Failing(Counter& counter, long failAt, bool all, Call&& call)
+{
+    counter = {counter.error, true, all, 0, failAt};
+    const auto result = call();
+    counter.counts = false;
+    return result;
+}
+
+void* Made(void* block)
+{
+    t_Blocks += block != nullptr;
+    return block;
+}
+
+bool HasRoom(int file)
+{
+    struct stat entry;
+    return !t_Disk.counts || fstat(file, &entry) != 0 || !S_ISREG(entry.st_mode) || t_Disk.Passes();
+}
+
+}  // namespace
+
+extern "C" {
+void* __libc_malloc(size_t size);
+void* __libc_calloc(size_t count, size_t size);
+void* __libc_realloc(void* block, size_t size);
+void __libc_free(void* block);
+
+void* malloc(size_t size) noexcept
+{
+    return t_Memory.Passes() ? Made(__libc_malloc(size)) : nullptr;
+}
+void* calloc(size_t count, size_t size) noexcept
+{
+    return t_Memory.Passes() ? Made(__libc_calloc(count, size)) : nullptr;
+}
+void* realloc(void* block, size_t size) noexcept
+{
+    if (!t_Memory.Passes()) return nullptr;
+    t_Blocks -= block != nullptr;
+    return Made(__libc_realloc(block, size));
+}
+void free(void* block) noexcept
+{
+    t_Blocks -= block != nullptr;
+    __libc_free(block);
+}
+
+ssize_t write(int file, const void* bytes, size_t size)
+{
+    return HasRoom(file) ? syscall(SYS_write, file, bytes, size) : -1;
+}
+ssize_t pwrite64(int file, const void* bytes, size_t size, off64_t offset)
+{
+    return HasRoom(file) ? syscall(SYS_pwrite64, file, bytes, size, offset) : -1;
+}
+int rename(const char* from, const char* to) noexcept
+{
+    return t_Disk.Passes() ? static_cast<int>(syscall(SYS_rename, from, to)) : -1;
+}
+// Nobody cuts the power here: what is written need not reach the disk.
+int fsync(int file)
+{
+    return HasRoom(file) ? 0 : -1;
+}
+int fdatasync(int file)
+{
+    return fsync(file);
+}
+}
+
+namespace {
+
+namespace fs = std::filesystem;
+
+// A record as text, to compare whole results.
+struct Text {
+    std::string text;
+
+    template <class T>
+    void Member(const char*, T& value)
+    {
+        if constexpr (Records::kIsRecord<T>) {
+            Records::detail::VisitAll(value, *this);
+        } else if constexpr (std::is_same_v<T, char*>) {
+            text += value ? value : "(null)";
+        } else {
+            text += std::to_string(value);
+        }
+        text += "|";
+    }
+    template <class T>
+    void Elements(const char* name, unsigned int& size, T*& elements)
+    {
+        text += name + std::to_string(size) + ":";
+        for (unsigned int i = 0; i < size; ++i)
+            Member(name, elements[i]);
+    }
+};
+
+std::string Content(const std::string& file)
+{
+    std::ostringstream text;
+    text << std::ifstream(file, std::ios::binary).rdbuf();
+    return text.str();
+}
+
+size_t Files(const std::string& folder)
+{
+    return static_cast<size_t>(std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
+}
+
+// A call that can be made again and again; only in `call` something fails.
+struct Case {
+    std::function<void()> prepare;
+    std::function<ZV_WS_Status()> call;
+    std::function<std::string(ZV_WS_Status)> take;  // its result as text, which is freed
+
+    std::string Make() const
+    {
+        const ZV_WS_Status status = call();
+        EXPECT_EQ(ZV_WS_Status_ok, status);
+        return take(status);
+    }
+};
+
+// Fails every allocation of the call up to the `dense`-th, then every `stride`-th. Whatever the call answers, a success
+// is a whole one, nothing leaks, and the next call works.
+void Exhaust(const Case& one, bool all, long dense, long stride)
+{
+    one.prepare();
+    std::string right;
+    for (int i = 0; i < 3; ++i)  // fills what libraries keep for good
+        right = one.Make();
+    int growths = 0;
+    bool came = true;
+    for (long n = 1, blocks = t_Blocks; came; n += growths ? 0 : n < dense ? 1 : stride) {
+        one.prepare();
+        const ZV_WS_Status status = Failing(t_Memory, n, all, one.call);
+        came = t_Memory.made >= n;
+        const std::string result = one.take(status);
+        ASSERT_EQ(status == ZV_WS_Status_ok ? right : result, result) << "allocation " << n;
+        ASSERT_EQ(right, one.Make()) << "allocation " << n;
+        OPENSSL_thread_stop();  // the thread's error texts and random numbers are no leak
+        // Libraries also fill caches on the way, once: only what grows each time is a leak.
+        growths = t_Blocks > blocks ? growths + 1 : 0;
+        ASSERT_LT(growths, 4) << "leak after allocation " << n;
+        blocks = t_Blocks;
+    }
+}
+
+// Calls attempt(n, all) with n = 1, 2, ... as long as it comes to that many writes.
+void AtEachWrite(const std::function<void(long, bool)>& attempt)
+{
+    for (const bool all : {false, true}) {
+        long n = 0;
+        do {
+            attempt(++n, all);
+        } while (t_Disk.made >= n && !testing::Test::HasFailure());
+        EXPECT_GT(n, 3) << "hardly anything was written";
+    }
+}
+
+class Torture : public Store {
+protected:
+    void Begin(unsigned int data)
+    {
+        folder = store->DataFolder() + "/cache";
+        ZV_WS_SetupParams setup = Setup();
+        if (data) setup.CacheParam = {CacheType_File, data, 0, folder.c_str()};
+        ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
+        ASSERT_EQ(ZV_WS_Status_ok, Titles(1));
+        first = Take();
+        ASSERT_NE(std::string::npos, first.find("TitleListing2:")) << first;
+        store->ClearLog();
+    }
+
+    ZV_WS_Status Titles(unsigned int number)
+    {
+        const ZV_WS_Pagination page = Page(number, 2);
+        return ZV_WS_getTitles(&session, 1, &page, PURCHASE_TYPE_ANY, &titles);
+    }
+
+    std::string Take()
+    {
+        Text text;
+        text.Member("", static_cast<ZV_WS_TitlesResponse&>(titles));
+        ZV_WS_release(&titles);
+        return text.text;
+    }
+
+    Case FirstPage(const std::function<void()>& prepare)
+    {
+        return {prepare, [this] { return Titles(1); }, [this](ZV_WS_Status) { return Take(); }};
+    }
+
+    std::string folder, first;
+    Owned<ZV_WS_TitlesResponse> titles;
+};
+
+TEST_F(Torture, ACachedCallWithoutMemory)
+{
+    Begin(ZV_WS_CacheParam::CacheData_Metadata);
+    const Case one = FirstPage([] {});
+    Exhaust(one, false, LONG_MAX, 1);
+    Exhaust(one, true, LONG_MAX, 1);
+}
+
+TEST_F(Torture, ACallOverAKeptConnectionWithoutMemory)
+{
+    Begin(0);
+    const Case one = FirstPage([] {});
+    Exhaust(one, false, LONG_MAX, 1);
+    Exhaust(one, true, LONG_MAX, 1);
+}
+
+// With a full handshake it is some 2600 allocations, and all of them would take half a minute. Those of the request and
+// of opening the connection come first, each of them fails; those of the answer come last, and fail above.
+TEST_F(Torture, ACallOverANewConnectionWithoutMemory)
+{
+    Begin(0);
+    const Case one = FirstPage([this] {
+        Transport& transport = session._pSessionImpl->m_Browse.transport();
+        transport.Close();
+        SSL_SESSION_free(transport.context().session);
+        transport.context().session = nullptr;
+    });
+    Exhaust(one, false, 150, 3);
+    Exhaust(one, true, 1, 17);
+}
+
+// A session that is said to be there has to work. As many allocations as above.
+TEST_F(Torture, ANewSessionWithoutMemory)
+{
+    Begin(0);
+    const ZV_WS_SetupParams setup = Setup();
+    const Case one = {[] {}, [&] { return Initialize(setup); },
+                      [this](ZV_WS_Status status) {
+                          EXPECT_EQ(status, status == ZV_WS_Status_ok ? Titles(1) : status);
+                          ZV_WS_release(&session);
+                          return Take();
+                      }};
+    ZV_WS_release(&session);
+    Exhaust(one, false, 60, 11);
+    Exhaust(one, true, 1, 37);
+}
+
+TEST_F(Torture, AnAnswerThatTheDiskHasNoRoomFor)
+{
+    Begin(ZV_WS_CacheParam::CacheData_Metadata);
+    unsigned int number = 1;
+    AtEachWrite([&](long n, bool all) {
+        ++number;
+        EXPECT_EQ(ZV_WS_Status_ok, Failing(t_Disk, n, all, [&] { return Titles(number); }));
+        const std::string answer = Take();
+        store->ClearLog();
+        EXPECT_EQ(ZV_WS_Status_ok, Titles(1));
+        EXPECT_EQ(first, Take()) << n;
+        EXPECT_TRUE(store->Log().empty()) << "the cache is lost after write " << n;
+        for (int i = 0; i < 2; ++i) {
+            EXPECT_EQ(ZV_WS_Status_ok, Titles(number));
+            EXPECT_EQ(answer, Take()) << n;
+        }
+        EXPECT_LE(store->Log().size(), 1u) << "nothing is cached any more after write " << n;
+        EXPECT_EQ(1u, Files(folder)) << n;
+    });
+}
+
+class TortureImage : public Torture {
+protected:
+    void SetUp() override
+    {
+        Torture::SetUp();
+        Begin(ZV_WS_CacheParam::CacheData_BoxArtImage | ZV_WS_CacheParam::CacheData_Metadata);
+        ASSERT_EQ(ZV_WS_Status_ok, Image("ZV00012"));
+        file = folder + "/ZV00012321.jpg";
+        whole = Content(file);
+        ASSERT_GT(whole.size(), 8192u) << "more than stdio holds back";
+    }
+
+    ZV_WS_Status Image(const char* prefix)
+    {
+        Owned<ZV_WS_String> place;
+        return ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_321, prefix, &place);
+    }
+
+    // No part of an image is left and no temporary file. The database's journal may be, which is the next call's.
+    void Check(ZV_WS_Status status, const std::string& what)
+    {
+        EXPECT_TRUE(status == ZV_WS_Status_ok || status == ZV_WS_Status_file_operation_error) << what << status;
+        EXPECT_EQ(status == ZV_WS_Status_ok ? whole : "", Content(file)) << what;
+        for (const auto& entry : fs::directory_iterator(folder))
+            EXPECT_NE(0u, entry.path().filename().string().rfind("zvws", 0)) << what;
+        EXPECT_EQ(ZV_WS_Status_ok, Image("ZV00012")) << what;
+        EXPECT_EQ(whole, Content(file)) << what;
+        EXPECT_EQ(2u, Files(folder)) << what;
+    }
+
+    std::string file, whole;
+};
+
+TEST_F(TortureImage, TheDiskIsFullAtEachWrite)
+{
+    for (const bool isThere : {false, true}) {
+        AtEachWrite([&](long n, bool all) {
+            if (isThere) {
+                ZV_WS_updateLocalCache(&session, ZV_WS_CacheParam::CacheData_BoxArtImage);
+                Fault("boxart=modified");
+            } else {
+                fs::remove(file);
+            }
+            const ZV_WS_Status status = Failing(t_Disk, n, all, [&] { return Image("ZV00012"); });
+            EXPECT_TRUE(status == ZV_WS_Status_ok || !isThere) << "the old image is lost";
+            Check(status, "write " + std::to_string(n));
+        });
+    }
+}
+
+// stdio's own writes are inside of the C library: here the system has no room from a size on.
+TEST_F(TortureImage, TheDiskIsFullAtEachSize)
+{
+    const auto handler = signal(SIGXFSZ, SIG_IGN);
+    rlimit before;
+    getrlimit(RLIMIT_FSIZE, &before);
+    for (const size_t size : {size_t(0), size_t(1), size_t(4095), size_t(4096), size_t(4097), whole.size() - 1}) {
+        fs::remove(file);
+        const rlimit full = {size, before.rlim_max};
+        setrlimit(RLIMIT_FSIZE, &full);
+        const ZV_WS_Status status = Image("ZV00012");
+        setrlimit(RLIMIT_FSIZE, &before);
+        EXPECT_NE(ZV_WS_Status_ok, status) << size;
+        Check(status, "size " + std::to_string(size));
+    }
+    signal(SIGXFSZ, handler);
+}
+
+// As a user who may not write there: root may anywhere.
+TEST_F(TortureImage, AFolderThatCanOnlyBeRead)
+{
+    const std::string settings = folder + "/settings.xml";
+    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(settings.c_str(), "k", "old", false));
+    const std::string before = Content(settings);
+    fs::permissions(store->DataFolder(), fs::perms(0755));
+    for (const std::string& readable : {settings, file})
+        fs::permissions(readable, fs::perms(0644));
+    fs::permissions(folder, fs::perms(0555));
+    const auto user = static_cast<uid_t>(setfsuid(65534));  // of this thread, for files
+    EXPECT_FALSE(std::ofstream(folder + "/new")) << "this user can write anywhere";
+    EXPECT_EQ(ZV_WS_Status_ok, Image("ZV00012"));
+    EXPECT_EQ(ZV_WS_Status_ok, Titles(1));
+    EXPECT_EQ(first, Take());
+    EXPECT_EQ(1u, store->Log().size()) << "what is cached can be read";
+    EXPECT_EQ(ZV_WS_Status_ok, Titles(2));
+    EXPECT_EQ(ZV_WS_Status_net_error, Image("ZV00013"));
+    EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_writeSetting(settings.c_str(), "k", "new", false));
+    setfsuid(user);
+    EXPECT_EQ(before, Content(settings));
+    EXPECT_EQ(3u, Files(folder)) << "database, image, settings";
+    fs::permissions(folder, fs::perms(0755));
+    EXPECT_EQ(ZV_WS_Status_ok, Image("ZV00013"));
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(settings.c_str(), "k", "new", false));
+}
+
+class TortureSettings : public SettingsFolder {};
+
+TEST_F(TortureSettings, AWriteWithoutMemory)
+{
+    for (const bool isProtected : {false, true}) {
+        ASSERT_EQ(0u, Write("Beside", "stays", true));
+        const Case one = {[&] { ASSERT_EQ(0u, Write("k", "old", isProtected)); },
+                          [&] { return ZV_WS_writeSetting(file.c_str(), "k", "new", isProtected); },
+                          [&](ZV_WS_Status status) {
+                              EXPECT_EQ(3u, Files(folder)) << "settings, device key, deployment";
+                              EXPECT_EQ("0:stays", Reading("Beside", true));
+                              EXPECT_EQ(status == ZV_WS_Status_ok ? "0:new" : "0:old", Reading("k", isProtected));
+                              return std::string();
+                          }};
+        Exhaust(one, false, LONG_MAX, 1);
+        Exhaust(one, true, LONG_MAX, 1);
+    }
+}
+
+TEST_F(TortureSettings, TheDiskIsFullAtEachWrite)
+{
+    for (const bool isProtected : {false, true}) {
+        AtEachWrite([&](long n, bool all) {
+            fs::remove(folder + "/device.key");  // the first protected value makes it
+            ASSERT_EQ(0u, Write("k", "old"));
+            const std::string before = Get(file);
+            const auto write = [&] { return ZV_WS_writeSetting(file.c_str(), "k", "new", isProtected); };
+            const ZV_WS_Status status = Failing(t_Disk, n, all, write);
+            EXPECT_EQ(t_Disk.made < n ? ZV_WS_Status_ok : ZV_WS_Status_file_operation_error, status) << n;
+            EXPECT_EQ(status != ZV_WS_Status_ok, before == Get(file)) << n;
+            EXPECT_EQ(fs::exists(folder + "/device.key") ? 3u : 2u, Files(folder)) << n;
+            EXPECT_EQ(ZV_WS_Status_ok, write()) << n;
+            EXPECT_EQ("0:new", Reading("k", isProtected)) << n;
+        });
+    }
+}
+
+}  // namespace
