@@ -1,17 +1,7 @@
 // Runs the client's process with a movie.
 #pragma once
 
-#include <fstream>
-#include <sstream>
-
 #include "Process.h"
-
-inline std::string FileContents(const std::string& file)
-{
-    std::ostringstream text;
-    text << std::ifstream(file, std::ios::binary).rdbuf();
-    return text.str();
-}
 
 struct MovieOutput {
     int status = -1;  ///< waitpid's.

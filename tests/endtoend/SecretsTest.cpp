@@ -42,7 +42,7 @@ protected:
     {
         const std::string folder = left / "";
         return {{"ZV_DEPLOYMENT", store->DeploymentFile()},
-                {"STAGECRAFT_MOVIE", movies.Write("movie.js", kPrelude + FileContents(ZV_MOVIES "/evening.js"))},
+                {"STAGECRAFT_MOVIE", movies.Write("movie.js", kPrelude + ContentOf(ZV_MOVIES "/evening.js"))},
                 {"STAGECRAFT_FPS", "1000"},
                 {"ZV_LOG", "0x3F00," + target + "," + folder},
                 {"ZV_FLASHVARS", "folder=" + folder + "&cache=" + folder + "cache"}};
@@ -54,7 +54,7 @@ protected:
         for (const std::string& line : ended.Output() + ended.Errors())
             all += line + "\n";
         for (const auto& entry : fs::recursive_directory_iterator(left / "")) {
-            if (entry.is_regular_file()) all += entry.path().string() + "\n" + FileContents(entry.path()) + "\n";
+            if (entry.is_regular_file()) all += entry.path().string() + "\n" + ContentOf(entry.path()) + "\n";
         }
         return all;
     }
@@ -69,7 +69,7 @@ protected:
                                "111111",
                                "GIFT1",
                                "token-" + store->Query("SELECT active FROM account"),
-                               FileContents(store->DataFolder() + "/device.key")};
+                               ContentOf(store->DataFolder() + "/device.key")};
         for (const std::string& secret : secrets) {
             ASSERT_LE(5u, secret.size());
             const size_t at = all.find(secret);

@@ -59,9 +59,9 @@ TEST_F(SettingsCrash, AKilledWriterLosesNoCompletedWrite)
         close(ends[0]);
 
         std::string plain, secret, beside;
-        ASSERT_EQ(0u, Read("Plain", plain)) << Get(file);
-        ASSERT_EQ(0u, Read("Secret", secret, true)) << Get(file);
-        ASSERT_EQ(0u, Read("Beside", beside, true)) << Get(file);
+        ASSERT_EQ(0u, Read("Plain", plain)) << ContentOf(file);
+        ASSERT_EQ(0u, Read("Secret", secret, true)) << ContentOf(file);
+        ASSERT_EQ(0u, Read("Beside", beside, true)) << ContentOf(file);
         ASSERT_EQ("stays", beside);
         const int stored[] = {atoi(secret.c_str()), atoi(plain.c_str())};
         ASSERT_GE(stored[completed % 2], completed);

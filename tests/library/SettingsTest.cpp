@@ -112,7 +112,7 @@ TEST_F(Settings, DocumentsThatAreNoneAreLeftAlone)
         Put(file, row.document);
         EXPECT_EQ(std::to_string(row.result) + ":", Reading("k")) << row.what;
         EXPECT_EQ(row.result, Write("k", "w")) << row.what;
-        EXPECT_TRUE(row.document == Get(file)) << row.what;
+        EXPECT_TRUE(row.document == ContentOf(file)) << row.what;
     }
 }
 
@@ -165,7 +165,7 @@ TEST_F(Settings, AWriteChangesItsElementAndNothingElse)
     for (const auto& row : rows) {
         Put(file, row.before);
         EXPECT_EQ(0u, Write("k", "v")) << row.what;
-        EXPECT_EQ(row.after, Get(file)) << row.what;
+        EXPECT_EQ(row.after, ContentOf(file)) << row.what;
         EXPECT_EQ("0:v", Reading("k")) << row.what;
     }
 }
@@ -192,13 +192,13 @@ TEST_F(Settings, ValuesAndKeysComeBackAsTheyWere)
 TEST_F(Settings, WhatXmlCannotHoldIsRefusedUnlessProtected)
 {
     ASSERT_EQ(0u, Write("k", "before"));
-    const std::string before = Get(file);
+    const std::string before = ContentOf(file);
     const std::string texts[] = {std::string("a\0b", 3), "\x01",        "\x1B[0m", "\xFF", "\xC3",
                                  "\xED\xA0\x80",         "\xEF\xBF\xBF"};
     for (const std::string& text : texts) {
         EXPECT_EQ(6u, Write("k", text));
         EXPECT_EQ(6u, Write("key" + text, "v"));
-        EXPECT_EQ(before, Get(file));
+        EXPECT_EQ(before, ContentOf(file));
         EXPECT_EQ(0u, Write("secret", text, true));
         EXPECT_EQ("0:" + text, Reading("secret", true));
         Put(file, before);
@@ -206,7 +206,7 @@ TEST_F(Settings, WhatXmlCannotHoldIsRefusedUnlessProtected)
     EXPECT_EQ(1u, Write("", "v"));
     EXPECT_EQ(4u, Write("k", std::string(CfgXMLFile::kMaxSize, 'x')));
     EXPECT_EQ(4u, Write("k", std::string(CfgXMLFile::kMaxSize + 1, 'x'), true));
-    EXPECT_EQ(before, Get(file));
+    EXPECT_EQ(before, ContentOf(file));
 }
 
 TEST_F(Settings, ALargestFileIsReadAndCanBeChanged)
@@ -229,7 +229,7 @@ TEST_F(Settings, ADocumentIsASerializedRecord)
     ASSERT_EQ(0u, Write("a", "3\n"));
     Serializer serializer(false, false);
     ZV1__ArrayOfConfigurationItemOfString record;
-    ASSERT_TRUE(serializer.Read(Bytes(Get(file)), record));
+    ASSERT_TRUE(serializer.Read(Bytes(ContentOf(file)), record));
     ASSERT_EQ(2, record.__sizeConfiguration);
     EXPECT_STREQ("a", record.Configuration[0]->Key);
     EXPECT_STREQ("3\n", record.Configuration[0]->Value);
@@ -271,7 +271,7 @@ TEST_F(Settings, AProtectedValueShowsNothingAndIsNeverTheSameTwice)
 {
     ASSERT_EQ(0u, Write("k", "a secret token", true));
     const std::string first = Reading("k");
-    EXPECT_EQ(std::string::npos, Get(file).find("secret"));
+    EXPECT_EQ(std::string::npos, ContentOf(file).find("secret"));
     EXPECT_EQ("0:0040", first.substr(0, 6));
     ASSERT_EQ(0u, Write("k", "a secret token", true));
     EXPECT_NE(first, Reading("k"));
@@ -306,7 +306,7 @@ TEST_F(Settings, AProtectedValueNeedsItsDevicesKey)
 {
     ASSERT_EQ(0u, Write("k", "v", true));
     const std::string key = folder + "device.key";
-    const std::string right = Get(key);
+    const std::string right = ContentOf(key);
     EXPECT_EQ(EVPCipher::kDeviceKeySize, right.size());
     const struct {
         std::string key;
@@ -321,7 +321,7 @@ TEST_F(Settings, AProtectedValueNeedsItsDevicesKey)
         Put(key, row.key);
         EXPECT_EQ(row.reading, Reading("k", true));
         EXPECT_EQ(row.written, Write("other", "v", true));
-        EXPECT_EQ(row.key, Get(key));
+        EXPECT_EQ(row.key, ContentOf(key));
     }
     ASSERT_EQ(0, unlink(key.c_str()));
     EXPECT_EQ("7:", Reading("k", true));
@@ -358,14 +358,14 @@ TEST_F(Settings, PackedTextsCarryBothParts)
 TEST_F(Settings, AFullDiskKeepsTheOldDocument)
 {
     ASSERT_EQ(0u, Write("k", std::string(5000, 'v')));
-    const std::string before = Get(file);
+    const std::string before = ContentOf(file);
     EXPECT_EQ(4, Wait(Fork([&] {
                   signal(SIGXFSZ, SIG_IGN);
                   const rlimit limit = {4096, 4096};
                   setrlimit(RLIMIT_FSIZE, &limit);
                   return static_cast<int>(Write("j", "w"));
               })));
-    EXPECT_EQ(before, Get(file));
+    EXPECT_EQ(before, ContentOf(file));
     EXPECT_FALSE(std::filesystem::exists(file + ".new"));
     EXPECT_EQ(0u, Write("j", "w"));
 }
@@ -373,16 +373,16 @@ TEST_F(Settings, AFullDiskKeepsTheOldDocument)
 TEST_F(Settings, AFolderThatTakesNoFileKeepsTheOldDocument)
 {
     ASSERT_EQ(0u, Write("k", "v"));
-    const std::string before = Get(file);
+    const std::string before = ContentOf(file);
     std::filesystem::create_directory(file + ".new");  // stops everyone, root too
     EXPECT_EQ(4u, Write("k", "w"));
-    EXPECT_EQ(before, Get(file));
+    EXPECT_EQ(before, ContentOf(file));
     std::filesystem::remove(file + ".new");
 
     Put(folder + "other", "untouched");
     ASSERT_EQ(0, symlink("other", (file + ".new").c_str()));
     EXPECT_EQ(4u, Write("k", "w")) << "a link that someone else has put there is not followed";
-    EXPECT_EQ("untouched", Get(folder + "other"));
+    EXPECT_EQ("untouched", ContentOf(folder + "other"));
     EXPECT_EQ(0u, Write("k", "w")) << "and does not stay";
 }
 

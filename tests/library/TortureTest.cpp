@@ -17,6 +17,7 @@
 #include "SessionImpl.h"
 #include "SettingsFolder.h"
 #include "Store.h"
+#include "Tls.h"
 
 namespace {
 
@@ -137,13 +138,6 @@ struct Text {
     }
 };
 
-std::string Content(const std::string& file)
-{
-    std::ostringstream text;
-    text << std::ifstream(file, std::ios::binary).rdbuf();
-    return text.str();
-}
-
 size_t Files(const std::string& folder)
 {
     return static_cast<size_t>(std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
@@ -261,8 +255,7 @@ TEST_F(Torture, ACallOverANewConnectionWithoutMemory)
     const Case one = FirstPage([this] {
         Transport& transport = session._pSessionImpl->m_Browse.transport();
         transport.Close();
-        SSL_SESSION_free(transport.context().session);
-        transport.context().session = nullptr;
+        Tls::ForgetSession(transport.context().ctx);
     });
     Exhaust(one, false, 150, 3);
     Exhaust(one, true, 1, 17);
@@ -313,7 +306,7 @@ protected:
         Begin(ZV_WS_CacheParam::CacheData_BoxArtImage | ZV_WS_CacheParam::CacheData_Metadata);
         ASSERT_EQ(ZV_WS_Status_ok, Image("ZV00012"));
         file = folder + "/ZV00012321.jpg";
-        whole = Content(file);
+        whole = ContentOf(file);
         ASSERT_GT(whole.size(), 8192u) << "more than stdio holds back";
     }
 
@@ -327,11 +320,11 @@ protected:
     void Check(ZV_WS_Status status, const std::string& what)
     {
         EXPECT_TRUE(status == ZV_WS_Status_ok || status == ZV_WS_Status_file_operation_error) << what << status;
-        EXPECT_EQ(status == ZV_WS_Status_ok ? whole : "", Content(file)) << what;
+        EXPECT_EQ(status == ZV_WS_Status_ok ? whole : "", ContentOf(file)) << what;
         for (const auto& entry : fs::directory_iterator(folder))
             EXPECT_NE(0u, entry.path().filename().string().rfind("zvws", 0)) << what;
         EXPECT_EQ(ZV_WS_Status_ok, Image("ZV00012")) << what;
-        EXPECT_EQ(whole, Content(file)) << what;
+        EXPECT_EQ(whole, ContentOf(file)) << what;
         EXPECT_EQ(2u, Files(folder)) << what;
     }
 
@@ -378,7 +371,7 @@ TEST_F(TortureImage, AFolderThatCanOnlyBeRead)
 {
     const std::string settings = folder + "/settings.xml";
     ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(settings.c_str(), "k", "old", false));
-    const std::string before = Content(settings);
+    const std::string before = ContentOf(settings);
     fs::permissions(store->DataFolder(), fs::perms(0755));
     for (const std::string& readable : {settings, file})
         fs::permissions(readable, fs::perms(0644));
@@ -393,7 +386,7 @@ TEST_F(TortureImage, AFolderThatCanOnlyBeRead)
     EXPECT_EQ(ZV_WS_Status_net_error, Image("ZV00013"));
     EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_writeSetting(settings.c_str(), "k", "new", false));
     setfsuid(user);
-    EXPECT_EQ(before, Content(settings));
+    EXPECT_EQ(before, ContentOf(settings));
     EXPECT_EQ(3u, Files(folder)) << "database, image, settings";
     fs::permissions(folder, fs::perms(0755));
     EXPECT_EQ(ZV_WS_Status_ok, Image("ZV00013"));
@@ -425,11 +418,11 @@ TEST_F(TortureSettings, TheDiskIsFullAtEachWrite)
         AtEachWrite([&](long n, bool all) {
             fs::remove(folder + "/device.key");  // the first protected value makes it
             ASSERT_EQ(0u, Write("k", "old"));
-            const std::string before = Get(file);
+            const std::string before = ContentOf(file);
             const auto write = [&] { return ZV_WS_writeSetting(file.c_str(), "k", "new", isProtected); };
             const ZV_WS_Status status = Failing(t_Disk, n, all, write);
             EXPECT_EQ(t_Disk.made < n ? ZV_WS_Status_ok : ZV_WS_Status_file_operation_error, status) << n;
-            EXPECT_EQ(status != ZV_WS_Status_ok, before == Get(file)) << n;
+            EXPECT_EQ(status != ZV_WS_Status_ok, before == ContentOf(file)) << n;
             EXPECT_EQ(fs::exists(folder + "/device.key") ? 3u : 2u, Files(folder)) << n;
             EXPECT_EQ(ZV_WS_Status_ok, write()) << n;
             EXPECT_EQ("0:new", Reading("k", isProtected)) << n;

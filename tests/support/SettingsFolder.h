@@ -5,7 +5,6 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -28,13 +27,6 @@ protected:
     static void Put(const std::string& path, const std::string& text)
     {
         std::ofstream(path, std::ios::binary | std::ios::trunc) << text;
-    }
-
-    static std::string Get(const std::string& path)
-    {
-        std::ostringstream text;
-        text << std::ifstream(path, std::ios::binary).rdbuf();
-        return text.str();
     }
 
     static ZVString Bytes(const std::string& text) { return ZVString(text.data(), text.size()); }

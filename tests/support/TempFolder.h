@@ -1,4 +1,4 @@
-// A folder of a test's own, removed with everything in it when the test ends.
+// Files of tests, and a folder of a test's own, which is removed with everything in it when the test ends.
 #pragma once
 
 #include <stdlib.h>
@@ -7,6 +7,12 @@
 #include <fstream>
 #include <iterator>
 #include <string>
+
+inline std::string ContentOf(const std::string& file)
+{
+    std::ifstream stream(file, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(stream), {});
+}
 
 class TempFolder {
 public:
@@ -32,11 +38,7 @@ public:
         std::ofstream(m_Path + name, std::ios::binary) << content;
         return m_Path + name;
     }
-    std::string Read(const std::string& name) const
-    {
-        std::ifstream file(m_Path + name, std::ios::binary);
-        return std::string(std::istreambuf_iterator<char>(file), {});
-    }
+    std::string Read(const std::string& name) const { return ContentOf(m_Path + name); }
     bool Has(const std::string& name) const { return std::filesystem::exists(m_Path + name); }
 
 private:

@@ -1,5 +1,5 @@
 // The media player's stand-in, its script class in a movie.
-#include "HostLines.h"
+#include "Process.h"
 #include "TempFolder.h"
 
 namespace {
