@@ -112,7 +112,7 @@ bool ZVThread::Run(const char* /*name*/, void (*function)(void*), void* argument
     const bool running = pthread_create(&started, &attributes, Impl::EntryPoint, owned.get()) == 0;
     pthread_attr_destroy(&attributes);
     if (!running) return false;
-    owned.release();  // the thread's now
+    static_cast<void>(owned.release());  // the thread's now
     m_Impl->m_Thread = started;
     return true;
 }

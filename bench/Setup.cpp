@@ -25,7 +25,7 @@ std::string TextOf(const std::string& file)
 std::string NewBundle(const TemporaryFolder& folder)
 {
     static int s_count = 0;
-    const std::string name = folder.Path() + std::string("/ca") + std::to_string(++s_count) + ".pem";
+    std::string name = folder.Path() + std::string("/ca") + std::to_string(++s_count) + ".pem";
     std::ofstream(name) << TextOf(kSystemBundle) << TextOf(TheStore().DataFolder() + "/ca.pem");
     return name;
 }

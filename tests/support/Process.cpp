@@ -51,7 +51,7 @@ Lines Variables(const Environment& environment)
         if (!isTheirs(*own)) variables.emplace_back(*own);
     }
     for (const auto& [name, value] : environment)
-        variables.push_back(name + "=" + value);
+        variables.emplace_back(name).append("=").append(value);
     return variables;
 }
 

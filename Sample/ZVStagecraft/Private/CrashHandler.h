@@ -5,7 +5,7 @@
 
 /// What the handler does after the report of a fatal signal: true gives the signal back to the action from before
 /// start-up, which leaves a core file where those are enabled; false stops the process for inspection.
-extern volatile bool _EN_CORE_DUMP;  // NOLINT(bugprone-reserved-identifier)
+extern volatile bool _EN_CORE_DUMP;
 
 /// Installs the handlers, for all threads. Once, first thing in the process, main thread.
 void zv_dbg_init();

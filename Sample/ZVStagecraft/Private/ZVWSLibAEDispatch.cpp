@@ -51,7 +51,7 @@ void ZVWSLibAE::State::RunThread(const char* name, void (*function)(void*), void
     m_FlashIdle = false;
     m_NeedPrefetchTitles = false;
     m_Thread = ZVThread::CreateThread();
-    ZV_ASSERT(m_Thread != 0);  // NOLINT(modernize-use-nullptr): the text of the failure
+    ZV_ASSERT(m_Thread != 0);
     if (m_Thread->Run(name, function, param)) {
         object.StartUpdates();
         return;
