@@ -22,7 +22,7 @@ template <class From, class To>
 void CopyElements(int count, From* from, unsigned int& size, To*& to)
 {
     Records::Allocate(size, to, from && count > 0 ? count : 0);
-    for (unsigned int i = 0; i < size; ++i) {
+    for (unsigned int i = 0; from && i < size; ++i) {
         if constexpr (!Records::kIsRecord<To>) {
             Copy(from[i], to[i]);
         } else if (from[i]) {

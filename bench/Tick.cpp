@@ -43,7 +43,7 @@ void RunMovie(const TemporaryFolder& cache)
     setenv("ZV_BENCH_CACHE", cache.Path(), 1);
     const char* arguments[] = {"zv_bench", ""};
     IStagecraft* runtime = IStagecraft::InitializeStagecraftLibrary(2, arguments);
-    Check(runtime != nullptr, "the script runtime");
+    if (!runtime) return Check(false, "the script runtime");
     runtime->RegisterExtensionClass<TimedWSLib>();
     AEArray<StageWindow*> windows;
     runtime->CreateAndConfigureStageWindowSet(windows, 2, arguments, 1);

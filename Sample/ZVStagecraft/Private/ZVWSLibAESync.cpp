@@ -193,7 +193,7 @@ unsigned int NumberOf(const ZVString& text)
 ZVString NextField(ZVString& text)
 {
     const size_t comma = text.find(',');
-    const ZVString field = text.substr(0, comma);
+    ZVString field = text.substr(0, comma);
     text = comma == ZVString::npos ? ZVString() : text.substr(comma + 1);
     return field;
 }
