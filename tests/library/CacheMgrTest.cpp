@@ -264,6 +264,7 @@ TEST_F(CacheMgrTest, EvictsTheTenOldestImagesWithAllSizesOfTheirTitles)
         "UPDATE BoxArt SET TS = '2001-01-' || printf('%02d', 1 + CAST(substr(Prefix, 2) AS INTEGER));"
         "UPDATE BoxArt SET TS = '2002-01-01' WHERE Prefix = 'T0_' AND Dim <> 6");
 
+    std::filesystem::remove(m_Folder / "T5_135.jpg");  // somebody else has
     EXPECT_TRUE(m_Cache.WriteBoxArt("N_", BOX_ART_SIZE_95, 1, "", 0, ""));
     EXPECT_EQ("N_ T10_ T11_ ", CacheFile(m_Path).Query("SELECT Prefix FROM BoxArt ORDER BY Prefix"));
     for (int i = 0; i < 12; ++i)
@@ -457,17 +458,6 @@ TEST_F(CacheMgrTest, ADatabaseThatBreaksWhileInUseIsFalse)
     }
     m_Folder.Write("cache.zv", whole);
     EXPECT_TRUE(Has(kService, "k")) << "the damage was the file's, not the object's";
-
-    const std::string folder = m_Folder / "inner";
-    ASSERT_TRUE(std::filesystem::create_directory(folder));
-    m_Path = folder + "/cache.zv";
-    Open(CacheType_File);
-    EXPECT_TRUE(Put(kService, "k", 1));
-    std::filesystem::rename(folder, m_Folder / "away");
-    ExpectAll(m_Cache, 0, "folder gone");
-    EXPECT_FALSE(Has(kService, "k"));
-    std::filesystem::rename(m_Folder / "away", folder);
-    EXPECT_TRUE(Has(kService, "k"));
 }
 
 }  // namespace

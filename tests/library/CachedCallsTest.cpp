@@ -47,18 +47,6 @@ protected:
     std::string folder;
 };
 
-using Call = std::function<ZV_WS_Status(ZV_WS_Session*)>;
-
-template <class... Parameters, class... Arguments>
-Call Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), Arguments... arguments)
-{
-    using Output = std::remove_pointer_t<std::tuple_element_t<sizeof...(Arguments), std::tuple<Parameters...>>>;
-    return [=](ZV_WS_Session* session) {
-        Owned<Output> record;
-        return call(session, arguments..., &record);
-    };
-}
-
 // All sixteen caching calls: the second time nothing is sent, whatever kind of cache it is.
 TEST_F(Cached, TheSecondTimeNothingIsSent)
 {
@@ -128,13 +116,12 @@ TEST_F(Cached, WishlistChangesMakeItsPagesStale)
     };
     EXPECT_EQ(3, items());
     EXPECT_FALSE(wished(50));
-    Owned<ZV_WS_StandardResponse> answers[3];
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_addItemToWishlist(&session, 50, &answers[0]));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_addItemToWishlist, 50)(&session));
     store->ClearLog();
     EXPECT_TRUE(wished(50));  // from the flag
     EXPECT_TRUE(store->Log().empty());
     EXPECT_EQ(4, items());
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_removeItemFromWishlist(&session, 50, &answers[1]));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_removeItemFromWishlist, 50)(&session));
     const int titles[] = {50, 7, 19};
     for (const size_t requests : {2u, 2u}) {  // a walk through the list and the pages above; then flags alone
         Owned<ZV_WS_TitlesInWishlist> flags;
@@ -143,7 +130,7 @@ TEST_F(Cached, WishlistChangesMakeItsPagesStale)
                   std::vector<bool>(flags.IsAvailInUserWishlist, flags.IsAvailInUserWishlist + 3));
         EXPECT_LE(store->Log().size(), requests + 1);
     }
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_removeAllItemsFromWishlist(&session, &answers[2]));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_removeAllItemsFromWishlist)(&session));
     EXPECT_FALSE(wished(7));
     EXPECT_EQ(0, items());
 }
@@ -178,8 +165,7 @@ TEST_F(Cached, DuplicatesShareAFileAndNotTheMemory)
         Listing();
         ZV_WS_Session copy;
         ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
-        Owned<ZV_WS_TitleListingResponse> listing;
-        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getTitleListing(&copy, 12, &listing));
+        EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getTitleListing, 12)(&copy));
         EXPECT_EQ(type == CacheType_File ? 1u : 2u, store->Log().size());
         ZV_WS_release(&copy);
     }
@@ -328,10 +314,8 @@ TEST_F(BoxArt, PrefixesThatLeaveTheFolderAreRefused)
     ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
     for (const char* prefix : {"", "../evil", "a/b", "a\\b", "..", "a\nb"}) {
         SCOPED_TRACE(prefix);
-        Owned<ZV_WS_Image> image;
-        Owned<ZV_WS_String> place;
-        EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getBoxArtImageData(&session, BOX_ART_SIZE_95, prefix, &image));
-        EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, prefix, &place));
+        EXPECT_EQ(ZV_WS_Status_invalid_param, Asking(ZV_WS_getBoxArtImageData, BOX_ART_SIZE_95, prefix)(&session));
+        EXPECT_EQ(ZV_WS_Status_invalid_param, Asking(ZV_WS_getBoxArtImage, BOX_ART_SIZE_95, prefix)(&session));
     }
     EXPECT_TRUE(store->Log().empty());
 }

@@ -1,7 +1,5 @@
 // The calls against the simulator, whose checks hold the requests' form: those that no movie makes, and of the others
 // what a movie that is answered well (tests/endtoend/MethodsTest.cpp) does not show.
-#include <functional>
-
 #include "Store.h"
 
 namespace {
@@ -68,12 +66,11 @@ TEST_F(Calls, OfTheAccount)
     OK(ZV_WS_getBillingInfoAndPPCBalance(&session, &both));
     EXPECT_STREQ("Visa", both.BillingInfo.CCType);
     EXPECT_EQ(Number("SELECT prepaid FROM account"), both.PPCardBalance.Balance);
-    Owned<ZV_WS_StandardResponse> answers[4];
-    EXPECT_EQ(ZV_WS_Status_general_error, ZV_WS_removeAllMyPurchases(&session, "wrong", &answers[0]));
-    OK(ZV_WS_removeAllMyPurchases(&session, StorefrontAccount::kPassword, &answers[1]));
+    EXPECT_EQ(ZV_WS_Status_general_error, Asking(ZV_WS_removeAllMyPurchases, "wrong")(&session));
+    OK(Asking(ZV_WS_removeAllMyPurchases, StorefrontAccount::kPassword)(&session));
     EXPECT_EQ(0, Number("SELECT COUNT(*) FROM pass"));
-    OK(ZV_WS_returnTimeout(&session, &answers[2]));
-    OK(ZV_WS_returnError(&session, &answers[3]));
+    OK(Asking(ZV_WS_returnTimeout)(&session));
+    OK(Asking(ZV_WS_returnError)(&session));
     EXPECT_EQ("timeout,error", store->Query("SELECT group_concat(kind) FROM report"));
 }
 
@@ -95,8 +92,7 @@ TEST_F(Calls, TheAccessTypeChoosesTheService)
     };
     for (const auto& row : rows) {
         Begin(row.type);
-        Owned<ZV_WS_ConfigResponse> config;
-        OK(ZV_WS_getConfig(&session, &config));
+        OK(Asking(ZV_WS_getConfig)(&session));
         Owned<ZV_WS_MyVideosResponse> videos;
         OK(ZV_WS_getMyVideos(&session, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, WATCH_STATUS_UNDEFINED,
                              &videos));
@@ -106,8 +102,7 @@ TEST_F(Calls, TheAccessTypeChoosesTheService)
         EXPECT_TRUE(flag);
         OK(ZV_WS_checkForPurchasedSku(&session, 240, &flag));
         EXPECT_TRUE(flag);
-        Owned<ZV_WS_WishlistItemsResponse> items;
-        OK(ZV_WS_getWishlistItems(&session, SORT_ORDER_TITLENAME, &page, TITLE_TYPE_FILTER_ANY, &items));
+        OK(Asking(ZV_WS_getWishlistItems, SORT_ORDER_TITLENAME, &page, TITLE_TYPE_FILTER_ANY)(&session));
         int country = 0;
         OK(ZV_WS_getCountryID(&session, &country));
         std::vector<std::string> asked;
@@ -138,11 +133,9 @@ TEST_F(Calls, TheTokenIsTheSessions)
         return valid;
     };
     EXPECT_FALSE(isValid());
-    Owned<ZV_WS_AuthorizeDeviceResponse> device;
-    OK(ZV_WS_authorizeDevice(&session, StorefrontAccount::kActivationPin, &device));
+    OK(Asking(ZV_WS_authorizeDevice, StorefrontAccount::kActivationPin)(&session));
     EXPECT_TRUE(isValid());
-    Owned<ZV_WS_StandardResponse> answer;
-    OK(ZV_WS_deactivateDevice(&session, &answer));
+    OK(Asking(ZV_WS_deactivateDevice)(&session));
     EXPECT_FALSE(isValid());
     Owned<ZV_WS_CheckAdultVerificationPinResponse> verified;
     OK(ZV_WS_checkAdultVerificationPin(&session, 43, &verified));
@@ -151,73 +144,52 @@ TEST_F(Calls, TheTokenIsTheSessions)
 
 TEST_F(Calls, RefusalCodesHaveTheirStatus)
 {
-    const auto purchase = [this] {
-        Owned<ZV_WS_PurchaseResponse> record;
-        return ZV_WS_doPurchaseSavedBilling(&session, 120, "", false, &record);
-    };
-    const auto billing = [this] {
-        Owned<ZV_WS_BillingInfoResponse> record;
-        return ZV_WS_getBillingInfo(&session, &record);
-    };
-    const auto gift = [this] {
-        Owned<ZV_WS_GiftCertificateResponse> record;
-        return ZV_WS_assignGiftCertificateToUser(&session, "x", &record);
-    };
-    const auto tax = [this] {
-        Owned<ZV_WS_CalcOrderTaxResponse> record;
-        return ZV_WS_calcOrderTax(&session, 1, &record);
-    };
-    const auto device = [this] {
-        Owned<ZV_WS_AuthorizeDeviceResponse> record;
-        return ZV_WS_authorizeDevice(&session, "1", &record);
-    };
+    const Call purchase = Asking(ZV_WS_doPurchaseSavedBilling, 120, "", false);
     const struct {
         const char* operation;
-        std::function<ZV_WS_Status()> call;
+        Call call;
         std::vector<int> statuses;  // of response codes 1, 2, ...
     } rows[] = {
         {"doPurchaseSavedbilling", purchase, {-1007, -1008, -1009, -1010, -1011, -1012, -1013, -1014,
                                               -1015, -1016, -1017, -1018, -1004, -1004, -1004, -1004,
                                               -1004, -1004, -1004, -1028, -1021, -1022, -1004}},
-        {"authorizeDevice", device, {ZV_WS_Status_invalid_pin, ZV_WS_Status_device_locked_out, -1004}},
-        {"getBillingInfo", billing, {-1008, -1017, -1011, -1012, -1004}},
-        {"assignGiftCertificateToUser", gift, {-1019, -1020, -1004}},
-        {"calcOrderTax", tax, {-1023, -1024, -1025, -1004, -1004, -1004, -1004, -1004, -1004, -1004, -1026,
-                               -1027, -1004, -1004, -1004, -1004, -1004, -1004, -1004, -1028, -1004}},
+        {"authorizeDevice",
+         Asking(ZV_WS_authorizeDevice, "1"),
+         {ZV_WS_Status_invalid_pin, ZV_WS_Status_device_locked_out, -1004}},
+        {"getBillingInfo", Asking(ZV_WS_getBillingInfo), {-1008, -1017, -1011, -1012, -1004}},
+        {"assignGiftCertificateToUser", Asking(ZV_WS_assignGiftCertificateToUser, "x"), {-1019, -1020, -1004}},
+        {"calcOrderTax", Asking(ZV_WS_calcOrderTax, 1), {-1023, -1024, -1025, -1004, -1004, -1004, -1004,
+                                                         -1004, -1004, -1004, -1026, -1027, -1004, -1004,
+                                                         -1004, -1004, -1004, -1004, -1004, -1028, -1004}},
     };
     for (const auto& row : rows) {
         for (size_t i = 0; i < row.statuses.size(); ++i) {
             Fault(std::string(row.operation) + "=code:" + std::to_string(i + 1));
-            EXPECT_EQ(row.statuses[i], row.call()) << row.operation << " code " << i + 1;
+            EXPECT_EQ(row.statuses[i], row.call(&session)) << row.operation << " code " << i + 1;
         }
     }
     const int passes = Number("SELECT COUNT(*) FROM pass");
     Fault("doPurchaseSavedbilling=code:6");
-    purchase();
+    purchase(&session);
     EXPECT_EQ(passes, Number("SELECT COUNT(*) FROM pass"));
 }
 
 TEST_F(Calls, WrongArgumentsSendNothing)
 {
     const ZV_WS_Pagination page = Page(1, 1);
-    Owned<ZV_WS_TitlesResponse> titles;
-    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getTitles(&session, 1, nullptr, 2, &titles));
-    Owned<ZV_WS_TitlesResponseArray> pages;
-    EXPECT_EQ(ZV_WS_Status_invalid_param,
-              ZV_WS_getTitlesByGenreIDs(&session, nullptr, 2, &page, PURCHASE_TYPE_ANY, &pages));
-    Owned<ZV_WS_StandardResponse> answer, managed;
-    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_removeAllMyPurchases(&session, "", &answer));
-    Owned<ZV_WS_AuthorizeDeviceResponse> device;
-    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_authorizeDevice(&session, nullptr, &device));
-    Owned<ZV_WS_TitlesInWishlist> flags;
-    EXPECT_EQ(ZV_WS_Status_invalid_param,
-              ZV_WS_checkTitlesInWishlist(&session, nullptr, 1, TITLE_TYPE_FILTER_ANY, &flags));
-    EXPECT_EQ(ZV_WS_Status_invalid_param,
-              ZV_WS_manageStreamingInstanceStatus(&session, "", STREAM_STATUS_PLAY, 0, &managed));
+    const Call calls[] = {
+        Asking(ZV_WS_getTitles, 1, nullptr, 2),
+        Asking(ZV_WS_getTitlesByGenreIDs, nullptr, 2, &page, PURCHASE_TYPE_ANY),
+        Asking(ZV_WS_removeAllMyPurchases, ""),
+        Asking(ZV_WS_authorizeDevice, nullptr),
+        Asking(ZV_WS_checkTitlesInWishlist, nullptr, 1, TITLE_TYPE_FILTER_ANY),
+        Asking(ZV_WS_manageStreamingInstanceStatus, "", STREAM_STATUS_PLAY, 0),
+    };
+    for (size_t i = 0; i < std::size(calls); ++i)
+        EXPECT_EQ(ZV_WS_Status_invalid_param, calls[i](&session)) << i;
     EXPECT_TRUE(store->Log().empty());
     // Enumerations outside of their lists go to the service as numbers, which refuses them.
-    Owned<ZV_WS_TitlesResponse> odd;
-    EXPECT_NE(ZV_WS_Status_ok, ZV_WS_getTitles(&session, 1, &page, 9, &odd));
+    EXPECT_NE(ZV_WS_Status_ok, Asking(ZV_WS_getTitles, 1, &page, 9)(&session));
     EXPECT_EQ(std::vector<std::string>{"getTitlesByNavigation!"}, Asked());
 }
 
@@ -263,8 +235,7 @@ TEST_F(Calls, Bandwidth)
     OK(ZV_WS_checkBandwidth(&session, &rate));
     EXPECT_EQ((std::vector<std::string>{"getConfig", "bandwidth", "bandwidth"}), Asked());
     // The connection that SOAP kept is whole afterwards.
-    Owned<ZV_WS_ConfigResponse> config;
-    OK(ZV_WS_getConfig(&session, &config));
+    OK(Asking(ZV_WS_getConfig)(&session));
 }
 
 TEST_F(Calls, BandwidthAddress)

@@ -63,8 +63,7 @@ TEST_F(Session, DiscoveryAsksTheDeviceEnvironment)
     EXPECT_EQ(std::make_pair(std::string("user-agent"), std::string("ZVWSLib")), log[0].headers[0]);
     EXPECT_EQ("host", log[0].headers[1].first);
 
-    Owned<ZV_WS_FileType> type;
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getFileType(&session, &type));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getFileType)(&session));
     EXPECT_EQ("ZVSDK: F|A ZVMODEL:X1", Header(store->Log().back(), "user-agent"));
 }
 
@@ -99,8 +98,7 @@ TEST_F(Session, NamedEnvironmentsNeedNoDiscovery)
         ZV_WS_SetupParams setup = Setup();
         setup.EnvNum = env;
         ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
-        Owned<ZV_WS_GenreArray> genres;
-        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getNavigation(&session, &genres));
+        EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getNavigation)(&session));
         ZV_WS_release(&session);
     }
     for (const LoggedRequest& request : store->Log())
@@ -124,8 +122,7 @@ TEST_F(Session, OldTlsIsRefused)
     ZV_WS_SetupParams setup = Setup();
     setup.EnvNum = ENVNUM_PRODUCTION;  // without discovery
     ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
-    Owned<ZV_WS_GenreArray> genres;
-    EXPECT_EQ(-5030, ZV_WS_getNavigation(&session, &genres));
+    EXPECT_EQ(-5030, Asking(ZV_WS_getNavigation)(&session));
     EXPECT_TRUE(store->Log().empty());
 }
 

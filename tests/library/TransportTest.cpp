@@ -70,10 +70,8 @@ TEST_F(Transport, AHostSeesOneFullHandshake)
     for (ZV_WS_Session& copy : copies)
         ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
     for (ZV_WS_Session* each : {&session, &copies[0], &copies[1]}) {
-        Owned<ZV_WS_TitleListingResponse> listing;
-        Owned<ZV_WS_EmailAddressResponse> address;
-        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getTitleListing(each, 12, &listing));
-        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getEmailAddress(each, &address));
+        EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getTitleListing, 12)(each));
+        EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getEmailAddress)(each));
     }
     std::set<unsigned long> connections, resumed;
     for (const LoggedRequest& request : store->Log()) {
@@ -102,14 +100,11 @@ TEST_F(Transport, ConnectionsLeaveNoSessionsInTheirContext)
 
 TEST_F(Transport, WhatChangesSomethingIsSentOnce)
 {
-    Owned<ZV_WS_ConfigResponse> config;
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getConfig(&session, &config));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getConfig)(&session));
     store->ClearLog();
     Fault("doPurchaseSavedbilling=cut,after");
-    Owned<ZV_WS_PurchaseResponse> purchase;
-    const int passes = Number("SELECT COUNT(*) FROM pass");
-    EXPECT_EQ(ZV_WS_Status_timeout_error, ZV_WS_doPurchaseSavedBilling(&session, Number("SELECT MIN(sku) FROM product"),
-                                                                       "10.0.0.1", false, &purchase));
+    const int passes = Number("SELECT COUNT(*) FROM pass"), sku = Number("SELECT MIN(sku) FROM product");
+    EXPECT_EQ(ZV_WS_Status_timeout_error, Asking(ZV_WS_doPurchaseSavedBilling, sku, "10.0.0.1", false)(&session));
     EXPECT_EQ(1u, store->Log().size());
     EXPECT_EQ(passes + 1, Number("SELECT COUNT(*) FROM pass"));
 }
