@@ -2,10 +2,11 @@
 
 #include <gtest/gtest.h>
 #include <soapH.h>
-#include <zlib.h>
 
 #include <string>
 #include <vector>
+
+#include "Http.h"
 
 namespace {
 
@@ -77,21 +78,6 @@ std::string Around(const std::string& content)
            "</ZV1:getTitleListingResult></ZVWSLib>";
 }
 
-std::string Gzip(const std::string& text)
-{
-    z_stream stream = {};
-    EXPECT_EQ(Z_OK, deflateInit2(&stream, 9, Z_DEFLATED, 15 + 16, 9, Z_DEFAULT_STRATEGY));
-    std::string packed(deflateBound(&stream, text.size()), '\0');
-    stream.next_in = reinterpret_cast<Bytef*>(const_cast<char*>(text.data()));
-    stream.avail_in = text.size();
-    stream.next_out = reinterpret_cast<Bytef*>(&packed[0]);
-    stream.avail_out = packed.size();
-    EXPECT_EQ(Z_STREAM_END, deflate(&stream, Z_FINISH));
-    packed.resize(stream.total_out);
-    deflateEnd(&stream);
-    return packed;
-}
-
 TEST(SerializerTest, ReadsBackWhatItWrote)
 {
     for (const bool compress : {true, false}) {
@@ -103,19 +89,6 @@ TEST(SerializerTest, ReadsBackWhatItWrote)
             Serializer serializer(true, false);
             Response response;
             ASSERT_TRUE(serializer.Read(text, response));
-            const ZV1__TitleListingResponse* title = response.getTitleListingResult;
-            ASSERT_NE(nullptr, title);
-            EXPECT_EQ(-4, title->TitleID);
-            EXPECT_STREQ("<Caf\xc3\xa9> & \"\xe2\x82\xac\xf0\x9f\x8e\xac\"\t\n ]]>", title->TitleName);
-            EXPECT_STREQ("", title->BoxArtPrefix);
-            EXPECT_EQ(nullptr, title->MPAARating);
-            EXPECT_EQ(-32768, title->TitlePosition);
-            EXPECT_TRUE(title->IsTvListing);
-            ASSERT_NE(nullptr, title->AvailableProducts);
-            ASSERT_EQ(2, title->AvailableProducts->__sizeProductListing);
-            for (int i : {0, 1})
-                EXPECT_STREQ("4.99", title->AvailableProducts->ProductListing[i]->Price);
-
             ZVString again;
             EXPECT_TRUE(Serializer(compress, indent).Write(response, again));
             EXPECT_TRUE(again == text);
@@ -125,12 +98,19 @@ TEST(SerializerTest, ReadsBackWhatItWrote)
 
 TEST(SerializerTest, WritesOneElementWithoutReferences)
 {
+    const std::string product =
+        "<ZV1:ProductListing><ZV1:SkuID>17</ZV1:SkuID><ZV1:PurchaseType>rent</ZV1:PurchaseType>"
+        "<ZV1:Price>4.99</ZV1:Price><ZV1:RentalPeriod>0</ZV1:RentalPeriod></ZV1:ProductListing>";
+    const std::string result =
+        "><ZV1:getTitleListingResult><ZV1:TitleID>-4</ZV1:TitleID>"
+        "<ZV1:TitleName>&lt;Café&gt; &amp; \"€🎬\"\t\n ]]&gt;</ZV1:TitleName><ZV1:BoxArtPrefix/>"
+        "<ZV1:TitlePosition>-32768</ZV1:TitlePosition><ZV1:EpisodeNumber>0</ZV1:EpisodeNumber>"
+        "<ZV1:IsTvListing>true</ZV1:IsTvListing><ZV1:AvailableProducts>" +
+        product + product + "</ZV1:AvailableProducts><ZV1:IsTHX";
     const std::string text = Text(Written(false));
-    EXPECT_EQ("</ZVWSLib>", text.substr(text.find_last_of('<')).substr(0, 10));
-    for (const char* part : {"<ZVWSLib", "Caf\xc3\xa9"})  // UTF-8, as it came
-        EXPECT_NE(std::string::npos, text.find(part)) << part;
-    for (const char* part : {"Envelope", "href", " id=", "HTTP"})
-        EXPECT_EQ(std::string::npos, text.find(part)) << part;
+    EXPECT_EQ(0u, text.find("<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<ZVWSLib xmlns"));
+    EXPECT_EQ(text.find("><"), text.find(result)) << text;
+    EXPECT_EQ("</ZV1:getTitleListingResult></ZVWSLib>", text.substr(text.find("</ZV1:getT")).substr(0, 38));
 }
 
 TEST(SerializerTest, OneSerializerServesSeveralTexts)
