@@ -144,10 +144,10 @@ TEST_F(Calls, TheTokenIsTheSessions)
 
 TEST_F(Calls, RefusalCodesHaveTheirStatus)
 {
-    const Call purchase = Asking(ZV_WS_doPurchaseSavedBilling, 120, "", false);
+    const AnyCall purchase = Asking(ZV_WS_doPurchaseSavedBilling, 120, "", false);
     const struct {
         const char* operation;
-        Call call;
+        AnyCall call;
         std::vector<int> statuses;  // of response codes 1, 2, ...
     } rows[] = {
         {"doPurchaseSavedbilling", purchase, {-1007, -1008, -1009, -1010, -1011, -1012, -1013, -1014,
@@ -177,7 +177,7 @@ TEST_F(Calls, RefusalCodesHaveTheirStatus)
 TEST_F(Calls, WrongArgumentsSendNothing)
 {
     const ZV_WS_Pagination page = Page(1, 1);
-    const Call calls[] = {
+    const AnyCall calls[] = {
         Asking(ZV_WS_getTitles, 1, nullptr, 2),
         Asking(ZV_WS_getTitlesByGenreIDs, nullptr, 2, &page, PURCHASE_TYPE_ANY),
         Asking(ZV_WS_removeAllMyPurchases, ""),

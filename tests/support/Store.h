@@ -18,10 +18,10 @@ struct Owned : Record {
 };
 
 /// A call without its output, which is freed.
-using Call = std::function<ZV_WS_Status(ZV_WS_Session*)>;
+using AnyCall = std::function<ZV_WS_Status(ZV_WS_Session*)>;
 
 template <class... Parameters, class... Arguments>
-Call Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), Arguments... arguments)
+AnyCall Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), Arguments... arguments)
 {
     using Output = std::remove_pointer_t<std::tuple_element_t<sizeof...(Arguments), std::tuple<Parameters...>>>;
     return [=](ZV_WS_Session* session) {
