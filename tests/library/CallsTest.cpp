@@ -97,11 +97,10 @@ TEST_F(Calls, TheAccessTypeChoosesTheService)
         OK(ZV_WS_getMyVideos(&session, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, WATCH_STATUS_UNDEFINED,
                              &videos));
         EXPECT_EQ(3u, videos.Titles.size);
-        bool flag = false;
-        OK(ZV_WS_checkForPurchasedTitle(&session, 12, &flag));
-        EXPECT_TRUE(flag);
-        OK(ZV_WS_checkForPurchasedSku(&session, 240, &flag));
-        EXPECT_TRUE(flag);
+        bool title = false, sku = false;
+        OK(ZV_WS_checkForPurchasedTitle(&session, 12, &title));
+        OK(ZV_WS_checkForPurchasedSku(&session, 240, &sku));
+        EXPECT_TRUE(title && sku);
         OK(Asking(ZV_WS_getWishlistItems, SORT_ORDER_TITLENAME, &page, TITLE_TYPE_FILTER_ANY)(&session));
         int country = 0;
         OK(ZV_WS_getCountryID(&session, &country));
@@ -267,15 +266,13 @@ TEST_F(Calls, BandwidthAddress)
 TEST_F(Calls, Files)
 {
     const std::string data = store->DataFolder(), file = data + "/a/b/c.txt";
-    bool flag = true;
+    bool isFolder = false, before = true, after = false;
     OK(ZV_WS_createFolder((data + "/a/b").c_str()));
-    OK(ZV_WS_folderExist((data + "/a/b").c_str(), &flag));
-    EXPECT_TRUE(flag);
-    OK(ZV_WS_fileExist(file.c_str(), &flag));
-    EXPECT_FALSE(flag);
+    OK(ZV_WS_folderExist((data + "/a/b").c_str(), &isFolder));
+    OK(ZV_WS_fileExist(file.c_str(), &before));
     OK(ZV_WS_copyFile((data + "/account.txt").c_str(), file.c_str()));
-    OK(ZV_WS_fileExist(file.c_str(), &flag));
-    EXPECT_TRUE(flag);
+    OK(ZV_WS_fileExist(file.c_str(), &after));
+    EXPECT_TRUE(isFolder && !before && after);
     Owned<ZV_WS_String> folder;
     OK(ZV_WS_getFolderName(file.c_str(), &folder));
     EXPECT_EQ(data + "/a/b/", folder.data);
@@ -284,7 +281,7 @@ TEST_F(Calls, Files)
     EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_removeFile((data + "/a").c_str()));
     EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_createFolder((data + "/account.txt/x").c_str()));
     EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_copyFile(nullptr, "x"));
-    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_fileExist(nullptr, &flag));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_fileExist(nullptr, &after));
 }
 
 }  // namespace

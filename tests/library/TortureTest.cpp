@@ -366,10 +366,9 @@ TEST_F(TortureImage, AFolderThatCanOnlyBeRead)
     const std::string settings = folder + "/settings.xml";
     ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(settings.c_str(), "k", "old", false));
     const std::string before = ContentOf(settings);
-    fs::permissions(store->DataFolder(), fs::perms(0755));
-    for (const std::string& readable : {settings, file})
-        fs::permissions(readable, fs::perms(0644));
-    fs::permissions(folder, fs::perms(0555));
+    for (const auto& [path, mode] :
+         {std::pair(store->DataFolder(), 0755), {settings, 0644}, {file, 0644}, {folder, 0555}})
+        fs::permissions(path, fs::perms(mode));
     const auto user = static_cast<uid_t>(setfsuid(65534));  // of this thread, for files
     EXPECT_FALSE(std::ofstream(folder + "/new")) << "this user can write anywhere";
     EXPECT_EQ(ZV_WS_Status_ok, Image("ZV00012"));
