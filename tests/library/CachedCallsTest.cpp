@@ -5,7 +5,6 @@
 
 #include "Store.h"
 #include "TempFolder.h"
-#include "ZVFile.h"
 
 namespace {
 
