@@ -1,13 +1,10 @@
 // What was seen once comes back without the network.
-#include <signal.h>
-#include <sys/resource.h>
-
 #include <filesystem>
 #include <fstream>
 #include <functional>
 
 #include "Store.h"
-#include "ZVFile.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -37,30 +34,17 @@ protected:
         return "";
     }
 
-    ZV_WS_Status Listing(const char* name = nullptr)
+    ZV_WS_Status Listing()
     {
         Owned<ZV_WS_TitleListingResponse> listing;
         const ZV_WS_Status status = ZV_WS_getTitleListing(&session, 12, &listing);
         EXPECT_EQ(status == ZV_WS_Status_ok ? store->Query("SELECT name FROM title WHERE id = 12") : "",
-                  listing.TitleName ? listing.TitleName : "")
-            << (name ? name : "");
+                  listing.TitleName ? listing.TitleName : "");
         return status;
     }
 
     std::string folder;
 };
-
-using Call = std::function<ZV_WS_Status(ZV_WS_Session*)>;
-
-template <class... Parameters, class... Arguments>
-Call Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), Arguments... arguments)
-{
-    using Output = std::remove_pointer_t<std::tuple_element_t<sizeof...(Arguments), std::tuple<Parameters...>>>;
-    return [=](ZV_WS_Session* session) {
-        Owned<Output> record;
-        return call(session, arguments..., &record);
-    };
-}
 
 // All sixteen caching calls: the second time nothing is sent, whatever kind of cache it is.
 TEST_F(Cached, TheSecondTimeNothingIsSent)
@@ -69,7 +53,7 @@ TEST_F(Cached, TheSecondTimeNothingIsSent)
     const int season = Number("SELECT MIN(id) FROM title WHERE is_tv = 1");
     const auto any = PURCHASE_TYPE_ANY;
     const auto all = TITLE_TYPE_FILTER_ANY;
-    const Call calls[] = {
+    const AnyCall calls[] = {
         Asking(ZV_WS_getNavigation),
         Asking(ZV_WS_getTitles, 1, &page, any),
         Asking(ZV_WS_getTitleListing, 12),
@@ -96,35 +80,21 @@ TEST_F(Cached, TheSecondTimeNothingIsSent)
             EXPECT_EQ(ZV_WS_Status_ok, calls[i](&session)) << i;
             EXPECT_EQ(1u, store->Log().size()) << i;
         }
+        ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
+        for (const AnyCall& call : calls)
+            EXPECT_EQ(ZV_WS_Status_ok, call(&session));
+        // A new session keeps what a file holds of the catalogue, and nothing that shows the user's state.
+        const std::vector<std::string> asked = Asked();
+        EXPECT_EQ(type == CacheType_File ? 8 : std::size(calls), asked.size());
+        EXPECT_EQ(type != CacheType_File, asked[0] == "getNavigation");
     }
 }
 
-TEST_F(Cached, DownloadedVideosAreNeverCached)
+TEST_F(Cached, KindsThatTheSessionDoesNotCacheAreAskedEachTime)
 {
-    ZV_WS_SetupParams setup = Setup(ACCESS_TYPE_DOWNLOAD);
-    setup.CacheParam = {CacheType_Memory, kAll, 0, nullptr};
-    ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
-    store->ClearLog();
-    const ZV_WS_Pagination page = Page(1, 5);
-    const Call ask = Asking(ZV_WS_getMyVideos, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, 3);
-    for (int i = 0; i < 2; ++i)
-        EXPECT_EQ(ZV_WS_Status_ok, ask(&session));
-    EXPECT_EQ(2u, store->Log().size());
-}
-
-TEST_F(Cached, OnlySuccessIsKept)
-{
-    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_Memory));
-    for (const char* fault : {"getTitleListing=code:3", "getTitleListing=http:503", "getTitleListing=missing-result"}) {
-        Fault(fault);
-        EXPECT_NE(ZV_WS_Status_ok, Listing(fault));
-    }
-    EXPECT_EQ(ZV_WS_Status_ok, Listing());
-    EXPECT_EQ(4u, store->Log().size());
-    // Kinds that the session does not cache are asked each time.
     ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_Memory, ZV_WS_CacheParam::CacheData_Userdata));
-    Listing();
-    Listing();
+    for (int i = 0; i < 2; ++i)
+        EXPECT_EQ(ZV_WS_Status_ok, Listing());
     EXPECT_EQ(2u, store->Log().size());
 }
 
@@ -145,13 +115,12 @@ TEST_F(Cached, WishlistChangesMakeItsPagesStale)
     };
     EXPECT_EQ(3, items());
     EXPECT_FALSE(wished(50));
-    Owned<ZV_WS_StandardResponse> answers[3];
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_addItemToWishlist(&session, 50, &answers[0]));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_addItemToWishlist, 50)(&session));
     store->ClearLog();
     EXPECT_TRUE(wished(50));  // from the flag
     EXPECT_TRUE(store->Log().empty());
     EXPECT_EQ(4, items());
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_removeItemFromWishlist(&session, 50, &answers[1]));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_removeItemFromWishlist, 50)(&session));
     const int titles[] = {50, 7, 19};
     for (const size_t requests : {2u, 2u}) {  // a walk through the list and the pages above; then flags alone
         Owned<ZV_WS_TitlesInWishlist> flags;
@@ -160,7 +129,7 @@ TEST_F(Cached, WishlistChangesMakeItsPagesStale)
                   std::vector<bool>(flags.IsAvailInUserWishlist, flags.IsAvailInUserWishlist + 3));
         EXPECT_LE(store->Log().size(), requests + 1);
     }
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_removeAllItemsFromWishlist(&session, &answers[2]));
+    ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_removeAllItemsFromWishlist)(&session));
     EXPECT_FALSE(wished(7));
     EXPECT_EQ(0, items());
 }
@@ -195,8 +164,7 @@ TEST_F(Cached, DuplicatesShareAFileAndNotTheMemory)
         Listing();
         ZV_WS_Session copy;
         ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
-        Owned<ZV_WS_TitleListingResponse> listing;
-        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getTitleListing(&copy, 12, &listing));
+        EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getTitleListing, 12)(&copy));
         EXPECT_EQ(type == CacheType_File ? 1u : 2u, store->Log().size());
         ZV_WS_release(&copy);
     }
@@ -206,9 +174,7 @@ TEST_F(Cached, DuplicatesShareAFileAndNotTheMemory)
 TEST_F(Cached, ABrokenCacheIsNoCache)
 {
     const std::function<void(const std::string&)> breaks[] = {
-        [](const std::string& file) {
-            std::ofstream(file, std::ios::trunc) << "this is no database at all, but long enough";
-        },
+        [](const std::string& file) { std::ofstream(file) << "this is no database at all, but long enough"; },
         [](const std::string& file) { fs::resize_file(file, fs::file_size(file) / 2); },
         [](const std::string& file) { fs::resize_file(file, 0); },
         [](const std::string& file) { fs::remove_all(fs::path(file).parent_path()); },
@@ -223,40 +189,14 @@ TEST_F(Cached, ABrokenCacheIsNoCache)
         const std::string file = Database();
         breaks[i](file);
         EXPECT_EQ(ZV_WS_Status_ok, Listing()) << i;
-        Owned<ZV_WS_String> place;
-        ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, "ZV00012", &place);
-        // The next session makes it anew, unless a folder is in its place.
+        Asking(ZV_WS_getBoxArtImage, BOX_ART_SIZE_95, "ZV00012")(&session);
+        if (i < 4) {  // the next session makes it anew, unless a folder is in its place
+            EXPECT_EQ(ZV_WS_Status_ok, Begin(CacheType_File)) << i;
+            EXPECT_EQ(ZV_WS_Status_ok, Listing());
+        }
         ZV_WS_release(&session);
-        const ZV_WS_Status status = Begin(CacheType_File);
-        EXPECT_TRUE(status == ZV_WS_Status_ok || i == 4) << i << " " << status;
-        EXPECT_EQ(ZV_WS_Status_ok, i == 4 ? ZV_WS_Status_ok : Listing());
         fs::remove_all(folder);
     }
-}
-
-// Nothing more fits on the disk: what is not there yet comes from the service each time, and nothing is left half
-// written.
-TEST_F(Cached, AFullDiskIsNoCache)
-{
-    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
-    rlimit before;
-    getrlimit(RLIMIT_FSIZE, &before);
-    const rlimit full = {1, before.rlim_max};
-    const auto handler = signal(SIGXFSZ, SIG_IGN);
-    setrlimit(RLIMIT_FSIZE, &full);
-    EXPECT_EQ(ZV_WS_Status_ok, Listing());
-    EXPECT_EQ(ZV_WS_Status_ok, Listing());
-    Owned<ZV_WS_String> place;
-    EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, "ZV00012", &place));
-    setrlimit(RLIMIT_FSIZE, &before);
-    signal(SIGXFSZ, handler);
-    EXPECT_EQ((std::vector<std::string>{"getTitleListing", "getTitleListing", "ZV00012"}), Asked());
-    EXPECT_FALSE(fs::exists(folder + "/ZV0001295.jpg"));
-    // With room again it is a cache again.
-    store->ClearLog();
-    Listing();
-    Listing();
-    EXPECT_EQ(1u, store->Log().size());
 }
 
 // ---- Box art
@@ -272,42 +212,31 @@ protected:
     {
         ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_updateLocalCache(&session, ZV_WS_CacheParam::CacheData_BoxArtImage));
     }
-    size_t Temporaries() const
-    {
-        size_t count = 0;
-        for (const auto& entry : fs::directory_iterator(folder))
-            count += entry.path().filename().string().rfind("zvws", 0) == 0;
-        return count;
-    }
 };
 
 TEST_F(BoxArt, IsFetchedOnceAndRevalidated)
 {
     for (const CacheType type : {CacheType_Memory, CacheType_File}) {
         ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
-        Owned<ZV_WS_Image> images[4];
-        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[0]));
-        ASSERT_GT(images[0].size, 100u);
-        EXPECT_EQ(0xff, images[0].data[0]);
-        EXPECT_EQ(0xd8, images[0].data[1]);
-        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[1]));
-        EXPECT_EQ(1u, store->Log().size());
-        Revalidate();
-        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[2]));  // 304
-        EXPECT_EQ("Mon, 02 Nov 2026 06:00:00 GMT", Header(store->Log().back(), "if-modified-since"));
-        ASSERT_EQ(ZV_WS_Status_ok, Image(&images[3]));
-        EXPECT_EQ(2u, store->Log().size());
-        for (const auto& image : images) {
-            ASSERT_EQ(images[0].size, image.size);
-            EXPECT_EQ(0, memcmp(images[0].data, image.data, image.size));
+        std::string first;
+        for (int i = 0; i < 4; ++i) {
+            if (i == 2) Revalidate();  // to which the answer is 304
+            Owned<ZV_WS_Image> image;
+            ASSERT_EQ(ZV_WS_Status_ok, Image(&image));
+            const std::string bytes(reinterpret_cast<const char*>(image.data), image.size);
+            if (i == 0) first = bytes;
+            EXPECT_EQ("\xff\xd8", bytes.substr(0, 2));
+            EXPECT_TRUE(bytes == first) << i;
+            EXPECT_EQ(i < 2 ? 1u : 2u, store->Log().size());
         }
+        EXPECT_EQ("Mon, 02 Nov 2026 06:00:00 GMT", Header(store->Log().back(), "if-modified-since"));
     }
 }
 
 // A revalidation that fails leaves the image that there is; one that finds a newer image takes it.
 TEST_F(BoxArt, AFailedRevalidationLosesNothing)
 {
-    for (const CacheType type : {CacheType_Memory, CacheType_File}) {
+    for (const CacheType type : {CacheType_File, CacheType_Memory}) {
         ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
         Owned<ZV_WS_Image> first;
         ASSERT_EQ(ZV_WS_Status_ok, Image(&first));
@@ -319,39 +248,8 @@ TEST_F(BoxArt, AFailedRevalidationLosesNothing)
             EXPECT_EQ(ZV_WS_Status_ok, Image(&image)) << fault;
             EXPECT_EQ(first.size, image.size) << fault;
         }
-        if (type == CacheType_File) {
-            EXPECT_EQ(0u, Temporaries());
-        }
-    }
-}
-
-TEST_F(BoxArt, FailuresOfTheFirstFetch)
-{
-    const struct {
-        const char* fault;
-        ZV_WS_Status status;
-    } rows[] = {{"http:404", ZV_WS_Status_file_not_found_on_server},
-                {"http:503", ZV_WS_Status_net_error},
-                {"no-length", ZV_WS_Status_net_error},
-                {"zero-length", ZV_WS_Status_net_error},
-                {"cut", ZV_WS_Status_net_error},
-                {"cut-body", ZV_WS_Status_net_error},
-                {"short", ZV_WS_Status_net_error},
-                {"endless", ZV_WS_Status_net_error},
-                {"split", ZV_WS_Status_ok}};
-    for (const CacheType type : {CacheType_None, CacheType_Memory, CacheType_File}) {
-        for (const auto& row : rows) {
-            ASSERT_EQ(ZV_WS_Status_ok, Begin(type));
-            Fault(std::string("boxart=") + row.fault);
-            Owned<ZV_WS_Image> image;
-            EXPECT_EQ(row.status, Image(&image)) << type << row.fault;
-            EXPECT_EQ(row.status == ZV_WS_Status_ok, image.size > 0) << type << row.fault;
-            if (type == CacheType_File) {
-                EXPECT_EQ(0u, Temporaries()) << row.fault;
-                EXPECT_EQ(row.status == ZV_WS_Status_ok, fs::exists(File())) << row.fault;
-                fs::remove_all(folder);
-            }
-        }
+        for (const auto& entry : fs::directory_iterator(folder))
+            EXPECT_NE(0u, entry.path().filename().string().rfind("zvws", 0)) << "a temporary file is left";
     }
 }
 
@@ -365,11 +263,12 @@ TEST_F(BoxArt, IsAFileOrAnAddress)
     EXPECT_TRUE(store->Log().empty());
 
     ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
+    std::ofstream(File()) << "no image";  // a file without its row is not trusted
     for (int i = 0; i < 3; ++i) {
         Owned<ZV_WS_String> place;
         ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_135S, "ZV00012", &place));
         EXPECT_EQ(File(), place.data);
-        EXPECT_TRUE(fs::exists(File()));
+        EXPECT_EQ("\xff\xd8", ContentOf(File()).substr(0, 2));
         if (i == 1) fs::remove(File());  // a row without its file is fetched again
     }
     EXPECT_EQ(2u, store->Log().size());
@@ -379,48 +278,27 @@ TEST_F(BoxArt, IsAFileOrAnAddress)
     EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_clearLocalCache(""));
 }
 
-// What lies in the folder without the cache knowing of it is not trusted.
-TEST_F(BoxArt, AFileWithoutItsRowIsReplaced)
+TEST_F(BoxArt, OldImagesMakeRoom)
 {
-    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
-    std::ofstream(File()) << "left over from another time";
-    Owned<ZV_WS_Image> image;
-    ASSERT_EQ(ZV_WS_Status_ok, Image(&image));
-    EXPECT_EQ(fs::file_size(File()), image.size);
-    EXPECT_EQ(0xff, image.data[0]);
-}
-
-// The oldest titles make room, also when somebody has removed their files.
-TEST_F(BoxArt, EvictionFindsItsFilesGone)
-{
-    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File, ZV_WS_CacheParam::CacheData_BoxArtImage, 358400));
-    for (int title = 1; title <= 40; ++title) {
-        char prefix[16];
-        snprintf(prefix, sizeof prefix, "ZV%05d", title);
-        Owned<ZV_WS_String> place;
-        ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_321, prefix, &place)) << title;
-        if (title % 3 == 0) fs::remove(place.data);
+    const unsigned int limit = 358400;
+    ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File, ZV_WS_CacheParam::CacheData_BoxArtImage, limit));
+    for (int title = 10; title < 50; ++title) {
+        const std::string prefix = "ZV000" + std::to_string(title);
+        ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getBoxArtImage, BOX_ART_SIZE_321, prefix.c_str())(&session)) << title;
     }
-    size_t files = 0, bytes = 0;
-    for (const auto& entry : fs::directory_iterator(folder)) {
-        if (entry.path().extension() != ".jpg") continue;
-        ++files;
+    size_t bytes = 0;
+    for (const auto& entry : fs::directory_iterator(folder))
         bytes += entry.file_size();
-    }
-    EXPECT_LT(files, 27u) << "nothing was evicted";
-    EXPECT_LT(bytes, 2 * 358400u);
+    EXPECT_LT(bytes, limit + 50000);
 }
 
 TEST_F(BoxArt, PrefixesThatLeaveTheFolderAreRefused)
 {
     ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_File));
     for (const char* prefix : {"", "../evil", "a/b", "a\\b", "..", "a\nb"}) {
-        Owned<ZV_WS_Image> image;
-        EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getBoxArtImageData(&session, BOX_ART_SIZE_95, prefix, &image))
-            << prefix;
-        Owned<ZV_WS_String> place;
-        EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, prefix, &place))
-            << prefix;
+        SCOPED_TRACE(prefix);
+        EXPECT_EQ(ZV_WS_Status_invalid_param, Asking(ZV_WS_getBoxArtImageData, BOX_ART_SIZE_95, prefix)(&session));
+        EXPECT_EQ(ZV_WS_Status_invalid_param, Asking(ZV_WS_getBoxArtImage, BOX_ART_SIZE_95, prefix)(&session));
     }
     EXPECT_TRUE(store->Log().empty());
 }

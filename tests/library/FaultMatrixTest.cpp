@@ -108,6 +108,7 @@ const Kind kKinds[] = {
     {"Bandwidth", "bandwidth", kBandwidth, ACCESS_TYPE_STREAM, CacheType_None, false, Bandwidth},
     {"BoxArtFile", "boxart", kBoxArt, ACCESS_TYPE_STREAM, CacheType_File, true, BoxArtFile},
     {"BoxArtMemory", "boxart", kBoxArt, ACCESS_TYPE_STREAM, CacheType_Memory, true, BoxArtBytes},
+    {"BoxArtUncached", "boxart", kBoxArt, ACCESS_TYPE_STREAM, CacheType_None, false, BoxArtBytes},
 };
 
 bool IsTls(const Kind& kind)
@@ -252,7 +253,9 @@ TEST_P(FaultMatrix, OfConnections)
             SCOPED_TRACE(static_cast<int>(certificate));
             ReconnectNext();
             store->SetCertificate(certificate);
+            store->ClearLog();
             EXPECT_EQ(refused, kind.call(session, ++m_Row).status);
+            EXPECT_TRUE(store->Log().empty());
             store->SetCertificate(CertificateKind::Good);
             ExpectCached(false);
         }

@@ -2,10 +2,10 @@
 
 #include <gtest/gtest.h>
 #include <soapH.h>
-#include <zlib.h>
 
 #include <string>
-#include <vector>
+
+#include "Http.h"
 
 namespace {
 
@@ -60,7 +60,7 @@ ZVString Written(bool compress, bool indent = false)
 }
 
 // What a text that must not be accepted leaves behind: nothing.
-void ExpectRefused(const ZVString& text, const char* what)
+void ExpectRefused(const ZVString& text, const std::string& what)
 {
     Serializer serializer(true, false);
     Response response;
@@ -77,75 +77,41 @@ std::string Around(const std::string& content)
            "</ZV1:getTitleListingResult></ZVWSLib>";
 }
 
-std::string Gzip(const std::string& text)
-{
-    z_stream stream = {};
-    EXPECT_EQ(Z_OK, deflateInit2(&stream, 9, Z_DEFLATED, 15 + 16, 9, Z_DEFAULT_STRATEGY));
-    std::string packed(deflateBound(&stream, text.size()), '\0');
-    stream.next_in = reinterpret_cast<Bytef*>(const_cast<char*>(text.data()));
-    stream.avail_in = text.size();
-    stream.next_out = reinterpret_cast<Bytef*>(&packed[0]);
-    stream.avail_out = packed.size();
-    EXPECT_EQ(Z_STREAM_END, deflate(&stream, Z_FINISH));
-    packed.resize(stream.total_out);
-    deflateEnd(&stream);
-    return packed;
-}
-
 TEST(SerializerTest, ReadsBackWhatItWrote)
 {
+    Serializer serializer(true, false);  // serves all texts, refused ones in between
+    Response response;
     for (const bool compress : {true, false}) {
         for (const bool indent : {true, false}) {
             SCOPED_TRACE(testing::Message() << "compress " << compress << ", indent " << indent);
             const ZVString text = Written(compress, indent);
             EXPECT_EQ(compress, text.length() > 2 && Text(text).compare(0, 2, "\x1f\x8b") == 0);
-
-            Serializer serializer(true, false);
-            Response response;
+            EXPECT_FALSE(serializer.Read(text.substr(0, text.length() / 2), response));
             ASSERT_TRUE(serializer.Read(text, response));
-            const ZV1__TitleListingResponse* title = response.getTitleListingResult;
-            ASSERT_NE(nullptr, title);
-            EXPECT_EQ(-4, title->TitleID);
-            EXPECT_STREQ("<Caf\xc3\xa9> & \"\xe2\x82\xac\xf0\x9f\x8e\xac\"\t\n ]]>", title->TitleName);
-            EXPECT_STREQ("", title->BoxArtPrefix);
-            EXPECT_EQ(nullptr, title->MPAARating);
-            EXPECT_EQ(-32768, title->TitlePosition);
-            EXPECT_TRUE(title->IsTvListing);
-            ASSERT_NE(nullptr, title->AvailableProducts);
-            ASSERT_EQ(2, title->AvailableProducts->__sizeProductListing);
-            for (int i : {0, 1})
-                EXPECT_STREQ("4.99", title->AvailableProducts->ProductListing[i]->Price);
-
             ZVString again;
             EXPECT_TRUE(Serializer(compress, indent).Write(response, again));
             EXPECT_TRUE(again == text);
+            EXPECT_TRUE(serializer.Write(response, again));
+            EXPECT_TRUE(again == Written(true));
         }
     }
 }
 
 TEST(SerializerTest, WritesOneElementWithoutReferences)
 {
+    const std::string product =
+        "<ZV1:ProductListing><ZV1:SkuID>17</ZV1:SkuID><ZV1:PurchaseType>rent</ZV1:PurchaseType>"
+        "<ZV1:Price>4.99</ZV1:Price><ZV1:RentalPeriod>0</ZV1:RentalPeriod></ZV1:ProductListing>";
+    const std::string result =
+        "><ZV1:getTitleListingResult><ZV1:TitleID>-4</ZV1:TitleID>"
+        "<ZV1:TitleName>&lt;Café&gt; &amp; \"€🎬\"\t\n ]]&gt;</ZV1:TitleName><ZV1:BoxArtPrefix/>"
+        "<ZV1:TitlePosition>-32768</ZV1:TitlePosition><ZV1:EpisodeNumber>0</ZV1:EpisodeNumber>"
+        "<ZV1:IsTvListing>true</ZV1:IsTvListing><ZV1:AvailableProducts>" +
+        product + product + "</ZV1:AvailableProducts><ZV1:IsTHX";
     const std::string text = Text(Written(false));
-    EXPECT_NE(std::string::npos, text.find("<ZVWSLib"));
-    EXPECT_EQ("</ZVWSLib>", text.substr(text.find_last_of('<')).substr(0, 10));
-    EXPECT_NE(std::string::npos, text.find("Caf\xc3\xa9")) << "UTF-8, as it came";
-    EXPECT_EQ(std::string::npos, text.find("Envelope"));
-    EXPECT_EQ(std::string::npos, text.find("href"));
-    EXPECT_EQ(std::string::npos, text.find(" id="));
-    EXPECT_EQ(std::string::npos, text.find("HTTP"));
-}
-
-TEST(SerializerTest, OneSerializerServesSeveralTexts)
-{
-    const ZVString whole = Written(true), plain = Written(false);
-    Serializer serializer(true, false);
-    Response response;
-    EXPECT_FALSE(serializer.Read(whole.substr(0, whole.length() / 2), response));
-    EXPECT_TRUE(serializer.Read(plain, response));
-    EXPECT_TRUE(serializer.Read(whole, response));
-    ZVString text;
-    EXPECT_TRUE(serializer.Write(response, text));
-    EXPECT_TRUE(text == whole);
+    EXPECT_EQ(0u, text.find("<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<ZVWSLib xmlns"));
+    EXPECT_EQ(text.find("><"), text.find(result)) << text;
+    EXPECT_EQ("</ZV1:getTitleListingResult></ZVWSLib>", text.substr(text.find("</ZV1:getT")).substr(0, 38));
 }
 
 // ---- Texts that are no answers
@@ -155,9 +121,8 @@ TEST(SerializerTest, RefusesEveryTextCutShort)
     for (const bool compress : {true, false}) {
         const ZVString text = Written(compress);
         const size_t element = compress ? text.length() : Text(text).find_last_of('>') + 1;
-        for (size_t length = 0; length < element; ++length) {
-            ExpectRefused(text.substr(0, length), ("cut at " + std::to_string(length)).c_str());
-        }
+        for (size_t length = 0; length < element; ++length)
+            ExpectRefused(text.substr(0, length), "cut at " + std::to_string(length));
     }
 }
 
@@ -199,7 +164,7 @@ TEST(SerializerTest, RefusesDamagedTexts)
 
 TEST(SerializerTest, RefusesWhatGrowsWithoutEnd)
 {
-    const auto repeated = [](const char* text, size_t count) {
+    const auto repeated = [](const std::string& text, size_t count) {
         std::string all;
         for (size_t i = 0; i < count; ++i)
             all += text;
@@ -217,8 +182,8 @@ TEST(SerializerTest, RefusesWhatGrowsWithoutEnd)
         {"as many products as an array may have", products(4096), true},
         {"one more", products(4097), false},
         {"elements deep in each other", repeated("<a>", 100000) + repeated("</a>", 100000), true},
-        {"3 MiB of elements without use", repeated(useless.c_str(), 3 << 10), true},
-        {"5 MiB of elements without use", repeated(useless.c_str(), 5 << 10), false},
+        {"3 MiB of elements without use", repeated(useless, 3 << 10), true},
+        {"5 MiB of elements without use", repeated(useless, 5 << 10), false},
         {"3 MiB of blanks", std::string(3 << 20, ' '), true},
         {"5 MiB of blanks", std::string(5 << 20, ' '), false},
     };

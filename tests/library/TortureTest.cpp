@@ -157,28 +157,31 @@ struct Case {
     }
 };
 
-// Fails every allocation of the call up to the `dense`-th, then every `stride`-th. Whatever the call answers, a success
-// is a whole one, nothing leaks, and the next call works.
-void Exhaust(const Case& one, bool all, long dense, long stride)
+// Fails every allocation of the call up to the `dense`-th, then every `stride`-th; then every `allStride`-th with all
+// that follow it. Whatever the call answers, a success is a whole one, nothing leaks, and the next call works.
+void Exhaust(const Case& one, long dense, long stride, long allStride)
 {
     one.prepare();
     std::string right;
     for (int i = 0; i < 3; ++i)  // fills what libraries keep for good
         right = one.Make();
-    int growths = 0;
-    bool came = true;
-    for (long n = 1, blocks = t_Blocks; came; n += growths ? 0 : n < dense ? 1 : stride) {
-        one.prepare();
-        const ZV_WS_Status status = Failing(t_Memory, n, all, one.call);
-        came = t_Memory.made >= n;
-        const std::string result = one.take(status);
-        ASSERT_EQ(status == ZV_WS_Status_ok ? right : result, result) << "allocation " << n;
-        ASSERT_EQ(right, one.Make()) << "allocation " << n;
-        OPENSSL_thread_stop();  // the thread's error texts and random numbers are no leak
-        // Libraries also fill caches on the way, once: only what grows each time is a leak.
-        growths = t_Blocks > blocks ? growths + 1 : 0;
-        ASSERT_LT(growths, 4) << "leak after allocation " << n;
-        blocks = t_Blocks;
+    for (const bool all : {false, true}) {
+        int growths = 0;
+        bool came = true;
+        const auto next = [&](long n) { return all ? allStride : n < dense ? 1 : stride; };
+        for (long n = 1, blocks = t_Blocks; came; n += growths ? 0 : next(n)) {
+            one.prepare();
+            const ZV_WS_Status status = Failing(t_Memory, n, all, one.call);
+            came = t_Memory.made >= n;
+            const std::string result = one.take(status);
+            ASSERT_EQ(status == ZV_WS_Status_ok ? right : result, result) << "allocation " << n;
+            ASSERT_EQ(right, one.Make()) << "allocation " << n;
+            OPENSSL_thread_stop();  // the thread's error texts and random numbers are no leak
+            // Libraries also fill caches on the way, once: only what grows each time is a leak.
+            growths = t_Blocks > blocks ? growths + 1 : 0;
+            ASSERT_LT(growths, 4) << "leak after allocation " << n;
+            blocks = t_Blocks;
+        }
     }
 }
 
@@ -231,20 +234,13 @@ protected:
     Owned<ZV_WS_TitlesResponse> titles;
 };
 
-TEST_F(Torture, ACachedCallWithoutMemory)
+TEST_F(Torture, ACallWithoutMemory)
 {
-    Begin(ZV_WS_CacheParam::CacheData_Metadata);
-    const Case one = FirstPage([] {});
-    Exhaust(one, false, LONG_MAX, 1);
-    Exhaust(one, true, LONG_MAX, 1);
-}
-
-TEST_F(Torture, ACallOverAKeptConnectionWithoutMemory)
-{
-    Begin(0);
-    const Case one = FirstPage([] {});
-    Exhaust(one, false, LONG_MAX, 1);
-    Exhaust(one, true, LONG_MAX, 1);
+    for (const unsigned int cached : {unsigned(ZV_WS_CacheParam::CacheData_Metadata), 0u}) {
+        Begin(cached);  // without a cache, over a kept connection
+        Exhaust(FirstPage([] {}), LONG_MAX, 1, 1);
+        ZV_WS_release(&session);
+    }
 }
 
 // With a full handshake it is some 2600 allocations, and all of them would take half a minute. Those of the request and
@@ -257,8 +253,7 @@ TEST_F(Torture, ACallOverANewConnectionWithoutMemory)
         transport.Close();
         Tls::ForgetSession(transport.context().ctx);
     });
-    Exhaust(one, false, 150, 3);
-    Exhaust(one, true, 1, 17);
+    Exhaust(one, 150, 3, 17);
 }
 
 // A session that is said to be there has to work. As many allocations as above.
@@ -273,8 +268,7 @@ TEST_F(Torture, ANewSessionWithoutMemory)
                           return Take();
                       }};
     ZV_WS_release(&session);
-    Exhaust(one, false, 60, 11);
-    Exhaust(one, true, 1, 37);
+    Exhaust(one, 60, 11, 37);
 }
 
 TEST_F(Torture, AnAnswerThatTheDiskHasNoRoomFor)
@@ -372,10 +366,9 @@ TEST_F(TortureImage, AFolderThatCanOnlyBeRead)
     const std::string settings = folder + "/settings.xml";
     ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_writeSetting(settings.c_str(), "k", "old", false));
     const std::string before = ContentOf(settings);
-    fs::permissions(store->DataFolder(), fs::perms(0755));
-    for (const std::string& readable : {settings, file})
-        fs::permissions(readable, fs::perms(0644));
-    fs::permissions(folder, fs::perms(0555));
+    for (const auto& [path, mode] :
+         {std::pair(store->DataFolder(), 0755), {settings, 0644}, {file, 0644}, {folder, 0555}})
+        fs::permissions(path, fs::perms(mode));
     const auto user = static_cast<uid_t>(setfsuid(65534));  // of this thread, for files
     EXPECT_FALSE(std::ofstream(folder + "/new")) << "this user can write anywhere";
     EXPECT_EQ(ZV_WS_Status_ok, Image("ZV00012"));
@@ -407,8 +400,7 @@ TEST_F(TortureSettings, AWriteWithoutMemory)
                               EXPECT_EQ(status == ZV_WS_Status_ok ? "0:new" : "0:old", Reading("k", isProtected));
                               return std::string();
                           }};
-        Exhaust(one, false, LONG_MAX, 1);
-        Exhaust(one, true, LONG_MAX, 1);
+        Exhaust(one, LONG_MAX, 1, 1);
     }
 }
 

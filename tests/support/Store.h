@@ -5,6 +5,8 @@
 #include <stdlib.h>
 
 #include <algorithm>
+#include <functional>
+#include <tuple>
 
 #include "Storefront.h"
 #include "ZVWSLib.h"
@@ -14,6 +16,19 @@ template <class Record>
 struct Owned : Record {
     ~Owned() { ZV_WS_release(this); }
 };
+
+/// A call without its output, which is freed.
+using AnyCall = std::function<ZV_WS_Status(ZV_WS_Session*)>;
+
+template <class... Parameters, class... Arguments>
+AnyCall Asking(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), Arguments... arguments)
+{
+    using Output = std::remove_pointer_t<std::tuple_element_t<sizeof...(Arguments), std::tuple<Parameters...>>>;
+    return [=](ZV_WS_Session* session) {
+        Owned<Output> record;
+        return call(session, arguments..., &record);
+    };
+}
 
 class Store : public testing::Test {
 protected:
