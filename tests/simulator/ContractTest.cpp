@@ -142,148 +142,129 @@ const char kAccount[] = "DownloadAPI";
 const char kStream[] = "StreamAPI";
 const char kBoth[] = "";
 
-struct Row {
+#define ARRAY "<z:int>1</z:int><z:int>2</z:int>"
+#define PAGE "CurrentPageNumber=1 ItemsPerPage=3 "
+#define SEARCH "Query=the ItemsPerPage=3 CurrentPageNumber=1 PurchaseType=any TitleType=any"
+#define ALL "PurchaseType=any TitleType=any WatchStatusFilter=Undefined"
+#define PASS "PassID=1 FileProfile=STANDARD"
+#define LOUD "AudioSetting=Stereo_Standard"
+
+const struct Row {
     const char* service;
     const char* operation;
     const char* type;      // of the result; empty when that is a text
-    std::string children;  // of a request that is answered well
-    std::string refused;   // of one that is not; empty when the operation refuses nothing
+    const char* children;  // of a request that is answered well; some values are the database's
+    const char* refused;   // the one child with which it is not; empty when the operation refuses nothing
     int code = 1;          // of that refusal
+} kRows[] = {
+    {kBrowse, "getFileType", "FileTypeRecord", "", ""},
+    {kBrowse, "shouldUpdateCache", "", "UTCTime=then", ""},
+    {kBrowse, "getRecommendedTitles", "RecommendedTitlesResponse", "TitleId=12", "TitleId=0"},
+    {kBrowse, "getLastCacheLoadTimeUTC", "", "", ""},
+    {kBrowse, "translateSkuId", "TranslateSkuIdResponse", "SkuId=SKU", "SkuId=1"},
+    {kBrowse, "translateTivoExternalId", "TranslatedTivoExternalIdResponse", "TivoExternalId=EXT12",
+     "TivoExternalId=none"},
+    {kBrowse, "getAllTvEpisodeListings", "ArrayOfTitleListingResponse", "TitleID=SEASON", ""},
+    {kBrowse, "getTvEpisodeListing", "TitleListingResponse", "EpisodeID=EPISODE", "EpisodeID=12"},
+    {kBrowse, "getTvEpisodeListByTitleID", "TvEpisodeList", "TitleID=SEASON", "TitleID=12"},
+    {kBrowse, "getTitleListing", "TitleListingResponse", "TitleID=12", "TitleID=0"},
+    {kBrowse, "getTitlesByGenreArray", "ArrayOfGetTitlesResponse", "GenreIDs=" ARRAY " " PAGE "PurchaseType=any", ""},
+    {kBrowse, "getTitlesByNavigation", "GetTitlesResponse", "GenreID=1 " PAGE "PurchaseType=any", "GenreID=77"},
+    {kBrowse, "getTitlesByNavigation", "GetTitlesResponse",
+     "GenreID=1 CurrentPageNumber=9999 ItemsPerPage=3 PurchaseType=any", "CurrentPageNumber=0", 2},
+    {kBrowse, "getGenreLabel", "GetGenreLabelResponse", "GenreID=1", "GenreID=77"},
+    {kBrowse, "searchForTitle", "GetTitlesResponse", SEARCH, "CurrentPageNumber=32768", 2},
+    {kBrowse, "searchForTitleDetail", "GetTitlesResponse", SEARCH, ""},
+    {kBrowse, "getNavigation", "GenreRequest", "", ""},
+    {kBoth, "checkRentalExpiration", "CheckRentalExpirationResponse", "PassId=1", "PassId=999"},
+    {kBoth, "GetCountryID", "", "", ""},
+    {kBoth, "getConfig", "GetConfigResponse", "", ""},
+    {kBoth, "checkAdultVerificationPin", "CheckAdultVerificationPinResponse", "Pin=0042", ""},
+    {kBoth, "checkAdultVerificationEnabled", "CheckAdultVerificationEnabledResponse", "", ""},
+    {kBoth, "addItemToWishlist", "StandardResponse", "TitleID=12", "TitleID=0"},
+    {kBoth, "getWishlistItems", "GetWishlistItemsResponse", "sortOrder=1 " PAGE "TitleType=any", "CurrentPageNumber=0",
+     2},
+    {kBoth, "getWishlistItems", "GetWishlistItemsResponse", "sortOrder=3 " PAGE "TitleType=movies", "sortOrder=4", 2},
+    {kStream, "removeItemFromWishList", "StandardResponse", "TitleID=12", "TitleID=12"},
+    {kBoth, "removeAllItemsFromWishList", "StandardResponse", "", ""},
+    {kStream, "assignGiftCertificateToUser", "BalanceResponse", "GiftCertificateCode=GIFT1",
+     "GiftCertificateCode=GIFT1"},
+    {kBoth, "getSettingsPageInfo", "SettingsPageInfo", "", ""},
+    {kBoth, "getEmailAddress", "GetEmailAddressResponse", "", ""},
+    {kBoth, "showPrePaidCardBalance", "BalanceResponse", "", ""},
+    {kBoth, "getBillingInfo", "BillingInfoResponse", "", ""},
+    {kAccount, "checkForPurchasedTitle", "", "TitleID=12", ""},
+    {kAccount, "getMyVideos", "GetMyVideosResponse", PAGE ALL, "CurrentPageNumber=0", 2},
+    {kStream, "getMyStreamingVideos", "GetMyVideosResponse", PAGE ALL, "CurrentPageNumber=0", 2},
+    {kBoth, "doPurchaseSavedbilling", "PurchaseResponse", "SkuID=SKU IPAddress=10.0.0.1 UsePrePaidFunds=yes",
+     "SkuID=9022", 22},
+    {kBoth, "deactivateDevice", "StandardResponse", "", ""},
+    {kBoth, "authorizeDevice", "AuthorizeDeviceResponse", "PIN=123456", "PIN=000000", 2},
+    {kBoth, "checkAuthToken", "", "AuthToken=x", ""},
+    {kStream, "getTHXMediaDirectorBonusAsset", "THXMediaDirectorResponse",
+     "BonusAssetID=BONUS FileProfile=STANDARD BonusAssetType=Trailer", "BonusAssetID=1", 2},
+    {kStream, "getTHXMediaDirector", "THXMediaDirectorResponse", PASS " " LOUD, "PassID=999", 2},
+    {kStream, "setAudioDefaultProperty", "StandardResponse", LOUD, ""},
+    {kStream, "getAudioDefaultProperty", "", "", ""},
+    {kStream, "calcOrderTax", "CalcOrderTaxResponse", "SKUID=SKU", "SKUID=9111", 11},
+    {kStream, "ReturnTimeout", "StandardResponse", "", ""},
+    {kStream, "ReturnError", "StandardResponse", "", ""},
+    {kStream, "getStreamingAssetLocation", "GetStreamingAssetLocationResponse", PASS, "PassID=999", 2},
+    {kStream, "loadLastStreamingAssetLocationForPass", "GetStreamingAssetLocationResponse", PASS, "PassID=999", 2},
+    {kStream, "getBonusAssetLocation", "GetStreamingAssetLocationResponse", "BonusAssetID=BONUS", "BonusAssetID=1", 2},
+    {kStream, "manageStreamInstanceStatus", "StandardResponse", "StreamID=stream-1 Status=paused StopTimeSeconds=90",
+     "StreamID=none"},
+    {kStream, "getBillingInfoAndPPCBalance", "BillingInfoAndPPCBalanceResponse", "", ""},
+    {kStream, "checkForPurchasedStream", "", "SkuID=SKU", ""},
+    {kStream, "checkForPurchasedStreamByTitleID", "", "TitleID=12", ""},
+    {kStream, "getTitleListingsPurchasedForPasses", "ArrayOfTitleListingPurchasedForPass", "Passes=" ARRAY, ""},
+    {kStream, "removeAllMyPurchases", "StandardResponse", "password=secret", "password=guess"},
 };
-
-std::string Paged(const std::string& before, int page, const std::string& after, bool sizeFirst = false)
-{
-    const std::string size = "<z:ItemsPerPage>3</z:ItemsPerPage>";
-    const std::string number = "<z:CurrentPageNumber>" + std::to_string(page) + "</z:CurrentPageNumber>";
-    return before + (sizeFirst ? size + number : number + size) + after;
-}
-
-std::vector<Row> Rows()
-{
-    const auto one = [](const char* name, const std::string& value) { return Children({{name, value}}); };
-    const std::string any = one("PurchaseType", "any");
-    const std::string anyAny = any + one("TitleType", "any");
-    const std::string all = anyAny + one("WatchStatusFilter", "Undefined");
-    const std::string pass = one("PassID", "1") + one("FileProfile", "STANDARD");
-    const std::string noPass = one("PassID", "999") + one("FileProfile", "STANDARD");
-    const std::string loud = one("AudioSetting", "Stereo_Standard");
-    const std::string bonus = one("FileProfile", "STANDARD") + one("BonusAssetType", "Trailer");
-    const std::string buy = one("IPAddress", "10.0.0.1") + one("UsePrePaidFunds", "yes");
-    const std::string ints = "<z:int>1</z:int><z:int>2</z:int>";
-    return {
-        {kBrowse, "getFileType", "FileTypeRecord", "", ""},
-        {kBrowse, "shouldUpdateCache", "", one("UTCTime", "then"), ""},
-        {kBrowse, "getRecommendedTitles", "RecommendedTitlesResponse", one("TitleId", "12"), one("TitleId", "0")},
-        {kBrowse, "getLastCacheLoadTimeUTC", "", "", ""},
-        {kBrowse, "translateSkuId", "TranslateSkuIdResponse", one("SkuId", "SKU"), one("SkuId", "1")},
-        {kBrowse, "translateTivoExternalId", "TranslatedTivoExternalIdResponse", one("TivoExternalId", "EXT12"),
-         one("TivoExternalId", "none")},
-        {kBrowse, "getAllTvEpisodeListings", "ArrayOfTitleListingResponse", one("TitleID", "SEASON"), ""},
-        {kBrowse, "getTvEpisodeListing", "TitleListingResponse", one("EpisodeID", "EPISODE"), one("EpisodeID", "12")},
-        {kBrowse, "getTvEpisodeListByTitleID", "TvEpisodeList", one("TitleID", "SEASON"), one("TitleID", "12")},
-        {kBrowse, "getTitleListing", "TitleListingResponse", one("TitleID", "12"), one("TitleID", "0")},
-        {kBrowse, "getTitlesByGenreArray", "ArrayOfGetTitlesResponse",
-         Paged("<z:GenreIDs>" + ints + "</z:GenreIDs>", 1, any), ""},
-        {kBrowse, "getTitlesByNavigation", "GetTitlesResponse", Paged(one("GenreID", "1"), 2, any),
-         Paged(one("GenreID", "77"), 1, any)},
-        {kBrowse, "getTitlesByNavigation", "GetTitlesResponse", Paged(one("GenreID", "1"), 9999, any),
-         Paged(one("GenreID", "1"), 0, any), 2},
-        {kBrowse, "getGenreLabel", "GetGenreLabelResponse", one("GenreID", "1"), one("GenreID", "77")},
-        {kBrowse, "searchForTitle", "GetTitlesResponse", Paged(one("Query", "the"), 1, anyAny, true),
-         Paged(one("Query", "the"), 32768, anyAny, true), 2},
-        {kBrowse, "searchForTitleDetail", "GetTitlesResponse", Paged(one("Query", "the"), 1, anyAny, true), ""},
-        {kBrowse, "getNavigation", "GenreRequest", "", ""},
-        {kBoth, "checkRentalExpiration", "CheckRentalExpirationResponse", one("PassId", "1"), one("PassId", "999")},
-        {kBoth, "GetCountryID", "", "", ""},
-        {kBoth, "getConfig", "GetConfigResponse", "", ""},
-        {kBoth, "checkAdultVerificationPin", "CheckAdultVerificationPinResponse", one("Pin", "0042"), ""},
-        {kBoth, "checkAdultVerificationEnabled", "CheckAdultVerificationEnabledResponse", "", ""},
-        {kBoth, "addItemToWishlist", "StandardResponse", one("TitleID", "12"), one("TitleID", "0")},
-        {kBoth, "getWishlistItems", "GetWishlistItemsResponse",
-         Paged(one("sortOrder", "1"), 1, one("TitleType", "any")),
-         Paged(one("sortOrder", "1"), 0, one("TitleType", "any")), 2},
-        {kBoth, "getWishlistItems", "GetWishlistItemsResponse",
-         Paged(one("sortOrder", "3"), 1, one("TitleType", "movies")),
-         Paged(one("sortOrder", "4"), 1, one("TitleType", "any")), 2},
-        {kStream, "removeItemFromWishList", "StandardResponse", one("TitleID", "12"), one("TitleID", "12")},
-        {kBoth, "removeAllItemsFromWishList", "StandardResponse", "", ""},
-        {kStream, "assignGiftCertificateToUser", "BalanceResponse", one("GiftCertificateCode", "GIFT1"),
-         one("GiftCertificateCode", "GIFT1")},
-        {kBoth, "getSettingsPageInfo", "SettingsPageInfo", "", ""},
-        {kBoth, "getEmailAddress", "GetEmailAddressResponse", "", ""},
-        {kBoth, "showPrePaidCardBalance", "BalanceResponse", "", ""},
-        {kBoth, "getBillingInfo", "BillingInfoResponse", "", ""},
-        {kAccount, "checkForPurchasedTitle", "", one("TitleID", "12"), ""},
-        {kAccount, "getMyVideos", "GetMyVideosResponse", Paged("", 1, all), Paged("", 0, all), 2},
-        {kStream, "getMyStreamingVideos", "GetMyVideosResponse", Paged("", 1, all), Paged("", 0, all), 2},
-        {kBoth, "doPurchaseSavedbilling", "PurchaseResponse", one("SkuID", "SKU") + buy, one("SkuID", "9022") + buy,
-         22},
-        {kBoth, "deactivateDevice", "StandardResponse", "", ""},
-        {kBoth, "authorizeDevice", "AuthorizeDeviceResponse", one("PIN", "123456"), one("PIN", "000000"), 2},
-        {kBoth, "checkAuthToken", "", one("AuthToken", "x"), ""},
-        {kStream, "getTHXMediaDirectorBonusAsset", "THXMediaDirectorResponse", one("BonusAssetID", "BONUS") + bonus,
-         one("BonusAssetID", "1") + bonus, 2},
-        {kStream, "getTHXMediaDirector", "THXMediaDirectorResponse", pass + loud, noPass + loud, 2},
-        {kStream, "setAudioDefaultProperty", "StandardResponse", loud, ""},
-        {kStream, "getAudioDefaultProperty", "", "", ""},
-        {kStream, "calcOrderTax", "CalcOrderTaxResponse", one("SKUID", "SKU"), one("SKUID", "9111"), 11},
-        {kStream, "ReturnTimeout", "StandardResponse", "", ""},
-        {kStream, "ReturnError", "StandardResponse", "", ""},
-        {kStream, "getStreamingAssetLocation", "GetStreamingAssetLocationResponse", pass, noPass, 2},
-        {kStream, "loadLastStreamingAssetLocationForPass", "GetStreamingAssetLocationResponse", pass, noPass, 2},
-        {kStream, "getBonusAssetLocation", "GetStreamingAssetLocationResponse", one("BonusAssetID", "BONUS"),
-         one("BonusAssetID", "1"), 2},
-        {kStream, "manageStreamInstanceStatus", "StandardResponse",
-         Children({{"StreamID", "stream-1"}, {"Status", "paused"}, {"StopTimeSeconds", "90"}}),
-         Children({{"StreamID", "none"}, {"Status", "paused"}, {"StopTimeSeconds", "90"}})},
-        {kStream, "getBillingInfoAndPPCBalance", "BillingInfoAndPPCBalanceResponse", "", ""},
-        {kStream, "checkForPurchasedStream", "", one("SkuID", "SKU"), ""},
-        {kStream, "checkForPurchasedStreamByTitleID", "", one("TitleID", "12"), ""},
-        {kStream, "getTitleListingsPurchasedForPasses", "ArrayOfTitleListingPurchasedForPass",
-         "<z:Passes>" + ints + "</z:Passes>", ""},
-        {kStream, "removeAllMyPurchases", "StandardResponse", one("password", "secret"), one("password", "guess")},
-    };
-}
 
 class ContractTest : public StorefrontTest {
 protected:
-    // The children with the database's ids in the places of their names.
-    std::string WithIds(std::string children)
+    // The children of a list of "NAME=VALUE", of which `other` is one with another value.
+    std::string Request(const std::string& list, const std::string& other = "") const
     {
-        const std::pair<const char*, const char*> ids[] = {{"SKU<", "SELECT MIN(sku) FROM product WHERE price < 5"},
-                                                           {"SEASON<", "SELECT MIN(id) FROM title WHERE is_tv = 1"},
-                                                           {"EPISODE<", "SELECT MIN(id) FROM title WHERE season <> 0"},
-                                                           {"BONUS<", "SELECT MIN(id) FROM bonus"}};
-        for (const auto& id : ids) {
-            const size_t place = children.find(std::string(">") + id.first);
-            if (place != std::string::npos) children.replace(place + 1, strlen(id.first) - 1, store->Query(id.second));
+        static const std::map<std::string, const char*> kIds = {
+            {"SKU", "SELECT MIN(sku) FROM product WHERE price < 5"},
+            {"SEASON", "SELECT MIN(id) FROM title WHERE is_tv = 1"},
+            {"EPISODE", "SELECT MIN(id) FROM title WHERE season <> 0"},
+            {"BONUS", "SELECT MIN(id) FROM bonus"}};
+        std::string children;
+        std::istringstream words(list);
+        for (std::string word; words >> word;) {
+            const size_t value = word.find('=') + 1;
+            if (other.compare(0, value, word, 0, value) == 0) word = other;
+            const auto id = kIds.find(word.substr(value));
+            if (id != kIds.end()) word.replace(value, std::string::npos, store->Query(id->second));
+            children += Children({{word.substr(0, value - 1).c_str(), word.substr(value)}});
         }
         return children;
     }
     void CheckRow(const std::string& service, const Row& row)
     {
         SCOPED_TRACE(service + " " + row.operation);
-        const Reply good = Ask(service, row.operation, WithIds(row.children));
-        EXPECT_EQ("", CheckAnswer(good, row.operation, row.type));
-        const std::string code = good.Element("ResponseCode");
-        EXPECT_TRUE(code.empty() || code == "0") << good.body;
-        if (!row.refused.empty()) {
-            const Reply refused = Ask(service, row.operation, WithIds(row.refused));
-            EXPECT_EQ("", CheckAnswer(refused, row.operation, row.type));
-            EXPECT_EQ(std::to_string(row.code), refused.Element("ResponseCode")) << refused.body;
+        const auto code = [&](const char* other) {
+            const Reply reply = Ask(service, row.operation, Request(row.children, other));
+            EXPECT_EQ("", CheckAnswer(reply, row.operation, row.type));
+            return atoi(reply.Element("ResponseCode").c_str());
+        };
+        EXPECT_EQ(0, code(""));
+        if (*row.refused) {
+            EXPECT_EQ(row.code, code(row.refused));
         }
         std::string error;
-        if (!store->AddFault(std::string(row.operation) + "=code:19", error)) return;
-        const Reply ordered = Ask(service, row.operation, WithIds(row.children));
-        EXPECT_EQ("", CheckAnswer(ordered, row.operation, row.type));
-        EXPECT_EQ("19", ordered.Element("ResponseCode"));
+        if (store->AddFault(std::string(row.operation) + "=code:19", error)) {
+            EXPECT_EQ(19, code(""));
+        }
     }
 };
 
 TEST_F(ContractTest, EveryAnswerIsOneOfTheContract)
 {
     Begin();
-    for (const Row& row : Rows()) {
+    for (const Row& row : kRows) {
         for (const char* service : {kBrowse, kAccount, kStream}) {
             if (row.service == kBoth ? service != kBrowse : row.service == service) CheckRow(service, row);
         }
@@ -294,8 +275,7 @@ TEST_F(ContractTest, SearchesLookAwayFromCase)
 {
     Begin();
     const auto found = [&](const char* text) {
-        const std::string any = Children({{"PurchaseType", "any"}, {"TitleType", "any"}});
-        const std::string search = Paged(Children({{"Query", text}}), 1, any, true);
+        const std::string search = Request(SEARCH, std::string("Query=") + text);
         return atoi(Ask(kBrowse, "searchForTitle", search).Element("TotalItems").c_str());
     };
     EXPECT_GT(found("harbour"), 0);
