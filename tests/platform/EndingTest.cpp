@@ -50,18 +50,9 @@ TEST_F(RuntimeTest, AfterTheEndNothingIsCalled)
     EXPECT_EQ(Probe::s_lines, Lines{});
 }
 
-TEST_F(RuntimeTest, AStopRequestBeforeTheRunStopsTheMovie)
+// Before there is a set, when it is gone, and before it runs; and unknown codes.
+TEST_F(RuntimeTest, StopRequestsAreForTheSetThatIsThere)
 {
-    WriteMovie("probe.log('never');");
-    ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
-    m_pRuntime->SendRequest(IStagecraft::kRequestStop);
-    EXPECT_EQ(Run().m_nErrorValue, AEError::OK);
-    EXPECT_EQ(Probe::s_lines, Lines{});
-}
-
-TEST_F(RuntimeTest, OtherRequestsDoNothing)
-{
-    // Without a set; then for a set that is gone; then unknown codes.
     m_pRuntime->SendRequest(IStagecraft::kRequestStop);
     EXPECT_EQ(Logged("probe.log('one');"), Lines{"one"});
     m_pRuntime->SendRequest(IStagecraft::kRequestStop);
@@ -72,11 +63,16 @@ TEST_F(RuntimeTest, OtherRequestsDoNothing)
         }
     };
     EXPECT_EQ(Logged("probe.run(); setTimeout(function() { probe.log('three'); }, 0);"), Lines{"three"});
+    WriteMovie("probe.log('never');");
+    ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
+    m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+    EXPECT_EQ(Run().m_nErrorValue, AEError::OK);
+    EXPECT_EQ(Probe::s_lines, Lines{"three"});
 }
 
 TEST_F(RuntimeTest, AStopRequestComesBeforeTheNextTick)
 {
-    const Environment slow("STAGECRAFT_FPS", "1");
+    setenv("STAGECRAFT_FPS", "1", 1);
     std::promise<void> running;
     Probe::s_run = [&](const Invocation&) { running.set_value(); };
     std::thread listener([&] {
