@@ -36,20 +36,6 @@ TEST_F(RuntimeTest, MoviesEndAndNothingFollows)
         EXPECT_EQ(Logged(pScript), expected) << pScript;
 }
 
-TEST_F(RuntimeTest, AfterTheEndNothingIsCalled)
-{
-    ASValue held;
-    Probe::s_run = [&](const Invocation& call) { held = call.arguments[0]; };
-    WriteMovie("probe.run({f: function() { probe.log('never'); }, v: 5});");
-    ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
-    ASSERT_EQ(Run().m_nErrorValue, AEError::OK);
-    ASValue result;
-    EXPECT_FALSE(held.GetObject()->Call("f", {}, result));
-    EXPECT_EQ(held.GetObject()->GetInt("v"), 5);
-    held = ASValue();
-    EXPECT_EQ(Probe::s_lines, Lines{});
-}
-
 // Before there is a set, when it is gone, and before it runs; and unknown codes.
 TEST_F(RuntimeTest, StopRequestsAreForTheSetThatIsThere)
 {

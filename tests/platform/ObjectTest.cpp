@@ -63,20 +63,19 @@ TEST_F(RuntimeTest, ClassesAndLengthsAreTold)
 TEST_F(RuntimeTest, NativeInstancesAndIdentity)
 {
     Probe::s_run = [](const Invocation& call) {
-        ASSERT_EQ(call.arguments.size(), 4u);
-        EXPECT_EQ(call.arguments[0].GetObject(), &call.object);
-        EXPECT_EQ(call.arguments[0].GetObject()->GetExtensionInstance(), call.object.GetExtensionInstance());
-        ASExtensionClass* pOther = call.arguments[1].GetObject()->GetExtensionInstance();
-        EXPECT_NE(pOther, nullptr);
-        EXPECT_NE(pOther, call.object.GetExtensionInstance());
-        EXPECT_EQ(call.arguments[2].GetObject()->GetExtensionInstance(), nullptr);
-        EXPECT_EQ(call.arguments[3].GetObject()->GetExtensionInstance(), nullptr);
+        ASObject& object = *call.arguments[0].GetObject();
+        const ASExtensionClass* pInstance = object.GetExtensionInstance();
+        const bool isOwn = pInstance == call.object.GetExtensionInstance();
+        Probe::s_lines.push_back(!pInstance ? "none" : isOwn ? "own" : "other");
+        EXPECT_EQ(&object == &call.object, isOwn);
         ASValue again;
-        EXPECT_TRUE(call.arguments[2].GetObject()->GetProperty("probe", again));
-        EXPECT_EQ(again.GetObject(), &call.object);
+        EXPECT_TRUE(object.GetProperty("self", again));
+        EXPECT_EQ(again.GetObject(), &object);
     };
     // An object that merely inherits from an instance is none.
-    Logged("probe.run(probe, new Probe(), {probe: probe}, Object.create(probe));");
+    EXPECT_EQ(
+        Logged("[probe, new Probe(), {}, Object.create(probe)].forEach(function(o) { o.self = o; probe.run(o); });"),
+        (Lines{"own", "other", "none", "none"}));
 }
 
 TEST_F(RuntimeTest, CallsPassThisArgumentsAndResult)
@@ -190,16 +189,23 @@ TEST_F(RuntimeTest, CollectedInstancesAreDestructedWhileTheMovieRuns)
               Lines{"all"});
 }
 
-TEST_F(RuntimeTest, ReferencesOutliveTheSet)
+TEST_F(RuntimeTest, ReferencesOutliveMovieAndSet)
 {
     ASValue object, instance;
     Probe::s_run = [&](const Invocation& call) {
         object = call.arguments[0];
         instance = ASValue::Object(&call.object);
     };
-    Logged("probe.run({v: 1, f: function() {}});");
+    WriteMovie("probe.run({v: 5, f: function() { probe.log('never'); }});");
+    ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
+    ASSERT_EQ(Run().m_nErrorValue, AEError::OK);
+    ASValue value;
+    EXPECT_FALSE(object.GetObject()->Call("f", {}, value)) << "the movie has ended";
+    EXPECT_EQ(object.GetObject()->GetInt("v"), 5);
+    EXPECT_EQ(Probe::s_lines, Lines{});
+    EXPECT_EQ(Destroy().m_nErrorValue, AEError::OK);
     EXPECT_EQ(instance.GetObject()->GetExtensionInstance(), nullptr);
-    ASValue value = ASValue::Number(1);
+    value = ASValue::Number(1);
     EXPECT_FALSE(object.GetObject()->GetProperty("v", value));
     EXPECT_STREQ(TypeName(value), "undefined");
     EXPECT_FALSE(object.GetObject()->SetProperty("v", object));
