@@ -121,15 +121,11 @@ TEST(Methods, StandInTheOrderAndKindsThatMoviesRestOn)
     EXPECT_FALSE(ZVWSLibAE::FiresEvents());
 }
 
-TEST(Methods, Print)
+TEST(Methods, PrintAndLookAtFiles)
 {
     testing::internal::CaptureStdout();
     Report("com.orvex.ZVWSLib.trace('é ' + 1); ws.trace(null); ws.trace();\n");
     EXPECT_EQ("FLASH TRACE == é 1\nFLASH TRACE == null\nFLASH TRACE == \n", testing::internal::GetCapturedStdout());
-}
-
-TEST(Methods, LookAtFiles)
-{
     const TempFolder folder;
     const std::string name = folder.Write("file", "abc");
     EXPECT_EQ(

@@ -70,29 +70,26 @@ TEST_F(Log, TargetsAndFailures)
     EXPECT_NE(std::string::npos, testing::internal::GetCapturedStdout().find("to the console"));
 }
 
-TEST_F(Log, AMovieSetsItUp)
+TEST_F(Log, AMovieSetsItUpUnlessTheEnvironmentDoes)
 {
-    const MovieRun run = RunMovie(
-        "var lib = com.orvex.ZVWSLib;\n"
-        "report([lib.setLogAreaIDsAndTargetConfig(), lib.setLogAreaIDsAndTargetConfig('0x100'),\n"
-        "    lib.setLogAreaIDsAndTargetConfig({LogAreaIDs: '0x100', LogTarget: 2, SettingsFile: '" +
-        m_Folder +
-        "settings.xml'})]);\n"
-        "var ws = new lib(); ws.getNavigation();\n");
-    EXPECT_EQ("-3,-3,0\n", run.Text());
-    EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
-}
-
-TEST_F(Log, TheEnvironmentOverridesTheMovie)
-{
-    setenv("ZV_LOG", ("0x100,02," + m_Folder).c_str(), 1);
-    const MovieRun run = RunMovie(
-        "var lib = com.orvex.ZVWSLib;\n"
-        "report(lib.setLogAreaIDsAndTargetConfig({LogAreaIDs: 0, LogTarget: 1, PreferenceFile: '/no/such/p'}));\n"
-        "new lib().getNavigation();\n");
-    unsetenv("ZV_LOG");
-    EXPECT_EQ("0\n", run.Text());
-    EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
+    const std::pair<std::string, std::string> rows[] = {
+        {"", "{LogAreaIDs: '0x100', LogTarget: 2, SettingsFile: '" + m_Folder + "settings.xml'}"},
+        {"0x100,02," + m_Folder, "{LogAreaIDs: 0, LogTarget: 1, PreferenceFile: '/no/such/p'}"}};
+    for (const auto& [variable, parameters] : rows) {
+        variable.empty() ? unsetenv("ZV_LOG") : setenv("ZV_LOG", variable.c_str(), 1);
+        const MovieRun run = RunMovie(
+            "var lib = com.orvex.ZVWSLib;\n"
+            "report([lib.setLogAreaIDsAndTargetConfig(" +
+            parameters + "), new lib().getNavigation()]);\n");
+        unsetenv("ZV_LOG");
+        EXPECT_EQ("0,-1\n", run.Text());
+        EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
+        std::filesystem::remove(m_Folder + "log.txt");
+    }
+    EXPECT_EQ("-3,-3\n", RunMovie("var lib = com.orvex.ZVWSLib;\n"
+                                  "report([lib.setLogAreaIDsAndTargetConfig(),\n"
+                                  "    lib.setLogAreaIDsAndTargetConfig('0x100')]);\n")
+                             .Text());
 }
 
 }  // namespace

@@ -41,26 +41,19 @@ struct Writer {
 template <class T>
 T Argument()
 {
-    return static_cast<T>(1);
-}
-template <>
-const char* Argument()
-{
-    return "0042";
-}
-template <>
-const ZV_WS_Pagination* Argument()
-{
+    static const int kNumber = 7;  // and arrays have the length 1
     static ZV_WS_Pagination page;
     page.CurrentPageNumber = 1;
     page.ItemsPerPage = 2;
-    return &page;
-}
-template <>
-const int* Argument()
-{
-    static const int kNumber = 7;  // and arrays have the length 1
-    return &kNumber;
+    if constexpr (std::is_same_v<T, const char*>) {
+        return "0042";
+    } else if constexpr (std::is_same_v<T, const ZV_WS_Pagination*>) {
+        return &page;
+    } else if constexpr (std::is_same_v<T, const int*>) {
+        return &kNumber;
+    } else {
+        return static_cast<T>(1);
+    }
 }
 
 template <class... Parameters>

@@ -24,9 +24,12 @@ Peer::~Peer()
 void Peer::Attach(soap& context)
 {
     context.fopen = Open;
-    context.fsend = Send;
+    context.fsend = [](soap*, const char*, size_t) { return SOAP_OK; };
     context.frecv = Receive;
-    context.fclosesocket = CloseSocket;
+    context.fclosesocket = [](soap*, SOAP_SOCKET socket) {
+        --s_Current->m_Open;
+        return close(socket);
+    };
 }
 
 SOAP_SOCKET Peer::Open(soap* context, const char*, const char*, int)
@@ -42,11 +45,6 @@ SOAP_SOCKET Peer::Open(soap* context, const char*, const char*, int)
     return eventfd(0, EFD_CLOEXEC);  // polls like a connection on which nothing has come
 }
 
-int Peer::Send(soap*, const char*, size_t)
-{
-    return SOAP_OK;
-}
-
 size_t Peer::Receive(soap*, char* buffer, size_t size)
 {
     Peer& self = *s_Current;
@@ -54,12 +52,6 @@ size_t Peer::Receive(soap*, char* buffer, size_t size)
     memcpy(buffer, self.m_Answer.data() + self.m_At, count);
     self.m_At += count;
     return count;
-}
-
-int Peer::CloseSocket(soap*, SOAP_SOCKET socket)
-{
-    --s_Current->m_Open;
-    return close(socket);
 }
 
 void MemoryCache::Preset(std::string_view text)
@@ -105,8 +97,8 @@ PeerSession::PeerSession()
     own.m_Stream.SetParams(&params);
     own.m_Download.SetParams(&params);
     own.m_Facade.Init(&own.m_Stream, &own.m_Download, ACCESS_TYPE_STREAM);
-    for (soap* context :
-         {static_cast<soap*>(&own.m_Browse), static_cast<soap*>(&own.m_Stream), static_cast<soap*>(&own.m_Download)})
-        Peer::Attach(*context);
+    Peer::Attach(own.m_Browse);
+    Peer::Attach(own.m_Stream);
+    Peer::Attach(own.m_Download);
     own.m_Cache = std::make_unique<MemoryCache>();
 }

@@ -26,9 +26,7 @@ public:
 
 private:
     static SOAP_SOCKET Open(soap* context, const char* endpoint, const char* host, int port);
-    static int Send(soap* context, const char* data, size_t length);
     static size_t Receive(soap* context, char* buffer, size_t size);
-    static int CloseSocket(soap* context, SOAP_SOCKET socket);
 
     static Peer* s_Current;
     const std::string_view m_Answer;

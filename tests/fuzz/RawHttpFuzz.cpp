@@ -5,13 +5,13 @@
 #include <sys/socket.h>
 #include <unistd.h>
 
-#include <filesystem>
 #include <thread>
 
 #include "BoxArtDownloader.h"
 #include "MemoryFile.h"
 #include "Peer.h"
 #include "Target.h"
+#include "TempFolder.h"
 #include "ZVUtilities.h"
 
 namespace {
@@ -40,28 +40,17 @@ void ImageToMemory(ZV_WS_Session* handle)
     ZV_WS_release(&image);
 }
 
-class Folder {
-public:
-    Folder() { Require(mkdtemp(m_Path) != nullptr, "a folder can be made"); }
-    ~Folder() { std::filesystem::remove_all(m_Path); }
-    ZVString File() const { return ZVString(m_Path) + "/image.jpg"; }
-    ptrdiff_t Entries() const
-    {
-        return std::distance(std::filesystem::directory_iterator(m_Path), std::filesystem::directory_iterator());
-    }
-
-private:
-    char m_Path[32] = "/tmp/zvimageXXXXXX";
-};
-
 void ImageToFile(SessionImpl& session)
 {
-    const Folder folder;
+    const TempFolder folder;
+    const std::string file = folder / "image.jpg";
     BoxArtDownloader downloader(session.m_Download.transport());
-    const ZV_WS_Status status = downloader.DownloadToFile("ZV00001", BOX_ART_SIZE_95, "", folder.File());
-    Require(folder.Entries() == (status == ZV_WS_Status_ok), "a whole image is left, or nothing");
+    const ZV_WS_Status status = downloader.DownloadToFile("ZV00001", BOX_ART_SIZE_95, "", file.c_str());
+    const std::filesystem::directory_iterator entries(folder / "");
+    Require(std::distance(begin(entries), end(entries)) == (status == ZV_WS_Status_ok),
+            "a whole image is left, or nothing");
     if (status != ZV_WS_Status_ok) return;
-    Require(std::filesystem::file_size(folder.File().c_str()) == downloader.GetContentLength(), "the file is whole");
+    Require(std::filesystem::file_size(file) == downloader.GetContentLength(), "the file is whole");
 }
 
 // The clock is asked without a session, over a connection of its own.

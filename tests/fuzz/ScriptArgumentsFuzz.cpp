@@ -10,26 +10,17 @@ namespace {
 
 // ---- The records into which arguments are read
 
-struct Checker {
-    void operator()(const char*, const AEString& text)
-    {
-        Require(text.c_str()[text.length()] == '\0', "texts are terminated");
-    }
-    void operator()(const char*, const AEArray<int>& numbers)
-    {
-        Require(numbers.size() <= 10000, "arrays have a bound");
-    }
-    template <class Other>
-    void operator()(const char*, const Other&)
-    {}
-};
-
 template <class Param>
 void Read(ASObject& object, Param param)
 {
     PropertyReader reader(object);
     param.ReadWith(reader);
-    param.ReadWith(Checker());
+    param.ReadWith([](const char*, const auto& value) {
+        using Value = std::decay_t<decltype(value)>;
+        if constexpr (std::is_same_v<Value, AEString>)
+            Require(value.c_str()[value.length()] == '\0', "texts are terminated");
+        if constexpr (std::is_same_v<Value, AEArray<int>>) Require(value.size() <= 10000, "arrays have a bound");
+    });
 }
 
 #define RECORDS(DO)                                                                                           \
@@ -42,23 +33,12 @@ using ReadFunction = void (*)(ASObject& object);
 #define READER(record) [](ASObject& object) { Read(object, record()); },
 const ReadFunction kReaders[] = {RECORDS(READER)};
 
-struct Namer {
-    std::string& names;
-
-    template <class Field>
-    void operator()(const char* name, Field& /*field*/)
-    {
-        names += name;
-        names += '\n';
-    }
-};
-
 // The properties' names, a line each.
 const std::string& Names()
 {
     static const std::string* const all = [] {
         auto* names = new std::string("length\n0\n1\nonComplete\nCurrentPageNumber\nItemsPerPage\n");
-#define NAMER(record) record().ReadWith(Namer{*names});
+#define NAMER(record) record().ReadWith([names](const char* name, auto&) { names->append(name).append("\n"); });
         RECORDS(NAMER)
         return names;
     }();
@@ -151,20 +131,14 @@ private:
         return text;
     }
 
-    std::string Array(int depth)
+    std::string Items(int depth, bool isArray)
     {
-        std::string text = "[";
-        for (unsigned int count = Next() % 6; count > 0; --count)
-            text += Value(depth + 1) + ",";
-        return text + "]";
-    }
-
-    std::string Object(int depth)
-    {
-        std::string text = "{";
-        for (unsigned int count = Next() % 12; count > 0; --count)
-            text.append(text.size() > 1 ? ", " : "").append(Name()).append(": ").append(Value(depth + 1));
-        return text + "}";
+        std::string text;
+        for (unsigned int count = Next() % (isArray ? 6 : 12); count > 0; --count) {
+            if (!isArray) text.append(Name()).append(": ");
+            text.append(Value(depth + 1)).append(",");
+        }
+        return isArray ? "[" + text + "]" : "{" + text + "}";
     }
 
     std::string Getter(int depth)
@@ -192,8 +166,8 @@ private:
         if (depth > 3 || kind < 96) return std::string("(") + kPlain[kind % std::size(kPlain)] + ")";
         if (kind < 120) return Text();
         if (kind < 144) return Number();
-        if (kind < 176) return Array(depth);
-        return kind < 184 ? Getter(depth) : Object(depth);
+        if (kind >= 176 && kind < 184) return Getter(depth);
+        return Items(depth, kind < 176);
     }
 
     std::string_view m_Input;

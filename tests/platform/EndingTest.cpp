@@ -36,32 +36,9 @@ TEST_F(RuntimeTest, MoviesEndAndNothingFollows)
         EXPECT_EQ(Logged(pScript), expected) << pScript;
 }
 
-TEST_F(RuntimeTest, AfterTheEndNothingIsCalled)
+// Before there is a set, when it is gone, and before it runs; and unknown codes.
+TEST_F(RuntimeTest, StopRequestsAreForTheSetThatIsThere)
 {
-    ASValue held;
-    Probe::s_run = [&](const Invocation& call) { held = call.arguments[0]; };
-    WriteMovie("probe.run({f: function() { probe.log('never'); }, v: 5});");
-    ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
-    ASSERT_EQ(Run().m_nErrorValue, AEError::OK);
-    ASValue result;
-    EXPECT_FALSE(held.GetObject()->Call("f", {}, result));
-    EXPECT_EQ(held.GetObject()->GetInt("v"), 5);
-    held = ASValue();
-    EXPECT_EQ(Probe::s_lines, Lines{});
-}
-
-TEST_F(RuntimeTest, AStopRequestBeforeTheRunStopsTheMovie)
-{
-    WriteMovie("probe.log('never');");
-    ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
-    m_pRuntime->SendRequest(IStagecraft::kRequestStop);
-    EXPECT_EQ(Run().m_nErrorValue, AEError::OK);
-    EXPECT_EQ(Probe::s_lines, Lines{});
-}
-
-TEST_F(RuntimeTest, OtherRequestsDoNothing)
-{
-    // Without a set; then for a set that is gone; then unknown codes.
     m_pRuntime->SendRequest(IStagecraft::kRequestStop);
     EXPECT_EQ(Logged("probe.log('one');"), Lines{"one"});
     m_pRuntime->SendRequest(IStagecraft::kRequestStop);
@@ -72,11 +49,16 @@ TEST_F(RuntimeTest, OtherRequestsDoNothing)
         }
     };
     EXPECT_EQ(Logged("probe.run(); setTimeout(function() { probe.log('three'); }, 0);"), Lines{"three"});
+    WriteMovie("probe.log('never');");
+    ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
+    m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+    EXPECT_EQ(Run().m_nErrorValue, AEError::OK);
+    EXPECT_EQ(Probe::s_lines, Lines{"three"});
 }
 
 TEST_F(RuntimeTest, AStopRequestComesBeforeTheNextTick)
 {
-    const Environment slow("STAGECRAFT_FPS", "1");
+    setenv("STAGECRAFT_FPS", "1", 1);
     std::promise<void> running;
     Probe::s_run = [&](const Invocation&) { running.set_value(); };
     std::thread listener([&] {

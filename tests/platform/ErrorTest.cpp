@@ -58,7 +58,7 @@ TEST_F(RuntimeTest, UnreadableMoviesAreOneLine)
     const std::string movie = m_movie;
     WriteMovie("probe.log('readable');");
     const std::pair<std::string, int> rows[] = {
-        {m_folder, EISDIR}, {m_folder + "/absent.js", ENOENT}, {movie + "/below.js", ENOTDIR}, {"", ENOENT}};
+        {m_folder / "", EISDIR}, {m_folder / "absent.js", ENOENT}, {movie + "/below.js", ENOTDIR}, {"", ENOENT}};
     for (const auto& [path, reason] : rows) {
         m_movie = path;
         testing::internal::CaptureStderr();

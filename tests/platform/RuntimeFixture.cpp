@@ -1,10 +1,6 @@
 #include "RuntimeFixture.h"
 
 #include <dlfcn.h>
-#include <unistd.h>
-
-#include <filesystem>
-#include <fstream>
 
 // ---- Probe
 
@@ -89,19 +85,12 @@ RuntimeTest::RuntimeTest()
     Probe::s_mainThread = std::this_thread::get_id();
     Probe::s_constructed = Probe::s_deleted = 0;
 
-    std::string pattern = (std::filesystem::temp_directory_path() / "movie-XXXXXX").string();
-    if (mkdtemp(pattern.data())) m_folder = pattern;
-    m_movie = m_folder + "/movie.js";
-}
-
-RuntimeTest::~RuntimeTest()
-{
-    if (!m_folder.empty()) std::filesystem::remove_all(m_folder);
+    setenv("STAGECRAFT_FPS", "200", 1);  // ticks come fast, so that tests end soon
+    unsetenv("STAGECRAFT_MOVIE");
 }
 
 void RuntimeTest::SetUp()
 {
-    ASSERT_FALSE(m_folder.empty());
     const char* pOther = getenv("STAGECRAFT_RUNTIME_LIBRARY");
     const char* pLibrary = pOther && *pOther ? pOther : RUNTIME_LIBRARY;
     m_pLibrary = dlopen(pLibrary, RTLD_NOW | RTLD_GLOBAL);
@@ -133,7 +122,7 @@ void RuntimeTest::TearDown()
 
 void RuntimeTest::WriteMovie(const std::string& script)
 {
-    std::ofstream(m_movie, std::ios::binary) << "var Probe = com.example.Probe, probe = new Probe();\n" << script;
+    m_folder.Write("movie.js", "var Probe = com.example.Probe, probe = new Probe();\n" + script);
 }
 
 AEError RuntimeTest::Create(const std::vector<const char*>& options)

@@ -8,11 +8,11 @@
 
 #include <cstdlib>
 #include <functional>
-#include <optional>
 #include <string>
 #include <thread>
 #include <vector>
 
+#include "TempFolder.h"
 #include "stagecraft/IAEKernel.h"
 #include "stagecraft/IStagecraft.h"
 
@@ -59,28 +59,9 @@ private:
     const std::string m_name;
 };
 
-// Sets a variable of the environment, or removes it (null), until the end of the scope.
-class Environment {
-public:
-    Environment(const char* pName, const char* pValue) : m_name(pName)
-    {
-        const char* pPrevious = getenv(pName);
-        if (pPrevious) m_previous = pPrevious;
-        pValue ? setenv(pName, pValue, 1) : unsetenv(pName);
-    }
-    ~Environment() { m_previous ? setenv(m_name.c_str(), m_previous->c_str(), 1) : unsetenv(m_name.c_str()); }
-    Environment(const Environment&) = delete;
-    Environment& operator=(const Environment&) = delete;
-
-private:
-    const std::string m_name;
-    std::optional<std::string> m_previous;
-};
-
 class RuntimeTest : public ::testing::Test {
 protected:
     RuntimeTest();
-    ~RuntimeTest() override;
     void SetUp() override;
     void TearDown() override;
 
@@ -100,14 +81,9 @@ protected:
     IAEModule_LoadModuleFunction m_loadModule = nullptr;
     IAEModule_UnloadModuleFunction m_unloadModule = nullptr;
     AEArray<StageWindow*> m_set;
-    std::string m_folder;
-    std::string m_movie;
+    const TempFolder m_folder;
+    std::string m_movie = m_folder / "movie.js";
     std::string m_errors;
-
-private:
-    // Ticks come fast, so that tests end soon; the movie is the one that the test writes.
-    Environment m_ticks{"STAGECRAFT_FPS", "200"};
-    Environment m_noOtherMovie{"STAGECRAFT_MOVIE", nullptr};
 };
 
 inline const char* TypeName(const ASValue& value)

@@ -31,23 +31,16 @@ TEST(Conversion, IntegersWrapLikeTheScriptsOwn)
 // Each row: an expression, and what native code makes of its value.
 using Rows = std::vector<std::pair<const char*, std::string>>;
 
-std::string RunEach(const Rows& rows)
-{
-    std::string script;
-    for (const auto& row : rows)
-        script += std::string("probe.run(") + row.first + ");\n";
-    return script;
-}
+class ValueTest : public RuntimeTest {
+protected:
+    void RunEach(const Rows& rows)
+    {
+        for (const auto& [pExpression, expected] : rows)
+            EXPECT_EQ(Logged(std::string("probe.run(") + pExpression + ");"), Lines{expected}) << pExpression;
+    }
+};
 
-Lines Seconds(const Rows& rows)
-{
-    Lines seconds;
-    for (const auto& row : rows)
-        seconds.push_back(row.second);
-    return seconds;
-}
-
-TEST_F(RuntimeTest, ArgumentsKeepTypeAndContent)
+TEST_F(ValueTest, ArgumentsKeepTypeAndContent)
 {
     const Rows rows = {
         {"undefined", "undefined nan undefined"},
@@ -79,10 +72,10 @@ TEST_F(RuntimeTest, ArgumentsKeepTypeAndContent)
         Probe::s_lines.push_back(std::string(TypeName(call.arguments[0])) + " " + digits + " " +
                                  std::string(text.c_str(), text.length()));
     };
-    EXPECT_EQ(Logged(RunEach(rows)), Seconds(rows));
+    RunEach(rows);
 }
 
-TEST_F(RuntimeTest, PropertiesConvert)
+TEST_F(ValueTest, PropertiesConvert)
 {
     const Rows rows = {
         {"{}", "0 0 0 "},
@@ -102,7 +95,7 @@ TEST_F(RuntimeTest, PropertiesConvert)
         Probe::s_lines.push_back(std::to_string(object.GetInt("v")) + " " + std::to_string(object.GetUint("v")) + " " +
                                  std::to_string(object.GetBoolean("v")) + " " + object.GetText("v").c_str());
     };
-    EXPECT_EQ(Logged(RunEach(rows)), Seconds(rows));
+    RunEach(rows);
 }
 
 TEST_F(RuntimeTest, ResultsKeepTypeAndContent)
@@ -155,8 +148,7 @@ TEST_F(RuntimeTest, FlashvarsAreDecoded)
 
 TEST_F(RuntimeTest, GlobalsReachOutputAndEnvironment)
 {
-    const Environment variable("MOVIE_VARIABLE", "gr\xC3\xBC");
-    const Environment absent("MOVIE_ABSENT", nullptr);
+    setenv("MOVIE_VARIABLE", "gr\xC3\xBC", 1);
     testing::internal::CaptureStdout();
     Logged("trace(getenv('MOVIE_VARIABLE')); trace(getenv('MOVIE_ABSENT') === null); trace(); trace({});");
     EXPECT_EQ(testing::internal::GetCapturedStdout(), "gr\xC3\xBC\ntrue\nundefined\n[object Object]\n");

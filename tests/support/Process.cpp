@@ -12,8 +12,6 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <filesystem>
-#include <fstream>
 
 namespace {
 
@@ -238,9 +236,6 @@ testing::AssertionResult IsMerge(const Lines& output, const Lines& one, const Li
     if (best == output.size() && best == one.size() + other.size() && reached[one.size()]) {
         return testing::AssertionSuccess();
     }
-    auto failure = testing::AssertionFailure() << "expected from line " << best + 1 << " on is something else:\n";
-    for (const std::string& line : output) {
-        failure << "    \"" << line << "\"\n";
-    }
-    return failure;
+    return testing::AssertionFailure() << "expected from line " << best + 1
+                                       << " on is something else: " << testing::PrintToString(output);
 }
