@@ -191,6 +191,15 @@ protected:
         EachTransport([](Transport& transport) { transport.Close(); });
     }
 
+    bool HasTemporaryFile() const
+    {
+        std::error_code none;
+        for (const auto& entry : std::filesystem::directory_iterator(store->DataFolder() + "/cache", none)) {
+            if (entry.path().filename().string().rfind("zvws", 0) == 0) return true;
+        }
+        return false;
+    }
+
     // Makes the next call, which meets a fault.
     void ExpectOutcome(int expected)
     {
@@ -206,6 +215,7 @@ protected:
             EXPECT_EQ(expected, outcome.status);
         }
         EXPECT_TRUE(outcome.status == 0 ? outcome.isWhole : outcome.isEmpty);
+        EXPECT_FALSE(HasTemporaryFile());
         store->ClearFaults();
         ExpectCached(outcome.status == 0 && kind.isCached);
         ExpectCached(kind.isCached);  // by now
