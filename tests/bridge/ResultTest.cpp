@@ -1,5 +1,6 @@
 // How records become script values: property order, nulls, arrays, dates.
 #include <gtest/gtest.h>
+#include <time.h>
 
 #include "MovieRun.h"
 
@@ -108,6 +109,7 @@ TEST(ResultObjects, ExpireDateIsALocalDateOrNull)
         {"99999/01/01 00:00:00", "null"},
     };
     setenv("TZ", "XXX-05:30", 1);
+    tzset();
     for (const auto& [text, shown] : rows) {
         ZV_WS_ProductListing product;
         product.ExpireDate = const_cast<char*>(text);

@@ -1,4 +1,6 @@
 // What native code does with script objects.
+#include <time.h>
+
 #include "RuntimeFixture.h"
 
 namespace {
@@ -40,6 +42,7 @@ TEST_F(RuntimeTest, ObjectsAndArraysAreBuilt)
         call.result = array;
     };
     setenv("TZ", "XXX-05:30", 1);
+    tzset();
     EXPECT_EQ(Logged("var r = probe.run(); probe.log(JSON.stringify(r), r instanceof Array, r[0] instanceof Object);"),
               Lines{R"([{"zebra":"first","Apple":1,"nothing":null},{"zebra":"second","Apple":1,"nothing":null},)"
                     R"("2011-01-31T18:29:58.000Z"] true true)"});
