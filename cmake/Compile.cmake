@@ -13,6 +13,7 @@ add_compile_options(-ffile-prefix-map=${PROJECT_SOURCE_DIR}/=./)
 if(ZV_SANITIZE)
     add_compile_options(-fsanitize=${ZV_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
     add_link_options(-fsanitize=${ZV_SANITIZE})
+    add_compile_definitions(ZV_SANITIZED)  # for tests that measure: sanitizers keep what is freed
 endif()
 # Assertions stay in every build type.
 string(REPLACE "-DNDEBUG" "" CMAKE_CXX_FLAGS_RELWITHDEBINFO "${CMAKE_CXX_FLAGS_RELWITHDEBINFO}")

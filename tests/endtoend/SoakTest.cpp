@@ -15,7 +15,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+#ifdef ZV_SANITIZED
 constexpr bool kSizeCounts = false;  // freed memory is kept back
 #else
 constexpr bool kSizeCounts = true;

@@ -278,7 +278,7 @@ TEST_P(FaultMatrix, OfConnections)
 }
 
 // Sanitizers keep what is freed, and shadows of all.
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+#ifndef ZV_SANITIZED
 
 long KilobytesOf(const char* name)
 {
