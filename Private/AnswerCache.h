@@ -46,12 +46,11 @@ public:
     bool Find(Response& response)
     {
         bool found = false;
-        GuardCall([&] {
+        WithinMemory([&] {
             ZVString text;
-            if (!Read(text)) return ZV_WS_Status_ok;
+            if (!Read(text)) return;
             m_Serializer = std::make_unique<Serializer>(true, false);
             found = m_Serializer->Read(text, response);
-            return ZV_WS_Status_ok;
         });
         return found;
     }
@@ -60,10 +59,9 @@ public:
     void Store(const Response& response)
     {
         if (!m_Entry.table || !m_Session.Caches(m_Entry.kind)) return;
-        GuardCall([&] {
+        WithinMemory([&] {
             ZVString text;
             if (Serializer(true, false).Write(response, text)) Write(text);
-            return ZV_WS_Status_ok;
         });
     }
 

@@ -8,6 +8,7 @@
 #include <memory>
 #include <new>
 
+#include "CallGuard.h"
 #include "Serializer.h"
 #include "soapStub.h"
 
@@ -85,12 +86,9 @@ struct CfgXMLReader {
     template <class Function>
     void Guard(Function&& function)
     {
-        try {
-            function();
-        } catch (const std::bad_alloc&) {
-            exhausted = true;
-            Refuse();
-        }
+        if (WithinMemory(function)) return;
+        exhausted = true;
+        Refuse();
     }
 
     void Refuse()

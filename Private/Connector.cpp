@@ -1,6 +1,5 @@
 #include "Connector.h"
 
-#include <arpa/inet.h>
 #include <errno.h>
 #include <netdb.h>
 #include <netinet/tcp.h>
@@ -13,17 +12,12 @@
 #include <memory>
 #include <string>
 
+#include "Deployment.h"
 #include "ZVUtilities.h"
 
 namespace {
 
 constexpr uint64_t kSlice = 100;  // milliseconds
-
-bool IsAddress(const char* host)
-{
-    unsigned char address[sizeof(in6_addr)];
-    return inet_pton(AF_INET, host, address) == 1 || inet_pton(AF_INET6, host, address) == 1;
-}
 
 int Connect(const addrinfo& to, const Patience& patience)
 {

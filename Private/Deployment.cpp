@@ -1,5 +1,6 @@
 #include "Deployment.h"
 
+#include <arpa/inet.h>
 #include <errno.h>
 #include <stdio.h>
 #include <stdlib.h>
@@ -171,6 +172,12 @@ const Deployment& Deployment::Current()
     }
     const Deployment* loaded = Load();
     return loaded ? *loaded : *registry.MakeCurrent(Defaults());
+}
+
+bool IsAddress(const char* host)
+{
+    unsigned char address[sizeof(in6_addr)];
+    return inet_pton(AF_INET, host, address) == 1 || inet_pton(AF_INET6, host, address) == 1;
 }
 
 bool SplitHostPort(const ZVString& hostPort, int defaultPort, ZVString& host, int& port)

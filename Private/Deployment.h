@@ -41,3 +41,6 @@ private:
 /// Splits "host:port"; `defaultPort` when there is no port. False for a host that is empty or holds characters that no
 /// host name has, and for a port outside of 1 to 65535.
 bool SplitHostPort(const ZVString& hostPort, int defaultPort, ZVString& host, int& port);
+
+/// Whether the host is given as an IPv4 or IPv6 address instead of a name.
+bool IsAddress(const char* host);

@@ -167,39 +167,35 @@ ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime)
 {
     ZV_ASSERT(serverTime != 0);
     *serverTime = -1;
-    const ZV_WS_Status status = GuardCall([&] {
-        const std::unique_ptr<soap, SoapDeleter> context(soap_new());
-        if (!context) return ZV_WS_Status_general_error;
-        Transport transport(*context);
-        transport.SetTimeouts(kClockTimeout, kClockTimeout);
-        RawHttp http(transport);
-        return ReadClock(http, Deployment::Current().web_host, *serverTime);
-    });
-    LogCall(__func__, status, 0);
-    return status;
+    return LogStatus(__func__, GuardCall([&] {
+                         const std::unique_ptr<soap, SoapDeleter> context(soap_new());
+                         if (!context) return ZV_WS_Status_general_error;
+                         Transport transport(*context);
+                         transport.SetTimeouts(kClockTimeout, kClockTimeout);
+                         RawHttp http(transport);
+                         return ReadClock(http, Deployment::Current().web_host, *serverTime);
+                     }));
 }
 
 ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSecond)
 {
     ZV_ASSERT(bitsPerSecond != 0);
     *bitsPerSecond = 0;
-    if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
-    const ZV_WS_Status status = GuardCall([&] { return CheckBandwidth(handle, *bitsPerSecond); });
-    LogCall(__func__, status, 0);
-    return status;
+    return LogStatus(__func__, GuardCall([&] {
+                         return SessionOf(handle) ? CheckBandwidth(handle, *bitsPerSecond) : ZV_WS_Status_invalid_param;
+                     }));
 }
 
 ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address)
 {
     ZV_ASSERT(address != 0);
-    const ZV_WS_Status status = GuardCall([&] {
-        Records::Tag(*address);
-        if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
-        ZVString text = OnlyAddress();
-        const ZV_WS_Status found = text.empty() ? AddressTowardsService(*handle->_pSessionImpl, text) : ZV_WS_Status_ok;
-        if (found == ZV_WS_Status_ok) ZVUtilities::SetText(*address, text);
-        return found;
-    });
-    LogCall(__func__, status, 0);
-    return status;
+    return LogStatus(__func__, GuardCall([&] {
+                         Records::Tag(*address);
+                         if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
+                         ZVString text = OnlyAddress();
+                         const ZV_WS_Status found =
+                             text.empty() ? AddressTowardsService(*handle->_pSessionImpl, text) : ZV_WS_Status_ok;
+                         if (found == ZV_WS_Status_ok) ZVUtilities::SetText(*address, text);
+                         return found;
+                     }));
 }

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <new>
 
+#include "CallGuard.h"
 #include "Namespaces.h"
 #include "ReadLimits.h"
 
@@ -62,12 +63,7 @@ int Serializer::Serializer_fsend(soap* context, const char* data, size_t length)
 {
     auto* pSerializer = static_cast<Serializer*>(context);
     ZV_ASSERT(pSerializer != 0);
-    try {
-        pSerializer->xml.append(data, length);
-    } catch (const std::bad_alloc&) {
-        return SOAP_EOM;
-    }
-    return SOAP_OK;
+    return WithinMemory([&] { pSerializer->xml.append(data, length); }) ? SOAP_OK : SOAP_EOM;
 }
 
 size_t Serializer::Serializer_frecv(soap* context, char* buffer, size_t size)
@@ -78,10 +74,6 @@ size_t Serializer::Serializer_frecv(soap* context, char* buffer, size_t size)
     const size_t count = std::min(xml.length(), size);
     if (count == 0) return 0;
     memcpy(buffer, xml.c_str(), count);
-    try {
-        xml = xml.substr(count);
-    } catch (const std::bad_alloc&) {
-        return 0;  // an early end, which the reader reports
-    }
-    return count;
+    // 0 is an early end, which the reader reports.
+    return WithinMemory([&] { xml = xml.substr(count); }) ? count : 0;
 }

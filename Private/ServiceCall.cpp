@@ -28,6 +28,12 @@ void LogCall(const char* function, int result, int responseCode)
     ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, ret:%d,responseCode:%d\n", function, result, responseCode);
 }
 
+ZV_WS_Status LogStatus(const char* function, ZV_WS_Status status)
+{
+    LogCall(function, status, 0);
+    return status;
+}
+
 ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status)
 {
     if (status != ZV_WS_Status_ok || !session.m_Cache) return status;
@@ -37,7 +43,7 @@ ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Stat
     });
 }
 
-ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, bool answer)
+ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, const bool& answer)
 {
     ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s, result:%d\n", function, answer);
     return status;

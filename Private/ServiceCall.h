@@ -57,10 +57,7 @@ public:
     void CacheAs(ZV_WS_CacheParam::CacheData kind, const char* table, const Arguments&... arguments)
     {
         // Without memory for the key the answer is not cached.
-        GuardCall([&] {
-            m_Entry = {kind, table, arguments...};
-            return ZV_WS_Status_ok;
-        });
+        WithinMemory([&] { m_Entry = {kind, table, arguments...}; });
     }
 
     /// Only when the call can be made.
@@ -103,10 +100,7 @@ public:
     {
         ZV_ASSERT(out != 0);
         if constexpr (Records::kIsRecord<Output>) {
-            m_Tagged = GuardCall([&] {
-                           Records::Tag(*out);
-                           return ZV_WS_Status_ok;
-                       }) == ZV_WS_Status_ok;
+            m_Tagged = WithinMemory([&] { Records::Tag(*out); });
         } else {
             *out = Output();
         }
@@ -128,11 +122,8 @@ public:
     {
         auto& service = Op::Service(*m_Session);
         Outcome outcome;
-        const ZV_WS_Status guarded = GuardCall([&] {
-            Make(service, convert, outcome);
-            return ZV_WS_Status_ok;
-        });
-        if (guarded != ZV_WS_Status_ok) service.transport().Close();  // left in the middle of something
+        if (!WithinMemory([&] { Make(service, convert, outcome); }))
+            service.transport().Close();  // left in the middle of something
         return Finish(service, outcome);
     }
 
@@ -217,11 +208,15 @@ inline ZV1__ArrayOfInt BorrowedInts(const int* numbers, unsigned int count)
 /// status.
 ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status);
 
-/// The line with which every call ends; those that ask no operation give their status as the result.
+/// The line with which every call ends.
 void LogCall(const char* function, int result, int responseCode);
 
-/// Logs the answer of a yes-or-no call; returns its status.
-ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, bool answer);
+/// The same for a call that asks no operation; returns its status.
+ZV_WS_Status LogStatus(const char* function, ZV_WS_Status status);
+
+/// Logs the answer of a yes-or-no call; returns its status. The answer is a reference since the call that gives it may
+/// be an argument, too.
+ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, const bool& answer);
 
 template <class Service, class Send>
 int ServiceCallBase::Exchange(Service& service, const char* operation, bool changes, Send&& send)

@@ -1,6 +1,5 @@
 #include "Tls.h"
 
-#include <arpa/inet.h>
 #include <openssl/err.h>
 #include <openssl/x509v3.h>
 #include <stdio.h>
@@ -10,6 +9,7 @@
 #include <string>
 #include <utility>
 
+#include "Deployment.h"
 #include "ZVMutex.h"
 
 namespace {
@@ -18,12 +18,6 @@ namespace {
 struct Library {
     Library() { soap_ssl_init(); }
 };
-
-bool IsAddress(const std::string& host)
-{
-    unsigned char address[sizeof(in6_addr)];
-    return inet_pton(AF_INET, host.c_str(), address) == 1 || inet_pton(AF_INET6, host.c_str(), address) == 1;
-}
 
 class Contexts {
 public:
@@ -97,8 +91,8 @@ private:
         X509_VERIFY_PARAM* verify = SSL_CTX_get0_param(context);
         X509_VERIFY_PARAM_set_hostflags(verify,
                                         X509_CHECK_FLAG_NO_PARTIAL_WILDCARDS | X509_CHECK_FLAG_NEVER_CHECK_SUBJECT);
-        const int named = IsAddress(host) ? X509_VERIFY_PARAM_set1_ip_asc(verify, host.c_str())
-                                          : X509_VERIFY_PARAM_set1_host(verify, host.c_str(), host.size());
+        const int named = IsAddress(host.c_str()) ? X509_VERIFY_PARAM_set1_ip_asc(verify, host.c_str())
+                                                  : X509_VERIFY_PARAM_set1_host(verify, host.c_str(), host.size());
         if (named == 1) return context;
         SSL_CTX_free(context);
         return nullptr;

@@ -22,7 +22,7 @@ ZV_WS_Status ChangeItem(const char* function, ZV_WS_Session* handle, int titleID
     call->TitleID = titleID;
     const ZV_WS_Status status = DropStale(call.session(), kListTable, call.Into(answer));
     CacheInterface* cache = call.session().m_Cache.get();
-    if (status == ZV_WS_Status_ok && cache) cache->WriteWishlistFlag(titleID, wished);
+    if (status == ZV_WS_Status_ok && cache) WithinMemory([&] { cache->WriteWishlistFlag(titleID, wished); });
     return status;
 }
 
@@ -97,7 +97,7 @@ ZV_WS_Status ZV_WS_removeAllItemsFromWishlist(ZV_WS_Session* handle, ZV_WS_Stand
     const ZV_WS_Status status = Ask<Operation::removeAllItemsFromWishList>(__func__, handle, answer);
     if (status != ZV_WS_Status_ok) return status;
     const SessionImpl& session = *handle->_pSessionImpl;
-    if (session.m_Cache) session.m_Cache->RemoveAllWishlistFlags();
+    if (session.m_Cache) WithinMemory([&] { session.m_Cache->RemoveAllWishlistFlags(); });
     return DropStale(session, kListTable, status);
 }
 
@@ -106,14 +106,13 @@ ZV_WS_Status ZV_WS_checkTitleInWishlist(ZV_WS_Session* handle, int titleID, bool
     ServiceCall<Operation::getTitleListing> call(__func__, handle, isInWishlist);
     if (!call.Accepts()) return call.Refusal();
     CacheInterface* cache = call.session().m_Cache.get();
-    if (cache && cache->ReadWishlistFlag(titleID, *isInWishlist)) {
-        LogCall(__func__, ZV_WS_Status_ok, 0);
-        return LogAnswer(__func__, ZV_WS_Status_ok, *isInWishlist);
-    }
+    bool isKnown = false;
+    if (cache) WithinMemory([&] { isKnown = cache->ReadWishlistFlag(titleID, *isInWishlist); });
+    if (isKnown) return LogAnswer(__func__, LogStatus(__func__, ZV_WS_Status_ok), *isInWishlist);
     call->TitleID = titleID;
     const ZV_WS_Status status =
         call.Into([&](const ZV1__TitleListingResponse* listing) { *isInWishlist = listing->IsAvailInUserWishList; });
-    if (cache && status == ZV_WS_Status_ok) cache->WriteWishlistFlag(titleID, *isInWishlist);
+    if (cache && status == ZV_WS_Status_ok) WithinMemory([&] { cache->WriteWishlistFlag(titleID, *isInWishlist); });
     return LogAnswer(__func__, status, *isInWishlist);
 }
 
@@ -121,23 +120,23 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
                                          ZV_WS_TitleTypeFilter typeFilter, ZV_WS_TitlesInWishlist* answers)
 {
     ZV_ASSERT(answers != 0);
-    const ZV_WS_Status status = GuardCall([&] {
-        Records::Tag(*answers);
-        if (!SessionOf(handle) || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
-        const SessionImpl& session = *handle->_pSessionImpl;
-        Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
-        if (count == 0 || (session.m_Cache && ReadFlags(session, titleIDs, *answers))) return ZV_WS_Status_ok;
-        std::set<int> wished;
-        const ZV_WS_Status listed = ReadList(handle, typeFilter, wished);
-        if (listed != ZV_WS_Status_ok) {
-            Records::FreeMembers(*answers);
-            return listed;
-        }
-        std::transform(titleIDs, titleIDs + count, answers->IsAvailInUserWishlist,
-                       [&](int titleID) { return wished.count(titleID) != 0; });
-        if (session.m_Cache) WriteFlags(session, titleIDs, *answers, typeFilter == TITLE_TYPE_FILTER_ANY);
-        return ZV_WS_Status_ok;
-    });
-    LogCall(__func__, status, 0);
-    return status;
+    return LogStatus(__func__, GuardCall([&] {
+                         Records::Tag(*answers);
+                         if (!SessionOf(handle) || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
+                         const SessionImpl& session = *handle->_pSessionImpl;
+                         Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
+                         if (count == 0 || (session.m_Cache && ReadFlags(session, titleIDs, *answers)))
+                             return ZV_WS_Status_ok;
+                         std::set<int> wished;
+                         const ZV_WS_Status status = ReadList(handle, typeFilter, wished);
+                         if (status != ZV_WS_Status_ok) {
+                             Records::FreeMembers(*answers);
+                             return status;
+                         }
+                         std::transform(titleIDs, titleIDs + count, answers->IsAvailInUserWishlist,
+                                        [&](int titleID) { return wished.count(titleID) != 0; });
+                         if (session.m_Cache)
+                             WriteFlags(session, titleIDs, *answers, typeFilter == TITLE_TYPE_FILTER_ANY);
+                         return ZV_WS_Status_ok;
+                     }));
 }

@@ -7,6 +7,7 @@
 #include <memory>
 #include <new>
 
+#include "CallGuard.h"
 #include "ZV_LogImpl.h"
 
 namespace {
@@ -95,21 +96,17 @@ void ZV_Log::Emit(const ZVString& line, unsigned int length)
 void ZV_Log::Output(int id, int severity, const char* text)
 {
     if (!WouldOutput(id, severity)) return;
-    try {
-        Emit(LineStart(id) + text, 0);
-    } catch (const std::bad_alloc&) {
-    }
+    WithinMemory([&] { Emit(LineStart(id) + text, 0); });
 }
 
 void ZV_Log::Output(int id, int severity, const char* text, unsigned int length)
 {
     if (!WouldOutput(id, severity)) return;
-    try {
+    WithinMemory([&] {
         ZVString line = LineStart(id);
         line.append(text, length);
         Emit(line, static_cast<unsigned int>(line.length()));
-    } catch (const std::bad_alloc&) {
-    }
+    });
 }
 
 // ---- Targets

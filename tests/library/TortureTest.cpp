@@ -243,6 +243,25 @@ TEST_F(Torture, ACallWithoutMemory)
     }
 }
 
+// Asked from the service, and then what the cache knows beside its answers is written and read.
+TEST_F(Torture, AWishListWithoutMemory)
+{
+    Begin(ZV_WS_CacheParam::CacheData_Userdata);
+    CacheInterface& cache = *session._pSessionImpl->m_Cache;
+    bool isWished = false;
+    const Case check = {[&] { cache.RemoveWishlistFlag(12); },
+                        [&] { return ZV_WS_checkTitleInWishlist(&session, 12, &isWished); },
+                        [&](ZV_WS_Status) { return std::to_string(isWished); }};
+    Exhaust(check, LONG_MAX, 1, 1);
+    ZV_WS_StandardResponse answer;
+    const Case clear = {[] {}, [&] { return ZV_WS_removeAllItemsFromWishlist(&session, &answer); },
+                        [&](ZV_WS_Status) {
+                            ZV_WS_release(&answer);
+                            return std::string();
+                        }};
+    Exhaust(clear, LONG_MAX, 1, 1);
+}
+
 // With a full handshake it is some 2600 allocations, and all of them would take half a minute. Those of the request and
 // of opening the connection come first, each of them fails; those of the answer come last, and fail above.
 TEST_F(Torture, ACallOverANewConnectionWithoutMemory)
