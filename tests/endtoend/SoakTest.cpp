@@ -109,10 +109,10 @@ TEST(Soak, NothingGrows)
     const int calls = wanted ? atoi(wanted) : kFewCalls;
     const int mark = calls / 10;
     ASSERT_GE(calls, 100) << "ZV_SOAK_CALLS";
-    std::mt19937 random(std::random_device{}());
-    const std::string seed = std::to_string(random() % 1000000 + 1);
+    const unsigned int number = std::random_device{}() % 1000000 + 1;
+    const std::string seed = std::to_string(number);
     printf("seed %s\n", seed.c_str());
-    random.seed(static_cast<unsigned int>(atoi(seed.c_str())));
+    std::mt19937 random(number);
 
     std::string error;
     const auto store = Storefront::Start(StorefrontOptions(), error);
