@@ -1,4 +1,5 @@
 // Refreshing and clearing the local cache.
+#include "CacheMgr.h"
 #include "ServiceCall.h"
 #include "ZVFile.h"
 #include "ZV_Log.h"
@@ -59,6 +60,7 @@ ZV_WS_Status ZV_WS_clearLocalCache(const char* folder)
     return GuardCall([&] {
         ZVString path = folder;
         if (path[path.length() - 1] != ZVFile::PATH_SEPERATOR) path += "/";
+        CacheMgr::CountDrop();
         for (const char* pattern : {"*.jpg", "*.zv", "zvws*"}) {
             if (!ZVFile::RemoveWithWildcard((path + pattern).c_str())) return ZV_WS_Status_file_operation_error;
         }

@@ -7,6 +7,8 @@
 // empty, when that kind of data is not cached, or when the database fails. Texts are bytes: NUL bytes are kept.
 #pragma once
 
+#include <stdint.h>
+
 #include <vector>
 
 #include "ZVString.h"
@@ -25,6 +27,11 @@ typedef std::vector<bool> ZVWS_BoolVector;
 class CacheInterface {
 public:
     virtual ~CacheInterface() = default;
+
+    /// How often answers or user data were dropped in this process (refreshed, purged, evicted, cleared, lost with a
+    /// broken file), by whatever cache. What somebody remembers of a cache's content holds as long as this number. Any
+    /// thread.
+    static uint64_t Drops();
 
     /// Closes, then opens with a copy of the parameters. 0, else SQLite's result code and the cache stays closed. A
     /// cache of CacheType_None opens with 0 and refuses every operation.

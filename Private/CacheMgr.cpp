@@ -3,6 +3,8 @@
 #include <sqlite3.h>
 #include <stdio.h>
 
+#include <atomic>
+
 #include "BoxArtNames.h"
 #include "ZVFile.h"
 
@@ -64,7 +66,19 @@ ZVString WishlistKey(int titleId)
     return text;
 }
 
+std::atomic<uint64_t> s_Drops{0};
+
 }  // namespace
+
+uint64_t CacheInterface::Drops()
+{
+    return s_Drops;
+}
+
+void CacheMgr::CountDrop()
+{
+    ++s_Drops;
+}
 
 CacheMgr::~CacheMgr()
 {
@@ -222,6 +236,7 @@ void CacheMgr::LimitHandler(CacheParam::CacheData kind)
     // Answers and user data go together: an answer that outlives the flags behind it would contradict them.
     Execute("DELETE FROM Service");
     Execute("DELETE FROM Userdata");
+    CountDrop();
 }
 
 bool CacheMgr::IsOver(unsigned int limit, const char* sumOfSizes)
@@ -299,6 +314,7 @@ bool CacheMgr::UpdateLastCacheLoadTime(const ZVString& time)
         ZVString stored;
         if (ExecuteSQL("SELECT LastLoadTime FROM Cache WHERE ID = 1", stored) != SQLITE_OK) return false;
         if (stored == time) return true;
+        CountDrop();
         return Run("INSERT OR REPLACE INTO Cache(ID, LastLoadTime) VALUES(1, ?)", time) == SQLITE_DONE &&
                Execute("DELETE FROM Service");
     });
@@ -307,6 +323,7 @@ bool CacheMgr::UpdateLastCacheLoadTime(const ZVString& time)
 bool CacheMgr::PurgeUserData(const ZVString& name)
 {
     return Perform(Allows(CacheParam::CacheData_UserData), [&] {
+        CountDrop();
         const bool purged = name.empty() ? Execute("DELETE FROM Userdata")
                                          : Run("DELETE FROM Userdata WHERE Name = ?", name) == SQLITE_DONE;
         if (Allows(CacheParam::CacheData_Service, name.empty() || name == kWishlistFlag)) {

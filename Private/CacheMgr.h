@@ -37,6 +37,9 @@ public:
     bool RemoveWishlistFlag(int titleId) override;
     bool RemoveAllWishlistFlags() override;
 
+    /// Counts something that was dropped past this class: removed files.
+    static void CountDrop();
+
 private:
     /// Whether an operation on that kind of data may go to the database at all. `given`: its required texts are there.
     bool Allows(ZV_WS_CacheParam::CacheData kind, bool given = true) const;
