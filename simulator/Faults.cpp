@@ -32,6 +32,7 @@ const struct {
     {"stall-body", kAnswers, "half of the body, and then nothing"},
     {"stall-handshake", kConnect, "the beginning of a handshake record, and then nothing"},
     {"drip:N", kAnswers, "the answer in single bytes, N milliseconds (100) apart"},
+    {"hold", kAnswers, "the right answer, made now and kept back until the faults are cleared"},
     {"split:N", kAnswers, "header and body in two writes, N milliseconds (50) apart"},
     {"garbage", kAnswers, "200, and a body that is no XML"},
     {"no-http", kAnswers | kConnect, "bytes that are no HTTP (connect: no TLS)"},
@@ -165,6 +166,7 @@ Fault Faults::Take(const std::string& operation)
         Fault fault = list.front();
         if (--list.front().count <= 0) list.pop_front();
         if (fault.Is("ok")) fault.kind.clear();
+        fault.clears = m_Clears;
         return fault;
     }
     return Fault();
@@ -174,6 +176,22 @@ void Faults::Clear()
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
     m_Lists.clear();
+    ++m_Clears;
+    m_Changed.notify_all();
+}
+
+bool Faults::WaitForClear(const Fault& fault)
+{
+    std::unique_lock<std::mutex> lock(m_Mutex);
+    m_Changed.wait(lock, [&] { return m_Ended || m_Clears != fault.clears; });
+    return !m_Ended;
+}
+
+void Faults::End()
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    m_Ended = true;
+    m_Changed.notify_all();
 }
 
 std::string Faults::Pending() const

@@ -1,6 +1,7 @@
 // Ordered lists of faults, one for each operation, consumed one a request.
 #pragma once
 
+#include <condition_variable>
 #include <deque>
 #include <map>
 #include <mutex>
@@ -12,6 +13,7 @@ struct Fault {
     int delay = 0;  ///< Milliseconds before the answer.
     int count = 1;
     bool afterEffect = false;  ///< What the request asks for is done although the answer claims otherwise.
+    unsigned long clears = 0;  ///< How often the lists had been cleared when it was taken.
 
     bool Is(const char* name) const { return kind == name; }
     int Number(int standard) const;
@@ -25,7 +27,11 @@ public:
     /// The next fault for the operation, taken off its list; the list "any" counts for every request without an own
     /// one.
     Fault Take(const std::string& operation);
+    /// Also lets go of the answers that are held.
     void Clear();
+    /// Waits until the lists are cleared once more than when the fault was taken. False when the simulator ends first.
+    bool WaitForClear(const Fault& fault);
+    void End();
     /// What still waits, a list entry a line.
     std::string Pending() const;
 
@@ -33,5 +39,8 @@ public:
 
 private:
     mutable std::mutex m_Mutex;
+    std::condition_variable m_Changed;
+    unsigned long m_Clears = 0;
+    bool m_Ended = false;
     std::map<std::string, std::deque<Fault>> m_Lists;
 };

@@ -27,8 +27,8 @@ std::string WithUnknownEnum(std::string xml)
 // Whether the fault says that the request was not carried out.
 bool ClaimsFailure(const Fault& fault)
 {
-    static const std::array<const char*, 9> kHarmless = {
-        "", "soap12", "drip", "split", "long", "must-understand", "extra-header", "unknown-enum", "stall-body"};
+    static const std::array<const char*, 10> kHarmless = {
+        "", "soap12", "drip", "split", "long", "must-understand", "extra-header", "unknown-enum", "stall-body", "hold"};
     for (const char* kind : kHarmless) {
         if (fault.Is(kind)) return false;
     }

@@ -139,6 +139,7 @@ Simulator::~Simulator()
         const std::lock_guard<std::mutex> lock(m_Mutex);
         m_Ended = true;
         m_Ending.notify_all();
+        m_Faults.End();
         for (const int descriptor : m_Open)
             shutdown(descriptor, SHUT_RDWR);
     }
@@ -461,6 +462,7 @@ bool Simulator::SendFaulty(Channel& channel, const std::string& head, const std:
     if (fault.Is("short")) return channel.Write(head + body), channel.Close(), false;
     if (fault.Is("long")) return channel.Write(head + body + "left over");
     if (fault.Is("endless")) return SendEndless(channel, head, half);
+    if (fault.Is("hold")) return m_Faults.WaitForClear(fault) && channel.Write(head + body);
     if (fault.Is("drip")) return SendDrip(channel, head + body, fault.Number(100));
     if (fault.Is("split")) return channel.Write(head) && Pause(fault.Number(50)) && channel.Write(body);
     if (fault.Is("stall") || fault.Is("stall-body")) {
