@@ -2,13 +2,16 @@
 // load.
 //
 // A cache belongs to one session and, like it, to one thread at a time. Nothing here asks the network; an operation may
-// wait up to 10 seconds for another process that holds the cache's file. Every operation returns false (and has changed
-// nothing, unless its comment says otherwise) when the cache is not open, when the name, prefix or written value is
-// empty, when that kind of data is not cached, or when the database fails. Texts are bytes: NUL bytes are kept.
+// wait up to 10 seconds for another process that holds the cache's file. Every operation is kept whole or not at all,
+// and returns false, with nothing changed, when the cache is not open, when the name, prefix or written value is empty,
+// when that kind of data is not cached, or when the database fails. A file that turns out to be broken is made anew:
+// the operation that met it is a miss, those after it work. One that another process keeps locked is left alone for a
+// minute, in which every operation returns false. Either is one line in the log. Texts are bytes: NUL bytes are kept.
 #pragma once
 
 #include <stdint.h>
 
+#include <functional>
 #include <vector>
 
 #include "ZVString.h"
@@ -19,6 +22,15 @@ struct ZV_WS_CacheParam2 {
     int flags = 0;              ///< ZV_WS_CacheParam::CacheData bits: the kinds of data cached.
     unsigned int size = 0;      ///< Bytes for all kinds together; 0 is no limit.
     ZVString path;              ///< The database file of CacheType_File; box-art files lie in its folder.
+};
+
+/// An image's row: the image itself is in a file beside the database.
+struct ZV_BoxArtRow {
+    ZVString prefix;
+    ZV_WS_BoxArtSize dim = BOX_ART_SIZE_95;
+    unsigned int size = 0;  ///< Bytes of the file.
+    ZVString lastModified;
+    unsigned int needUpdate = 0;
 };
 
 typedef std::vector<int> ZVWS_IntVector;
@@ -69,9 +81,26 @@ public:
     /// `flag` is false when it returns false.
     virtual bool ReadWishlistFlag(int titleId, bool& flag) = 0;
     virtual bool WriteWishlistFlag(int titleId, bool flag) = 0;
-    /// A flag for each title, written from the last to the first. The vectors are equally long and not empty. After a
-    /// failure the flags before it stay written. The budget is not looked at.
+    /// A flag for each title, written from the last to the first; all of them or none. The vectors are equally long and
+    /// not empty. The budget is not looked at.
     virtual bool WriteWishlistFlags(const ZVWS_IntVector& titleIds, const ZVWS_BoolVector& flags) = 0;
     virtual bool RemoveWishlistFlag(int titleId) = 0;
     virtual bool RemoveAllWishlistFlags() = 0;
+
+    // ---- Several operations as one.
+    /// What `work` does with this cache is kept when it returns true and nothing of it otherwise, under one lock and
+    /// with the flushes of one operation. It may be called twice. False also when `work` never ran.
+    virtual bool Together(const std::function<bool()>& work) = 0;
+    /// The same for reads alone, which keep nobody out.
+    virtual bool Look(const std::function<bool()>& work) = 0;
+
+    /// A number that changes whenever answers or user data are dropped because they may be wrong from then on, by
+    /// whichever process: what was asked before such a change must not be kept after it. 0 when it cannot be told.
+    virtual unsigned int Generation() = 0;
+
+    /// WriteBoxArt for several images of a file cache. `evicted` becomes true when others had to make room.
+    virtual bool WriteBoxArts(const std::vector<ZV_BoxArtRow>& rows, bool& evicted) = 0;
+
+    /// How long operations wait for another process from now on, in milliseconds; 10,000 after Open.
+    virtual void SetPatience(int milliseconds) = 0;
 };

@@ -1,18 +1,33 @@
 #include "CacheMgr.h"
 
+#include <errno.h>
+#include <fcntl.h>
 #include <sqlite3.h>
 #include <stdio.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
+#include <algorithm>
 #include <atomic>
 
 #include "BoxArtNames.h"
 #include "ZVFile.h"
+#include "ZVUtilities.h"
+#include "ZV_Log.h"
+
+ZV_LOG_AREA(ZVWS_SoapProxyLOG_AREA_NAME)
 
 typedef ZV_WS_CacheParam CacheParam;
 
 namespace {
 
-constexpr int kBusyWait = 10000;  // milliseconds
+constexpr int kBusyWait = 10000;        // milliseconds
+constexpr uint64_t kLeftAlone = 60000;  // milliseconds
+constexpr unsigned int kGenerations = 0x7ffffffe;
+constexpr mode_t kPrivate = 0600;  // it holds an e-mail address and the digits of a card
+
+// SQLite keeps a number for its user in the file's header, which every change of the file writes anyway.
+const char kGeneration[] = "PRAGMA user_version";
 
 const char kWishlistFlag[] = "WishlistFlag";
 
@@ -66,6 +81,21 @@ ZVString WishlistKey(int titleId)
     return text;
 }
 
+// A file of ours before SQLite makes it, so that nobody else may ever read it. SQLite gives the journal the same mode.
+void MakePrivateFile(const char* path)
+{
+    const int made = open(path, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, kPrivate);
+    if (made >= 0) close(made);
+}
+
+// Takes a file of an earlier version away from the others. By its name: to open and close it would end the locks that
+// this process has on it.
+void MakePrivate(const char* path)
+{
+    struct stat file;
+    if (stat(path, &file) == 0 && (file.st_mode & 077) != 0) chmod(path, file.st_mode & kPrivate);
+}
+
 std::atomic<uint64_t> s_Drops{0};
 
 }  // namespace
@@ -80,6 +110,11 @@ void CacheMgr::CountDrop()
     ++s_Drops;
 }
 
+bool CacheMgr::IsLocked(int code)
+{
+    return (code & 0xff) == SQLITE_BUSY || (code & 0xff) == SQLITE_PROTOCOL;
+}
+
 CacheMgr::~CacheMgr()
 {
     CacheMgr::Close();
@@ -91,10 +126,15 @@ int CacheMgr::Open(const ZV_WS_CacheParam2& param)
 {
     Close();
     m_Param = param;
+    m_Patience = kBusyWait;
+    m_LeftAlone = 0;
     SplitBudget();
+    if (m_Param.type == CacheType_File) MakePrivate(m_Param.path.c_str());
     int code = Open_Internal();
     if (code == SQLITE_OK && m_Param.type != CacheType_None) {
-        code = CreateDBSchema();
+        m_Trouble = Trouble::None;
+        code = MakeTables();
+        if (m_Trouble == Trouble::Broken) code = Replace();
         m_Opened = code == SQLITE_OK;
     }
     Close_Internal(false);
@@ -134,10 +174,11 @@ void CacheMgr::SplitBudget()
 int CacheMgr::Open_Internal()
 {
     if (m_Param.type == CacheType_None || m_DB) return SQLITE_OK;
-    int code = m_Param.type == CacheType_Memory
-                   ? sqlite3_open_v2(":memory:", &m_DB, SQLITE_OPEN_READWRITE, nullptr)
-                   : sqlite3_open_v2(m_Param.path.c_str(), &m_DB, SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE, nullptr);
-    if (code == SQLITE_OK) code = sqlite3_busy_timeout(m_DB, kBusyWait);
+    const bool isFile = m_Param.type != CacheType_Memory;
+    if (isFile) MakePrivateFile(m_Param.path.c_str());
+    int code = Checked(sqlite3_open_v2(isFile ? m_Param.path.c_str() : ":memory:", &m_DB,
+                                       SQLITE_OPEN_READWRITE | (isFile ? SQLITE_OPEN_CREATE : 0), nullptr));
+    if (code == SQLITE_OK) code = sqlite3_busy_timeout(m_DB, m_Patience);
     if (code != SQLITE_OK) Close_Internal(true);
     return code;
 }
@@ -162,6 +203,27 @@ int CacheMgr::CreateDBSchema()
     return SQLITE_OK;
 }
 
+// A database that has its generation has had its tables: no transaction is needed to look after them.
+int CacheMgr::MakeTables()
+{
+    unsigned int generation = 0;
+    int code = ExecuteSQL(kGeneration, generation);
+    if (code != SQLITE_OK) return code;
+    if (generation != 0) return CreateDBSchema();
+    code = Run("BEGIN IMMEDIATE");
+    if (code == SQLITE_DONE) code = CreateDBSchema();
+    if (code == SQLITE_OK) code = ExecuteSQL(kGeneration, generation);
+    // At random: a file made anew must not seem to be the one before. Another process may have made it meanwhile.
+    if (code == SQLITE_OK && generation == 0) {
+        sqlite3_randomness(sizeof generation, &generation);
+        code = SetGeneration(generation % kGenerations + 1);
+    }
+    if (code == SQLITE_OK) code = Run("COMMIT");
+    if (code == SQLITE_DONE) return SQLITE_OK;
+    RollBack();
+    return code;
+}
+
 // ---- The shape of every operation
 
 bool CacheMgr::Allows(CacheParam::CacheData kind, bool given) const
@@ -170,23 +232,131 @@ bool CacheMgr::Allows(CacheParam::CacheData kind, bool given) const
 }
 
 template <class Work>
-bool CacheMgr::Perform(bool allowed, Work work)
+bool CacheMgr::Perform(Access access, bool allowed, Work work)
 {
-    struct Closing {
-        CacheMgr& cache;
-        ~Closing() { cache.Close_Internal(false); }
-    };
-    if (!allowed || Open_Internal() != SQLITE_OK) return false;
-    const Closing closing{*this};
-    return work();
+    if (!allowed) return false;
+    return m_IsPerforming ? work() : PerformWhole(access, work);
 }
+
+bool CacheMgr::PerformWhole(Access access, const std::function<bool()>& work)
+{
+    if (ZVUtilities::MillisecondTime() < m_LeftAlone) return false;
+    for (const bool isFirst : {true, false}) {
+        m_Trouble = Trouble::None;
+        m_Evicted.clear();
+        m_HasDropped = false;
+        if (Attempt(access, work)) {
+            if (m_HasDropped) CountDrop();
+            RemoveEvictedFiles();
+            return true;
+        }
+        if (m_Trouble != Trouble::NoTables) break;
+        // Somebody has removed the file, and SQLite made an empty one in its place.
+        if (!isFirst || Open_Internal() != SQLITE_OK || MakeTables() != SQLITE_OK) {
+            m_Trouble = Trouble::Broken;
+            break;
+        }
+        CountDrop();
+    }
+    if (m_Trouble == Trouble::Broken) Replace();
+    if (m_Trouble == Trouble::Locked) LeaveAlone();
+    Close_Internal(false);
+    return false;
+}
+
+bool CacheMgr::Attempt(Access access, const std::function<bool()>& work)
+{
+    struct Ending {
+        CacheMgr& cache;
+        ~Ending()
+        {
+            cache.m_IsPerforming = false;
+            cache.RollBack();
+            cache.Close_Internal(false);
+        }
+    };
+    if (Open_Internal() != SQLITE_OK) return false;
+    const Ending ending{*this};
+    RollBack();  // one that found no memory to be rolled back
+    if (access == Access::Write && Run("BEGIN IMMEDIATE") != SQLITE_DONE) return false;
+    m_IsPerforming = true;
+    const bool done = work() && m_Trouble == Trouble::None;
+    return done && (access == Access::Read || Execute("COMMIT"));
+}
+
+// What is not committed.
+void CacheMgr::RollBack()
+{
+    if (!m_DB || sqlite3_get_autocommit(m_DB) != 0) return;
+    sqlite3_finalize(m_Statement);
+    m_Statement = nullptr;
+    sqlite3_exec(m_DB, "ROLLBACK", nullptr, nullptr, nullptr);
+}
+
+// The journal goes first: left alone with a new file it would be played back into it.
+int CacheMgr::Replace()
+{
+    const char* path = m_Param.path.c_str();
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR, "CacheMgr: the cache is broken (%s) and made anew: %s\n",
+                 m_TroubleText.c_str(), path);
+    Close_Internal(true);
+    if (m_Param.type == CacheType_File) {
+        unlink((m_Param.path + "-journal").c_str());
+        unlink(path);
+    }
+    CountDrop();
+    const int code = Open_Internal();
+    return code == SQLITE_OK ? MakeTables() : code;
+}
+
+void CacheMgr::LeaveAlone()
+{
+    if (m_Patience != kBusyWait) return;
+    m_LeftAlone = ZVUtilities::MillisecondTime() + kLeftAlone;
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR,
+                 "CacheMgr: the cache is locked by another process and not used for a while: %s\n",
+                 m_Param.path.c_str());
+}
+
+int CacheMgr::Checked(int code)
+{
+    const int kind = code & 0xff;
+    const bool isBroken = kind == SQLITE_CORRUPT || kind == SQLITE_NOTADB;
+    if (isBroken || IsLocked(code)) {
+        m_Trouble = isBroken ? Trouble::Broken : Trouble::Locked;
+        m_TroubleText = m_DB ? sqlite3_errmsg(m_DB) : "";
+    }
+    return code;
+}
+
+bool CacheMgr::Together(const std::function<bool()>& work)
+{
+    return Perform(Access::Write, m_Opened, work);
+}
+
+bool CacheMgr::Look(const std::function<bool()>& work)
+{
+    return Perform(Access::Read, m_Opened, work);
+}
+
+// ---- Statements
 
 int CacheMgr::Prepare(const char* sql)
 {
     ZV_ASSERT(m_DB != 0);
     sqlite3_finalize(m_Statement);
     m_Statement = nullptr;
-    return sqlite3_prepare_v2(m_DB, sql, -1, &m_Statement, nullptr);
+    const int code = Checked(sqlite3_prepare_v2(m_DB, sql, -1, &m_Statement, nullptr));
+    if (code == SQLITE_ERROR) {
+        m_Trouble = Trouble::NoTables;
+        m_TroubleText = sqlite3_errmsg(m_DB);
+    }
+    return code;
+}
+
+int CacheMgr::Step()
+{
+    return Checked(sqlite3_step(m_Statement));
 }
 
 template <class... Values>
@@ -195,7 +365,7 @@ int CacheMgr::Run(const char* sql, const Values&... values)
     int code = Prepare(sql);
     int index = 0;
     ((code = code == SQLITE_OK ? Bind(m_Statement, ++index, values) : code), ...);
-    return code == SQLITE_OK ? sqlite3_step(m_Statement) : code;
+    return code == SQLITE_OK ? Step() : code;
 }
 
 int CacheMgr::ExecuteSQL(const ZVString& sql, ZVString& text)
@@ -221,6 +391,31 @@ bool CacheMgr::Execute(const char* sql)
     return Run(sql) == SQLITE_DONE;
 }
 
+// ---- Generations
+
+unsigned int CacheMgr::Generation()
+{
+    unsigned int generation = 0;
+    Perform(Access::Read, m_Opened, [&] { return ExecuteSQL(kGeneration, generation) == SQLITE_OK; });
+    return generation;
+}
+
+int CacheMgr::SetGeneration(unsigned int generation)
+{
+    char sql[64];
+    snprintf(sql, sizeof sql, "%s = %u", kGeneration, generation);
+    ZVString none;
+    return ExecuteSQL(sql, none);
+}
+
+bool CacheMgr::RaiseGeneration()
+{
+    m_HasDropped = true;
+    unsigned int generation = 0;
+    return ExecuteSQL(kGeneration, generation) == SQLITE_OK &&
+           SetGeneration(generation % kGenerations + 1) == SQLITE_OK;
+}
+
 // ---- Budgets
 
 void CacheMgr::LimitHandler(CacheParam::CacheData kind)
@@ -236,7 +431,7 @@ void CacheMgr::LimitHandler(CacheParam::CacheData kind)
     // Answers and user data go together: an answer that outlives the flags behind it would contradict them.
     Execute("DELETE FROM Service");
     Execute("DELETE FROM Userdata");
-    CountDrop();
+    m_HasDropped = true;
 }
 
 bool CacheMgr::IsOver(unsigned int limit, const char* sumOfSizes)
@@ -245,22 +440,25 @@ bool CacheMgr::IsOver(unsigned int limit, const char* sumOfSizes)
     return limit != 0 && ExecuteSQL(sumOfSizes, sum) == SQLITE_OK && sum > limit;
 }
 
-// Rows go before their files: a file without a row is replaced by the next download, a row without a file costs a miss.
 void CacheMgr::EvictTitles()
 {
-    std::vector<ZVString> files;
+    std::vector<Image> oldest;
     int code = Run("SELECT Prefix, Dim FROM BoxArt ORDER BY TS ASC LIMIT 10");
-    for (; code == SQLITE_ROW; code = sqlite3_step(m_Statement)) {
-        const auto dim = static_cast<ZV_WS_BoxArtSize>(sqlite3_column_int(m_Statement, 1));
-        files.push_back(
-            ZVUtilities::GetBoxArtImageFileName(m_Param.path.c_str(), ColumnBytes(m_Statement, 0).c_str(), dim));
+    for (; code == SQLITE_ROW; code = Step()) {
+        oldest.emplace_back(ColumnBytes(m_Statement, 0),
+                            static_cast<ZV_WS_BoxArtSize>(sqlite3_column_int(m_Statement, 1)));
     }
     // Every size of those titles, not only the rows selected.
-    const bool deleted =
-        Execute("DELETE FROM BoxArt WHERE Prefix in (SELECT Prefix FROM BoxArt ORDER BY TS ASC LIMIT 10)");
-    if (!deleted || m_Param.type != CacheType_File) return;
-    for (const ZVString& file : files)
-        ZVFile::Remove(file.c_str());
+    if (Execute("DELETE FROM BoxArt WHERE Prefix in (SELECT Prefix FROM BoxArt ORDER BY TS ASC LIMIT 10)"))
+        m_Evicted.insert(m_Evicted.end(), oldest.begin(), oldest.end());
+}
+
+// Rows go before their files: a file without a row is replaced by the next download, a row without a file costs a miss.
+void CacheMgr::RemoveEvictedFiles()
+{
+    if (m_Param.type != CacheType_File) return;
+    for (const auto& [prefix, dim] : m_Evicted)
+        ZVFile::Remove(ZVUtilities::GetBoxArtImageFileName(m_Param.path.c_str(), prefix.c_str(), dim).c_str());
 }
 
 // ---- Answers and user data
@@ -268,7 +466,7 @@ void CacheMgr::EvictTitles()
 bool CacheMgr::ReadValue(CacheParam::CacheData kind, const char* sql, const ZVString& name, const ZVString& key,
                          ZVString& value)
 {
-    return Perform(Allows(kind, !name.empty()), [&] {
+    return Perform(Access::Read, Allows(kind, !name.empty()), [&] {
         if (Run(sql, name, key) != SQLITE_ROW) return false;
         value = ColumnBytes(m_Statement, 0);
         return true;
@@ -278,7 +476,7 @@ bool CacheMgr::ReadValue(CacheParam::CacheData kind, const char* sql, const ZVSt
 bool CacheMgr::WriteValue(CacheParam::CacheData kind, const char* sql, const ZVString& name, const ZVString& key,
                           const ZVString& value)
 {
-    return Perform(Allows(kind, !name.empty() && !value.empty()), [&] {
+    return Perform(Access::Write, Allows(kind, !name.empty() && !value.empty()), [&] {
         LimitHandler(kind);
         return Run(sql, name, key, value, static_cast<sqlite3_int64>(value.length())) == SQLITE_DONE;
     });
@@ -310,41 +508,58 @@ bool CacheMgr::WriteUserData(const ZVString& name, const ZVString& key, const ZV
 
 bool CacheMgr::UpdateLastCacheLoadTime(const ZVString& time)
 {
-    return Perform(Allows(CacheParam::CacheData_Service, !time.empty()), [&] {
+    return Perform(Access::Write, Allows(CacheParam::CacheData_Service, !time.empty()), [&] {
         ZVString stored;
         if (ExecuteSQL("SELECT LastLoadTime FROM Cache WHERE ID = 1", stored) != SQLITE_OK) return false;
         if (stored == time) return true;
-        CountDrop();
         return Run("INSERT OR REPLACE INTO Cache(ID, LastLoadTime) VALUES(1, ?)", time) == SQLITE_DONE &&
-               Execute("DELETE FROM Service");
+               Execute("DELETE FROM Service") && RaiseGeneration();
     });
 }
 
 bool CacheMgr::PurgeUserData(const ZVString& name)
 {
-    return Perform(Allows(CacheParam::CacheData_UserData), [&] {
-        CountDrop();
-        const bool purged = name.empty() ? Execute("DELETE FROM Userdata")
-                                         : Run("DELETE FROM Userdata WHERE Name = ?", name) == SQLITE_DONE;
+    return Perform(Access::Write, Allows(CacheParam::CacheData_UserData), [&] {
+        bool purged = name.empty() ? Execute("DELETE FROM Userdata")
+                                   : Run("DELETE FROM Userdata WHERE Name = ?", name) == SQLITE_DONE;
         if (Allows(CacheParam::CacheData_Service, name.empty() || name == kWishlistFlag)) {
             for (const char* statement : kPurgeWishlistAnswers)
-                Execute(statement);
+                purged = purged && Execute(statement);
         }
-        return purged;
+        return purged && RaiseGeneration();
     });
 }
 
 // ---- Box art
 
+bool CacheMgr::InsertImage(const ZV_BoxArtRow& row, const ZVString& data)
+{
+    LimitHandler(CacheParam::CacheData_BoxArt);
+    m_HasEvicted = m_HasEvicted || !m_Evicted.empty();
+    // Its file is the one just written, not the one that was evicted.
+    m_Evicted.erase(std::remove(m_Evicted.begin(), m_Evicted.end(), Image(row.prefix, row.dim)), m_Evicted.end());
+    return Run("INSERT OR REPLACE INTO BoxArt(Prefix, Dim, Size, LastModified, NeedUpdate, Data) "
+               "VALUES (?, ?, ?, ?, ?, ?)",
+               row.prefix, row.dim, row.size, row.lastModified, row.needUpdate, Blob{data}) == SQLITE_DONE;
+}
+
 bool CacheMgr::WriteBoxArt(const ZVString& prefix, ZV_WS_BoxArtSize dim, unsigned int size,
                            const ZVString& lastModified, unsigned int needUpdate, const ZVString& data)
 {
-    return Perform(Allows(CacheParam::CacheData_BoxArt, !prefix.empty()), [&] {
-        LimitHandler(CacheParam::CacheData_BoxArt);
-        return Run("INSERT OR REPLACE INTO BoxArt(Prefix, Dim, Size, LastModified, NeedUpdate, Data) "
-                   "VALUES (?, ?, ?, ?, ?, ?)",
-                   prefix, dim, size, lastModified, needUpdate, Blob{data}) == SQLITE_DONE;
+    return Perform(Access::Write, Allows(CacheParam::CacheData_BoxArt, !prefix.empty()), [&] {
+        return InsertImage({prefix, dim, size, lastModified, needUpdate}, data);
     });
+}
+
+bool CacheMgr::WriteBoxArts(const std::vector<ZV_BoxArtRow>& rows, bool& evicted)
+{
+    m_HasEvicted = false;
+    const bool written = Perform(Access::Write, Allows(CacheParam::CacheData_BoxArt), [&] {
+        return std::all_of(rows.begin(), rows.end(),
+                           [&](const ZV_BoxArtRow& row) { return InsertImage(row, ZVString()); });
+    });
+    evicted = written && m_HasEvicted;
+    return written;
 }
 
 bool CacheMgr::ReadBoxArt(const ZVString& prefix, ZV_WS_BoxArtSize dim, unsigned int& size, ZVString& lastModified,
@@ -352,7 +567,7 @@ bool CacheMgr::ReadBoxArt(const ZVString& prefix, ZV_WS_BoxArtSize dim, unsigned
 {
     size = needUpdate = 0;
     lastModified = data = ZVString();
-    return Perform(Allows(CacheParam::CacheData_BoxArt, !prefix.empty()), [&] {
+    return Perform(Access::Read, Allows(CacheParam::CacheData_BoxArt, !prefix.empty()), [&] {
         const int code =
             Run("SELECT Size, LastModified, NeedUpdate, Data FROM BoxArt WHERE Prefix = ? AND Dim = ?", prefix, dim);
         if (code != SQLITE_ROW) return false;
@@ -366,7 +581,23 @@ bool CacheMgr::ReadBoxArt(const ZVString& prefix, ZV_WS_BoxArtSize dim, unsigned
 
 bool CacheMgr::SetBoxArtNeedUpdate()
 {
-    return Perform(Allows(CacheParam::CacheData_BoxArt), [&] { return Execute("UPDATE BoxArt SET NeedUpdate = 1"); });
+    return Perform(Access::Write, Allows(CacheParam::CacheData_BoxArt),
+                   [&] { return Execute("UPDATE BoxArt SET NeedUpdate = 1"); });
+}
+
+bool CacheMgr::ListImageFiles(const ZVString& path, std::set<std::string>& names)
+{
+    CacheMgr other;
+    other.m_Param.type = CacheType_File;
+    int code = sqlite3_open_v2(path.c_str(), &other.m_DB, SQLITE_OPEN_READWRITE, nullptr);
+    if (code == SQLITE_OK) code = other.Run("SELECT Prefix, Dim FROM BoxArt");
+    for (; code == SQLITE_ROW; code = other.Step()) {
+        const auto dim = static_cast<ZV_WS_BoxArtSize>(sqlite3_column_int(other.m_Statement, 1));
+        const ZVString prefix = ColumnBytes(other.m_Statement, 0);
+        names.insert(ZVFile::GetFileName(ZVUtilities::GetBoxArtImageFileName(path.c_str(), prefix.c_str(), dim).c_str())
+                         .c_str());
+    }
+    return code == SQLITE_DONE || other.m_Trouble == Trouble::Broken || other.m_Trouble == Trouble::NoTables;
 }
 
 // ---- Wish-list flags
@@ -388,7 +619,7 @@ bool CacheMgr::WriteWishlistFlag(int titleId, bool flag)
 bool CacheMgr::WriteWishlistFlags(const ZVWS_IntVector& titleIds, const ZVWS_BoolVector& flags)
 {
     const bool given = !titleIds.empty() && titleIds.size() == flags.size();
-    return Perform(Allows(CacheParam::CacheData_UserData, given), [&] {
+    return Perform(Access::Write, Allows(CacheParam::CacheData_UserData, given), [&] {
         if (Prepare("INSERT OR REPLACE INTO Userdata(Name, Key, Value, Size) VALUES ('WishlistFlag', ?, ?, 1)") !=
             SQLITE_OK) {
             return false;
@@ -396,7 +627,7 @@ bool CacheMgr::WriteWishlistFlags(const ZVWS_IntVector& titleIds, const ZVWS_Boo
         for (size_t i = titleIds.size(); i-- > 0;) {
             const ZVString key = WishlistKey(titleIds[i]), value = flags[i] ? "1" : "0";
             const bool written = Bind(m_Statement, 1, key) == SQLITE_OK && Bind(m_Statement, 2, value) == SQLITE_OK &&
-                                 sqlite3_step(m_Statement) == SQLITE_DONE;
+                                 Step() == SQLITE_DONE;
             sqlite3_reset(m_Statement);
             if (!written) return false;
         }
@@ -406,7 +637,7 @@ bool CacheMgr::WriteWishlistFlags(const ZVWS_IntVector& titleIds, const ZVWS_Boo
 
 bool CacheMgr::RemoveWishlistFlag(int titleId)
 {
-    return Perform(Allows(CacheParam::CacheData_UserData), [&] {
+    return Perform(Access::Write, Allows(CacheParam::CacheData_UserData), [&] {
         return Run("DELETE FROM Userdata WHERE Name = 'WishlistFlag' AND Key = ?", WishlistKey(titleId)) == SQLITE_DONE;
     });
 }

@@ -2,11 +2,14 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <functional>
 #include <string>
 #include <vector>
 
 #include "CacheFile.h"
+#include "FakeSleep.h"
+#include "LogLines.h"
 #include "TempFolder.h"
 
 namespace {
@@ -67,6 +70,7 @@ protected:
 
     TempFolder m_Folder;
     std::string m_Path = m_Folder / "cache.zv";
+    LogLines m_Log;
     CacheMgr m_Cache;
 };
 
@@ -357,7 +361,7 @@ TEST_F(CacheMgrTest, WritesFlagsFromTheLastToTheFirst)
     CacheFile(m_Path).Run(
         "CREATE TRIGGER refuse BEFORE INSERT ON Userdata WHEN NEW.Key = '2' BEGIN SELECT RAISE(ABORT, 'no'); END");
     EXPECT_FALSE(m_Cache.WriteWishlistFlags({1, 2, 3}, {true, true, true}));
-    EXPECT_EQ("3 7 ", CacheFile(m_Path).Query("SELECT Key FROM Userdata ORDER BY Key")) << "the last ones stay written";
+    EXPECT_EQ("7 ", CacheFile(m_Path).Query("SELECT Key FROM Userdata ORDER BY Key")) << "all of them or none";
 
     EXPECT_TRUE(Put(kUserData, "big", 200));
     EXPECT_TRUE(m_Cache.WriteWishlistFlags({4}, {true}));
@@ -368,32 +372,6 @@ TEST_F(CacheMgrTest, WritesFlagsFromTheLastToTheFirst)
 }
 
 // ---- Trouble
-
-// The default file system of SQLite, which calls `onSleep` in place of waiting.
-struct FakeSleep {
-    explicit FakeSleep(std::function<void()> onSleep) : original(sqlite3_vfs_find(nullptr)), vfs(*original)
-    {
-        vfs.zName = "test";
-        vfs.xSleep = [](sqlite3_vfs*, int microseconds) {
-            s_Slept += microseconds;
-            s_OnSleep();
-            return microseconds;
-        };
-        s_OnSleep = std::move(onSleep);
-        s_Slept = 0;
-        sqlite3_vfs_register(&vfs, 1);
-    }
-    ~FakeSleep()
-    {
-        sqlite3_vfs_unregister(&vfs);
-        sqlite3_vfs_register(original, 1);
-    }
-
-    static inline std::function<void()> s_OnSleep;
-    static inline int s_Slept;
-    sqlite3_vfs* original;
-    sqlite3_vfs vfs;
-};
 
 TEST_F(CacheMgrTest, WaitsTenSecondsForALockedFile)
 {
@@ -411,6 +389,12 @@ TEST_F(CacheMgrTest, WaitsTenSecondsForALockedFile)
     EXPECT_FALSE(Has(kService, "before"));
     EXPECT_NE(0, CacheMgr().Open(Param(CacheType_File)));
 
+    EXPECT_EQ(1, m_Log.Count("locked")) << "left alone from the first time on, without a further wait";
+
+    releases = true;
+    Open(CacheType_File);
+    EXPECT_FALSE(releases);
+    holder.Run("BEGIN EXCLUSIVE");
     releases = true;
     EXPECT_TRUE(Put(kService, "k", 1)) << "the lock went while it waited";
     EXPECT_FALSE(releases);
@@ -423,20 +407,56 @@ TEST_F(CacheMgrTest, WaitsTenSecondsForALockedFile)
 
 TEST_F(CacheMgrTest, AnUnusablePathIsACode)
 {
-    const std::string file = m_Folder.Write("garbage.zv", std::string(8192, 'g'));
-    m_Folder.Write("short.zv", "no database");
-    for (const char* name : {"garbage.zv", "short.zv", "garbage.zv/x.zv", "none/x.zv", ""}) {
+    m_Folder.Write("file", "");
+    std::filesystem::create_directory(m_Folder / "folder.zv");
+    for (const char* name : {"file/x.zv", "none/x.zv", "folder.zv", ""}) {
         ZV_WS_CacheParam2 param = Param(CacheType_File);
         param.path = Bytes(m_Folder / name);
         EXPECT_NE(0, m_Cache.Open(param)) << name;
         ExpectAll(m_Cache, 0, name);
     }
-    EXPECT_EQ(std::string(8192, 'g'), m_Folder.Read("garbage.zv")) << "what is no cache is not touched";
     EXPECT_EQ(0, m_Cache.Open(Param(CacheType_File))) << "a failure leaves nothing behind";
     ExpectAll(m_Cache, kAll, "opened after failures");
 }
 
-TEST_F(CacheMgrTest, ADatabaseThatBreaksWhileInUseIsFalse)
+// Damage in every page of a file, also in those that no opening looks at: whichever operation meets it is a miss, the
+// next one has a whole cache, and one line says why. What no operation meets harms nobody.
+TEST_F(CacheMgrTest, DamageAnywhereIsMetOnceAndMended)
+{
+    Open(CacheType_File, kAll, 100000000);  // with limits, for which every row is looked at
+    const ZVString keys[] = {"a", "b", "c"};
+    for (const ZVString& key : keys)
+        EXPECT_TRUE(Put(kService, key, 9000) && Put(kBoxArt, key, 9000) && Put(kUserData, key, 3000));
+    CacheFile(m_Path).Run("DELETE FROM Service WHERE Key = 'b'");
+    const std::string whole = m_Folder.Read("cache.zv");
+    const int pages = static_cast<int>(whole.size() / 4096);
+    ASSERT_GT(pages, 15);
+    int met = 0;
+    for (const char byte : {'\0', '\xee'}) {
+        for (int page = 0; page < pages; ++page) {
+            SCOPED_TRACE(testing::Message() << "page " << page << " of bytes " << int(byte));
+            std::string damaged = whole;
+            damaged.replace(4096u * static_cast<unsigned int>(page), 4096, 4096, byte);
+            m_Folder.Write("cache.zv", damaged);
+            m_Log.Clear();
+            for (const int kind : {kService, kBoxArt, kUserData}) {
+                for (const ZVString& key : keys)
+                    Has(kind, key);
+                Put(kind, "new", 9000);
+            }
+            for (const Operation& operation : Operations())
+                operation.run(m_Cache);
+            ExpectAll(m_Cache, kAll, "mended");
+            EXPECT_LE(m_Log.Count("broken"), 1);
+            if (m_Log.Count("broken") == 0) continue;
+            ++met;
+            EXPECT_EQ("ok ", CacheFile(m_Path).Query("PRAGMA integrity_check"));
+        }
+    }
+    EXPECT_GT(met, pages) << "hardly any damage was met";
+}
+
+TEST_F(CacheMgrTest, AFileThatIsNoDatabaseOrWentIsMadeAnew)
 {
     Open(CacheType_File, kAll, 1000);
     EXPECT_TRUE(Put(kService, "k", 600));
@@ -444,18 +464,91 @@ TEST_F(CacheMgrTest, ADatabaseThatBreaksWhileInUseIsFalse)
     const struct {
         const char* damage;
         std::string content;
+        bool isBroken;
     } rows[] = {
-        {"overwritten", std::string(whole.size(), 'x')},
-        {"all pages but the first overwritten", whole.substr(0, 4096) + std::string(whole.size() - 4096, '\xee')},
-        {"cut", whole.substr(0, 5000)},
-        {"emptied", ""},
+        {"no database", "no database", true},
+        {"overwritten", std::string(whole.size(), 'x'), true},
+        {"cut", whole.substr(0, 5000), true},
+        {"emptied", "", false},
+        {"removed", "-", false},
     };
     for (const auto& row : rows) {
-        m_Folder.Write("cache.zv", row.content);
-        ExpectAll(m_Cache, 0, row.damage);
+        for (const bool isOpen : {true, false}) {
+            SCOPED_TRACE(testing::Message() << row.damage << isOpen);
+            Open(CacheType_File, kAll, 1000);
+            if (!isOpen) m_Cache.Close();
+            m_Folder.Write("cache.zv-journal", "left over");
+            m_Folder.Write("cache.zv", row.content);
+            if (row.content == "-") std::filesystem::remove(m_Path);
+            m_Log.Clear();
+            if (!isOpen) Open(CacheType_File, kAll, 1000);
+            EXPECT_FALSE(Has(kService, "k"));
+            ExpectAll(m_Cache, kAll, "made anew");
+            EXPECT_EQ(row.isBroken, m_Log.Count("broken"));
+            EXPECT_FALSE(m_Folder.Has("cache.zv-journal"));
+        }
     }
-    m_Folder.Write("cache.zv", whole);
-    EXPECT_TRUE(Has(kService, "k")) << "the damage was the file's, not the object's";
+}
+
+TEST_F(CacheMgrTest, IsTheOwnersAlone)
+{
+    namespace fs = std::filesystem;
+    const auto isPrivate = [&] { return (fs::status(m_Path).permissions() & fs::perms(077)) == fs::perms(0); };
+    Open(CacheType_File);
+    EXPECT_TRUE(isPrivate());
+    fs::permissions(m_Path, fs::perms(0644));  // of an earlier version
+    Open(CacheType_File);
+    EXPECT_TRUE(isPrivate());
+    fs::remove(m_Path);
+    EXPECT_TRUE(Put(kService, "k", 1));
+    EXPECT_TRUE(isPrivate());
+}
+
+// ---- Several operations as one
+
+TEST_F(CacheMgrTest, WhatFailsInTheMiddleLeavesNothing)
+{
+    for (const int type : {CacheType_Memory, CacheType_File}) {
+        SCOPED_TRACE(type);
+        Open(type);
+        EXPECT_TRUE(Put(kUserData, "old", 1));
+        const unsigned int generation = m_Cache.Generation();
+        EXPECT_FALSE(m_Cache.Together(
+            [&] { return m_Cache.PurgeUserData("") && Put(kService, "new", 1) && m_Cache.WriteMetaData("", "", ""); }));
+        EXPECT_TRUE(Has(kUserData, "old"));
+        EXPECT_FALSE(Has(kService, "new"));
+        EXPECT_EQ(generation, m_Cache.Generation());
+        EXPECT_TRUE(m_Cache.Together([&] { return m_Cache.PurgeUserData("") && Put(kService, "new", 1); }));
+        EXPECT_TRUE(!Has(kUserData, "old") && Has(kService, "new"));
+    }
+}
+
+TEST_F(CacheMgrTest, GenerationsTellWhatWasDroppedByWhomever)
+{
+    Open(CacheType_File);
+    CacheMgr other;
+    ASSERT_EQ(0, other.Open(Param(CacheType_File)));
+    const struct {
+        const char* change;
+        std::function<bool()> make;
+        bool isNew;
+    } rows[] = {
+        {"an answer", [&] { return other.WriteMetaData("n", "k", "v"); }, false},
+        {"the same load time", [&] { return other.UpdateLastCacheLoadTime("1"); }, false},
+        {"a new load time", [&] { return other.UpdateLastCacheLoadTime("2"); }, true},
+        {"user data of a name", [&] { return other.PurgeUserData("getMyVideos"); }, true},
+        {"all flags", [&] { return other.RemoveAllWishlistFlags(); }, true},
+        {"another file", [&] { return std::filesystem::remove(m_Path) && other.WriteMetaData("n", "k", "v"); }, true},
+    };
+    EXPECT_TRUE(other.UpdateLastCacheLoadTime("1"));
+    for (const auto& row : rows) {
+        const unsigned int before = m_Cache.Generation();
+        const uint64_t drops = CacheInterface::Drops();
+        EXPECT_TRUE(row.make()) << row.change;
+        EXPECT_EQ(row.isNew, m_Cache.Generation() != before) << row.change;
+        EXPECT_EQ(row.isNew, CacheInterface::Drops() != drops) << row.change;
+        EXPECT_NE(0u, m_Cache.Generation());
+    }
 }
 
 }  // namespace
