@@ -5,6 +5,8 @@
 
 namespace {
 
+const char kVideosTable[] = "getMyVideos";
+
 // Both services' page of purchases; the operations differ in name, and what is downloaded is never cached.
 template <class Op, bool isCached>
 ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_Pagination* page,
@@ -12,9 +14,9 @@ ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_P
                       ZV_WS_MyVideosResponse* videos)
 {
     ServiceCall<Op> call(function, handle, videos);
-    if (!call.Accepts(page)) return call.Refusal();
+    if (!call.Accepts(IsPage(page))) return call.Refusal();
     if (isCached) {
-        call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, "getMyVideos", page->CurrentPageNumber, page->ItemsPerPage,
+        call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, kVideosTable, page->CurrentPageNumber, page->ItemsPerPage,
                      purchaseType, typeFilter, watchStatus);
     }
     SetPage(call, *page);
@@ -50,7 +52,7 @@ ZV_WS_Status ZV_WS_getTitleListingPurchaseds(ZV_WS_Session* handle, const int* p
                                              ZV_WS_TitleListingPurchasedArray* titles)
 {
     ServiceCall<Operation::getTitleListingsPurchasedForPasses> call(__func__, handle, titles);
-    if (!call.Accepts(passIDs || count == 0)) return call.Refusal();
+    if (!call.Accepts(IsArray(passIDs, count))) return call.Refusal();
     ZV1__ArrayOfInt ids = BorrowedInts(passIDs, count);
     call->Passes = &ids;
     return call.Into(titles);
@@ -80,7 +82,9 @@ ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* passw
     ServiceCall<Operation::removeAllMyPurchases> call(__func__, handle, answer);
     if (!call.Accepts(password && *password)) return call.Refusal();
     call->password = Text(password);
-    return DropStale(call.session(), "getMyVideos", call.Into(answer));
+    const ZV_WS_Status status = call.Into(answer);
+    DropStale(call, kVideosTable);
+    return status;
 }
 
 ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
@@ -139,7 +143,9 @@ ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, cons
     call->SkuID = skuID;
     call->IPAddress = Text(ipAddress);
     call->UsePrePaidFunds = Text(usePrepaidFund ? "yes" : "no");
-    return DropStale(call.session(), "getMyVideos", call.Into(purchase));
+    const ZV_WS_Status status = call.Into(purchase);
+    DropStale(call, kVideosTable);
+    return status;
 }
 
 ZV_WS_Status ZV_WS_calcOrderTax(ZV_WS_Session* handle, int skuID, ZV_WS_CalcOrderTaxResponse* tax)

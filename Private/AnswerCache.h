@@ -8,7 +8,7 @@
 
 #include "CallGuard.h"
 #include "Serializer.h"
-#include "SessionImpl.h"
+#include "SessionCache.h"
 
 class AnswerCache {
 public:
@@ -39,18 +39,20 @@ public:
         }
     };
 
-    AnswerCache(SessionImpl& session, const Entry& entry) : m_Session(session), m_Entry(entry) {}
+    AnswerCache(SessionImpl& session, const Entry& entry) : m_Session(session), m_Cache(session), m_Entry(entry) {}
 
-    /// Fills the response from the cache. What it points to lives as long as this object.
+    /// Fills the response from the cache. What it points to lives as long as this object. When there is none, the
+    /// request is to be sent after this.
     template <class Response>
     bool Find(Response& response)
     {
         bool found = false;
         WithinMemory([&] {
             ZVString text;
-            if (!Read(text)) return;
+            if (!m_Entry.table || !m_Cache.Find(m_Entry.kind, m_Entry.table, m_Entry.key, text, m_Stamp)) return;
             m_Serializer = std::make_unique<Serializer>(true, false);
             found = m_Serializer->Read(text, response);
+            if (!found) m_Stamp = m_Cache.Now();
         });
         return found;
     }
@@ -61,15 +63,15 @@ public:
         if (!m_Entry.table || !m_Session.Caches(m_Entry.kind)) return;
         WithinMemory([&] {
             ZVString text;
-            if (Serializer(true, false).Write(response, text)) Write(text);
+            if (Serializer(true, false).Write(response, text))
+                m_Cache.Keep(m_Entry.kind, m_Entry.table, m_Entry.key, text, m_Stamp);
         });
     }
 
 private:
-    bool Read(ZVString& text);
-    void Write(const ZVString& text);
-
-    SessionImpl& m_Session;
+    const SessionImpl& m_Session;
+    SessionCache m_Cache;
     const Entry& m_Entry;
+    SessionCache::Stamp m_Stamp;
     std::unique_ptr<Serializer> m_Serializer;
 };

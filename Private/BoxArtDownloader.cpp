@@ -4,7 +4,6 @@
 
 #include "BoxArtNames.h"
 #include "RawHttp.h"
-#include "ZVFile.h"
 #include "ZVUtilities.h"
 
 namespace {
@@ -20,58 +19,28 @@ ZVString ImagePath(const ZVString& prefix, ZV_WS_BoxArtSize size)
 
 }  // namespace
 
-// Takes an image's bytes: into memory, or into a temporary file that becomes the image when it is whole.
+// Takes an image's bytes: into memory, or into a file that becomes the image when it is whole.
 class BoxArtDownloader::Sink {
 public:
-    Sink(bool toFile, ZVString& target) : m_Target(target)
+    /// In memory when there is no file.
+    Sink(ImageFile* file, ZVString& target) : m_File(file), m_Target(target)
     {
-        if (toFile) {
-            m_Temporary = ZVFile::CreateTempFileName(target.c_str());
-            m_IsFile = true;
-        } else {
-            m_Target = ZVString();
-        }
-    }
-    ~Sink()
-    {
-        m_File.Close();
-        if (!m_Temporary.empty()) ZVFile::Remove(m_Temporary.c_str());
+        if (!file) target = ZVString();
     }
 
-    ZV_WS_Status Open()
-    {
-        if (!m_IsFile) return ZV_WS_Status_ok;
-        const bool opened = !m_Temporary.empty() && m_File.Open(m_Temporary.c_str(), "wb");
-        return opened ? ZV_WS_Status_ok : ZV_WS_Status_net_error;
-    }
+    ZV_WS_Status Open() { return !m_File || m_File->Create(m_Target) ? ZV_WS_Status_ok : ZV_WS_Status_net_error; }
 
     ZV_WS_Status Write(const char* bytes, size_t length)
     {
-        if (!m_IsFile) {
-            m_Target.append(bytes, length);
-            return ZV_WS_Status_ok;
-        }
-        const auto size = static_cast<zv_int64>(length);
-        return m_File.Write(bytes, size) == size ? ZV_WS_Status_ok : ZV_WS_Status_file_operation_error;
+        if (!m_File) m_Target.append(bytes, length);
+        return !m_File || m_File->Write(bytes, length) ? ZV_WS_Status_ok : ZV_WS_Status_file_operation_error;
     }
 
-    ZV_WS_Status Commit()
-    {
-        if (!m_IsFile) return ZV_WS_Status_ok;
-        // What stdio still holds may not fit on the disk; the old file stays until the new one is in its place.
-        const bool written = m_File.Flush();
-        m_File.Close();
-        if (!written || !ZVFile::Rename(m_Temporary.c_str(), m_Target.c_str()))
-            return ZV_WS_Status_file_operation_error;
-        m_Temporary = ZVString();
-        return ZV_WS_Status_ok;
-    }
+    ZV_WS_Status Commit() { return !m_File || m_File->Commit() ? ZV_WS_Status_ok : ZV_WS_Status_file_operation_error; }
 
 private:
+    ImageFile* m_File;
     ZVString& m_Target;
-    bool m_IsFile = false;
-    ZVString m_Temporary;
-    ZVFile m_File;
 };
 
 ZVString BoxArtDownloader::ImageURL(const Deployment& deployment, const ZVString& prefix, ZV_WS_BoxArtSize size)
@@ -84,9 +53,12 @@ ZV_WS_Status BoxArtDownloader::Download(const ZVString& prefix, ZV_WS_BoxArtSize
 {
     m_LastModified = ZVString();
     m_ContentLength = 0;
-    Sink sink(toFile, target);
-    const ZV_WS_Status status = Fetch(ImagePath(prefix, size), ifModifiedSince, sink);
-    return status == ZV_WS_Status_ok ? sink.Commit() : status;
+    m_File = toFile ? std::make_unique<ImageFile>() : nullptr;
+    Sink sink(m_File.get(), target);
+    ZV_WS_Status status = Fetch(ImagePath(prefix, size), ifModifiedSince, sink);
+    if (status == ZV_WS_Status_ok) status = sink.Commit();
+    if (status != ZV_WS_Status_ok) m_File.reset();
+    return status;
 }
 
 ZV_WS_Status BoxArtDownloader::Fetch(const ZVString& path, const ZVString& ifModifiedSince, Sink& sink)

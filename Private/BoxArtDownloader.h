@@ -1,6 +1,9 @@
 // Fetches title images from the image host, over the socket of a SOAP context.
 #pragma once
 
+#include <memory>
+
+#include "ImageFile.h"
 #include "Transport.h"
 #include "ZVWSLib.h"
 
@@ -27,6 +30,8 @@ public:
     /// Of the last image that was downloaded.
     ZVString GetLastModified() const { return m_LastModified; }
     unsigned int GetContentLength() const { return m_ContentLength; }
+    /// Its file, in its place and locked as long as the caller keeps it. Null for an image in memory.
+    std::unique_ptr<ImageFile> TakeFile() { return std::move(m_File); }
 
     /// The image's address.
     static ZVString ImageURL(const Deployment& deployment, const ZVString& prefix, ZV_WS_BoxArtSize size);
@@ -42,4 +47,5 @@ private:
     Transport& m_Transport;
     unsigned int m_ContentLength = 0;
     ZVString m_LastModified;
+    std::unique_ptr<ImageFile> m_File;
 };

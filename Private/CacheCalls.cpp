@@ -8,14 +8,15 @@ ZV_LOG_AREA(ZVWS_SoapProxyLOG_AREA_NAME)
 
 namespace {
 
-// Drops the catalogue's answers when the service has loaded a new catalogue.
-void RefreshMetadata(ZV_WS_Session* handle, CacheInterface& cache)
+// When the service loaded its catalogue last; empty when it does not say.
+ZVString LoadTime(ZV_WS_Session* handle)
 {
     ZV_WS_String time;
-    if (ZV_WS_getLastCacheLoadTimeUTC(handle, &time) == ZV_WS_Status_ok && time.data) {
-        cache.UpdateLastCacheLoadTime(time.data);
-    }
+    const ZV_WS_Status status = ZV_WS_getLastCacheLoadTimeUTC(handle, &time);
+    ZVString text;
+    WithinMemory([&] { text = status == ZV_WS_Status_ok && time.data ? time.data : ""; });
     ZV_WS_release(&time);
+    return text;
 }
 
 }  // namespace
@@ -42,14 +43,16 @@ ZV_WS_Status ZV_WS_getLastCacheLoadTimeUTC(ZV_WS_Session* handle, ZV_WS_String* 
 ZV_WS_Status ZV_WS_updateLocalCache(ZV_WS_Session* handle, unsigned int operations)
 {
     if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
-    const SessionImpl& session = *handle->_pSessionImpl;
+    SessionImpl& session = *handle->_pSessionImpl;
     const auto wanted = [&](ZV_WS_CacheParam::CacheData kind) {
         return (operations & kind) != 0 && session.Caches(kind);
     };
+    const bool metadata = wanted(ZV_WS_CacheParam::CacheData_Metadata);
+    const bool images = wanted(ZV_WS_CacheParam::CacheData_BoxArtImage);
+    const bool userData = wanted(ZV_WS_CacheParam::CacheData_Userdata);
+    if (!metadata && !images && !userData) return ZV_WS_Status_ok;
     return GuardCall([&] {
-        if (wanted(ZV_WS_CacheParam::CacheData_Metadata)) RefreshMetadata(handle, *session.m_Cache);
-        if (wanted(ZV_WS_CacheParam::CacheData_BoxArtImage)) session.m_Cache->SetBoxArtNeedUpdate();
-        if (wanted(ZV_WS_CacheParam::CacheData_Userdata)) session.m_Cache->PurgeUserData("");
+        SessionCache(session).Refresh(metadata ? LoadTime(handle) : ZVString(), images, userData);
         return ZV_WS_Status_ok;
     });
 }
@@ -60,10 +63,10 @@ ZV_WS_Status ZV_WS_clearLocalCache(const char* folder)
     return GuardCall([&] {
         ZVString path = folder;
         if (path[path.length() - 1] != ZVFile::PATH_SEPERATOR) path += "/";
+        bool removed = true;
+        for (const char* pattern : {"*.jpg", "*.zv", "zvws*"})
+            removed = removed && ZVFile::RemoveWithWildcard((path + pattern).c_str());
         CacheMgr::CountDrop();
-        for (const char* pattern : {"*.jpg", "*.zv", "zvws*"}) {
-            if (!ZVFile::RemoveWithWildcard((path + pattern).c_str())) return ZV_WS_Status_file_operation_error;
-        }
-        return ZV_WS_Status_ok;
+        return removed ? ZV_WS_Status_ok : ZV_WS_Status_file_operation_error;
     });
 }

@@ -17,7 +17,7 @@ ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pag
                              ZV_WS_TitlesResponse* titles)
 {
     ServiceCall<Operation::getTitlesByNavigation> call(__func__, handle, titles);
-    if (!call.Accepts(page)) return call.Refusal();
+    if (!call.Accepts(IsPage(page))) return call.Refusal();
     call.CacheAs(kMetadata, "getTitles", genreID, page->CurrentPageNumber, page->ItemsPerPage, purchaseType);
     call->GenreID = genreID;
     SetPage(call, *page);
@@ -30,7 +30,7 @@ ZV_WS_Status ZV_WS_getTitlesByGenreIDs(ZV_WS_Session* handle, const int* genreID
                                        ZV_WS_TitlesResponseArray* titles)
 {
     ServiceCall<Operation::getTitlesByGenreArray> call(__func__, handle, titles);
-    if (!call.Accepts(page && (genreIDs || count == 0))) return call.Refusal();
+    if (!call.Accepts(IsPage(page) && IsArray(genreIDs, count))) return call.Refusal();
     ZV1__ArrayOfInt ids = BorrowedInts(genreIDs, count);
     call->GenreIDs = &ids;
     SetPage(call, *page);
@@ -86,7 +86,7 @@ static ZV_WS_Status Search(const char* function, const char* table, ZV_WS_Sessio
                            ZV_WS_TitlesResponse* titles)
 {
     ServiceCall<Op> call(function, handle, titles);
-    if (!call.Accepts(page)) return call.Refusal();
+    if (!call.Accepts(IsPage(page))) return call.Refusal();
     call.CacheAs(kMetadata, table, page->CurrentPageNumber, page->ItemsPerPage, purchaseType, typeFilter, query);
     call->Query = Text(query);
     SetPage(call, *page);

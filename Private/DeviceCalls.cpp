@@ -1,6 +1,19 @@
 // The device at the service: what it may play, its activation and its settings.
 #include "ServiceCall.h"
 
+namespace {
+
+// The session and its duplicates are another customer's from now on, or nobody's.
+ZV_WS_Status ChangeAccount(SessionImpl& session, const char* token)
+{
+    return GuardCall([&] {
+        SessionCache(session).AccountChanged(token);
+        return ZV_WS_Status_ok;
+    });
+}
+
+}  // namespace
+
 ZV_WS_Status ZV_WS_getFileType(ZV_WS_Session* handle, ZV_WS_FileType* fileType)
 {
     return Ask<Operation::getFileType>(__func__, handle, fileType);
@@ -12,23 +25,23 @@ ZV_WS_Status ZV_WS_authorizeDevice(ZV_WS_Session* handle, const char* pin, ZV_WS
     if (!call.Accepts(pin && *pin)) return call.Refusal();
     call->PIN = Text(pin);
     const ZV_WS_Status status = call.Into(answer);
-    if (status != ZV_WS_Status_ok || !answer->AuthToken) return status;
-    return GuardCall([&] {
-        call.session().m_Params.AuthToken = answer->AuthToken;
-        return status;
-    });
+    if (status != ZV_WS_Status_ok) return status;
+    return ChangeAccount(call.session(), answer->AuthToken ? answer->AuthToken : "");
 }
 
 ZV_WS_Status ZV_WS_deactivateDevice(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer)
 {
-    return Ask<Operation::deactivateDevice>(__func__, handle, answer);
+    const ZV_WS_Status status = Ask<Operation::deactivateDevice>(__func__, handle, answer);
+    return status == ZV_WS_Status_ok ? ChangeAccount(*handle->_pSessionImpl, "") : status;
 }
 
 ZV_WS_Status ZV_WS_checkAuthToken(ZV_WS_Session* handle, bool* isValid)
 {
     ServiceCall<Operation::checkAuthToken> call(__func__, handle, isValid);
     if (!call.Accepts()) return call.Refusal();
-    call->AuthToken = Text(call.session().m_Params.AuthToken.c_str());
+    ZVString token;
+    if (!WithinMemory([&] { token = call.session().m_Params.Customer->Token(); })) return ZV_WS_Status_general_error;
+    call->AuthToken = Text(token.c_str());
     return LogAnswer(__func__, call.Into(isValid), *isValid);
 }
 

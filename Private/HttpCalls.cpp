@@ -70,9 +70,10 @@ ZV_WS_Status ReadClock(RawHttp& http, const ZVString& host, time_t& time)
 }
 
 // The session's address of the test file, asked from the service on first use.
-ZV_WS_Status FindBandwidthURL(ZV_WS_Session* handle)
+ZV_WS_Status FindBandwidthURL(ZV_WS_Session* handle, ZVString& url)
 {
-    ZVString& url = handle->_pSessionImpl->m_Params.BandwidthCheckURL;
+    Account& customer = *handle->_pSessionImpl->m_Params.Customer;
+    url = customer.BandwidthCheckURL();
     if (!url.empty()) return ZV_WS_Status_ok;
     ZV_WS_ConfigResponse config;
     const ZV_WS_Status status = ZV_WS_getConfig(handle, &config);
@@ -84,6 +85,7 @@ ZV_WS_Status FindBandwidthURL(ZV_WS_Session* handle)
     if (status == ZV_WS_Status_ok && item != end && item->Value) url = item->Value;
     ZV_WS_release(&config);
     if (status != ZV_WS_Status_ok) return status;
+    customer.SetBandwidthCheckURL(url);
     return url.empty() ? ZV_WS_Status_failed_to_get_bandwidth_check_url : ZV_WS_Status_ok;
 }
 
@@ -118,10 +120,10 @@ ZV_WS_Status Measure(RawHttp& http, unsigned int& bitsPerSecond)
 
 ZV_WS_Status CheckBandwidth(ZV_WS_Session* handle, unsigned int& bitsPerSecond)
 {
-    const ZV_WS_Status found = FindBandwidthURL(handle);
+    ZVString url;
+    const ZV_WS_Status found = FindBandwidthURL(handle, url);
     if (found != ZV_WS_Status_ok) return found;
     SessionImpl& session = *handle->_pSessionImpl;
-    const ZVString& url = session.m_Params.BandwidthCheckURL;
     ZVString host, path;
     SplitUrl(url, host, path);
     if (host.empty() || path.empty()) return ZV_WS_Status_invalid_bandwidth_check_url;

@@ -1,4 +1,5 @@
-// The operations the library calls: which service carries each, and whether it changes anything there.
+// The operations the library calls: which service carries each, and whether it must reach the service once at most,
+// because it changes something there.
 //
 // Operation::X has the generated request and response of operation X, sends it, and finds the result in its answer. A
 // row's name is the operation's name on the wire.
@@ -6,12 +7,12 @@
 
 #include "SessionImpl.h"
 
-#define ZV_OPERATION(service, name, changes)                                                  \
+#define ZV_OPERATION(service, name, once)                                                     \
     struct name {                                                                             \
         using Request = _ZV1__##name;                                                         \
         using Response = _ZV1__##name##Response;                                              \
         static constexpr char kName[] = #name;                                                \
-        static constexpr bool kChanges = changes;                                             \
+        static constexpr bool kOnce = once;                                                   \
         static auto& Service(SessionImpl& session) { return session.service; }                \
         static int Send(SessionImpl& session, Request& request, Response& response)           \
         {                                                                                     \
@@ -23,7 +24,7 @@
 namespace Operation {
 
 // clang-format off
-//           service     operation                              changes
+//           service     operation                              once
 ZV_OPERATION(m_Browse,   getFileType,                           false)
 ZV_OPERATION(m_Browse,   getNavigation,                         false)
 ZV_OPERATION(m_Browse,   getGenreLabel,                         false)
@@ -58,7 +59,7 @@ ZV_OPERATION(m_Facade,   addItemToWishlist,                     true)
 ZV_OPERATION(m_Facade,   removeItemFromWishList,                true)
 ZV_OPERATION(m_Facade,   removeAllItemsFromWishList,            true)
 ZV_OPERATION(m_Facade,   checkAdultVerificationEnabled,         false)
-ZV_OPERATION(m_Facade,   checkAdultVerificationPin,             false)
+ZV_OPERATION(m_Facade,   checkAdultVerificationPin,             true)   // wrong PINs may be counted
 
 ZV_OPERATION(m_Download, getMyVideos,                           false)
 ZV_OPERATION(m_Download, checkForPurchasedTitle,                false)

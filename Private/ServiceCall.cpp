@@ -34,13 +34,10 @@ ZV_WS_Status LogStatus(const char* function, ZV_WS_Status status)
     return status;
 }
 
-ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status)
+void DropStale(ServiceCallBase& call, const char* table, const std::function<bool(CacheInterface&)>& more)
 {
-    if (status != ZV_WS_Status_ok || !session.m_Cache) return status;
-    return GuardCall([&] {
-        session.m_Cache->PurgeUserData(table);
-        return status;
-    });
+    if (call.change() == ServiceCallBase::Change::None) return;
+    WithinMemory([&] { SessionCache(call.session()).UserDataChanged(table, more); });
 }
 
 ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, const bool& answer)

@@ -9,9 +9,11 @@
 // The first line empties and tags the output, so that it can be released however the call ends. Then the call's own
 // argument checks, where the cache keeps the answer (if it does), and the request's children. Into looks there, or
 // sends the request, once more when a connection kept from an earlier call turns out to be dead and the operation
-// changes nothing, converts the answer's result (Conversion.h), cleans up, writes the log line and maps the status.
+// allows it, converts the answer's result (Conversion.h), cleans up, writes the log line and maps the status.
 // Nothing is thrown through it.
 #pragma once
+
+#include <limits.h>
 
 #include <utility>
 
@@ -63,13 +65,21 @@ public:
     /// Only when the call can be made.
     SessionImpl& session() { return *m_Session; }
 
+    /// What is known, once the call was made, of the change that it asked for.
+    enum class Change {
+        None,     ///< The service refused it, or never saw it.
+        Made,     ///< It said so.
+        Unknown,  ///< It may have been made: the answer never came, or said nothing.
+    };
+    Change change() const { return m_Change; }
+
 protected:
     ServiceCallBase(const char* function, const ZV_WS_Session* handle);
 
     /// Runs `send` between Setup and the rules for kept connections, a second time where that is safe. `send` returns
     /// the SOAP runtime's result.
     template <class Service, class Send>
-    int Exchange(Service& service, const char* operation, bool changes, Send&& send);
+    int Exchange(Service& service, const char* operation, bool once, Send&& send);
 
     struct Outcome {
         int result = SOAP_OK;   ///< The SOAP runtime's.
@@ -85,6 +95,7 @@ protected:
     const char* m_Function;
     SessionImpl* m_Session;
     bool m_Tagged = true;
+    Change m_Change = Change::None;
     bool m_UsesResponseCode = true;
     AnswerCache::Entry m_Entry;
 };
@@ -124,6 +135,11 @@ public:
         Outcome outcome;
         if (!WithinMemory([&] { Make(service, convert, outcome); }))
             service.transport().Close();  // left in the middle of something
+        if (outcome.answered) {
+            m_Change = outcome.responseCode == 0 ? Change::Made : Change::None;
+        } else {
+            m_Change = service.transport().HasSent() ? Change::Unknown : Change::None;
+        }
         return Finish(service, outcome);
     }
 
@@ -136,7 +152,7 @@ private:
         const bool isCached = answer != nullptr;
         if (!isCached) {
             outcome.result =
-                Exchange(service, Op::kName, Op::kChanges, [&] { return Op::Send(*m_Session, m_Request, m_Response); });
+                Exchange(service, Op::kName, Op::kOnce, [&] { return Op::Send(*m_Session, m_Request, m_Response); });
             answer = outcome.result == SOAP_OK ? Op::Result(m_Response) : nullptr;
         }
         if (!answer) return;
@@ -195,6 +211,18 @@ inline char* Text(const char* text)
     return const_cast<char*>(text);
 }
 
+/// Whether that is an array which a request can carry: its size is a number of the contract.
+inline bool IsArray(const int* numbers, unsigned int count)
+{
+    return (numbers || count == 0) && count <= INT_MAX;
+}
+
+/// Likewise a page.
+inline bool IsPage(const ZV_WS_Pagination* page)
+{
+    return page && page->CurrentPageNumber <= INT_MAX && page->ItemsPerPage <= INT_MAX;
+}
+
 /// An array of numbers for a request, as long as `numbers` lives.
 inline ZV1__ArrayOfInt BorrowedInts(const int* numbers, unsigned int count)
 {
@@ -204,9 +232,9 @@ inline ZV1__ArrayOfInt BorrowedInts(const int* numbers, unsigned int count)
     return array;
 }
 
-/// Drops the user's data of that cache table, which a change has made stale, unless the change failed; returns its
-/// status.
-ZV_WS_Status DropStale(const SessionImpl& session, const char* table, ZV_WS_Status status);
+/// After a call that changes the user's data: drops what the cache has under that name, unless the service has
+/// certainly changed nothing, and does `more` with the cache in the same step.
+void DropStale(ServiceCallBase& call, const char* table, const std::function<bool(CacheInterface&)>& more = nullptr);
 
 /// The line with which every call ends.
 void LogCall(const char* function, int result, int responseCode);
@@ -219,13 +247,13 @@ ZV_WS_Status LogStatus(const char* function, ZV_WS_Status status);
 ZV_WS_Status LogAnswer(const char* function, ZV_WS_Status status, const bool& answer);
 
 template <class Service, class Send>
-int ServiceCallBase::Exchange(Service& service, const char* operation, bool changes, Send&& send)
+int ServiceCallBase::Exchange(Service& service, const char* operation, bool once, Send&& send)
 {
     SigpipeGuard guard;
     Transport& transport = service.transport();
     LogProxy("Entering", service.ProxyName(), operation);
     int result = SOAP_OK;
-    bool mayRetry = !changes;
+    bool mayRetry = !once;
     do {
         transport.BeginExchange();
         result = service.Setup(operation);

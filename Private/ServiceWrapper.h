@@ -18,7 +18,8 @@ void Configure(Transport& transport, const ZV_WS_SetupParams2& params);
 /// Returns the SOAP runtime's error number.
 int Start(soap& context, const ZVString& endpoint, const ZVString& operation, const ZV_WS_SetupParams2& params);
 
-/// The device's settings block: one shape under the name each service gives it. Its texts are borrowed from `params`.
+/// The device's settings block: one shape under the name each service gives it. Its texts are borrowed from `params`,
+/// but for the token, which another session may change at any time.
 template <class Settings>
 int Fill(soap& context, Settings*& block, const ZV_WS_SetupParams2& params)
 {
@@ -26,7 +27,8 @@ int Fill(soap& context, Settings*& block, const ZV_WS_SetupParams2& params)
     if (!block) return context.error = SOAP_EOM;
     new (block) Settings;
     block->APIKey = const_cast<char*>(params.APIKey.c_str());
-    block->AuthToken = const_cast<char*>(params.AuthToken.c_str());
+    block->AuthToken = soap_strdup(&context, params.Customer->Token().c_str());
+    if (!block->AuthToken) return context.error = SOAP_EOM;
     block->DestinationUniqueID = const_cast<char*>(params.DestinationUniqueID.c_str());
     block->DestinationTypeID = params.DestinationTypeID;
     return SOAP_OK;

@@ -2,7 +2,9 @@
 #include <string.h>
 
 #include "CacheMgr.h"
+#include "CacheSweep.h"
 #include "CallGuard.h"
+#include "ImageStore.h"
 #include "Records.h"
 #include "SessionImpl.h"
 #include "ZVAssert.h"
@@ -16,6 +18,8 @@ namespace {
 
 constexpr size_t kLongestUniqueID = 350;
 constexpr unsigned int kSmallestCacheLimit = 350 * 1024;
+constexpr mode_t kPrivateFolder = 0700;  // what is cached tells of the customer
+constexpr int kLastPatience = 200;       // milliseconds, for another process at a session's end
 
 const ZV_WS_Environment kEnvironments[] = {
     {ENVNUM_APISTG, "apistg"},
@@ -61,7 +65,7 @@ void CopyGiven(ZVString& to, const char* from)
 void CopyIdentity(ZV_WS_SetupParams2& to, const ZV_WS_SetupParams& from)
 {
     to.APIKey = from.APIKey;
-    CopyGiven(to.AuthToken, from.AuthToken);
+    if (IsGiven(from.AuthToken)) to.Customer->ChangeToken(from.AuthToken);
     to.DestinationUniqueID = from.DestinationUniqueID;
     to.DestinationTypeID = from.DestinationTypeID;
     to.UserName = from.UserName;
@@ -131,6 +135,7 @@ void SetParams(SessionImpl& session)
     session.m_Browse.SetParams(&session.m_Params);
     session.m_Stream.SetParams(&session.m_Params);
     session.m_Download.SetParams(&session.m_Params);
+    session.m_IsSetUp = true;
 }
 
 void InitFacade(SessionImpl& session)
@@ -148,14 +153,34 @@ ZV_WS_CacheParam2 CacheParamOf(const ZV_WS_SetupParams2& own)
     return param;
 }
 
-// Opens the session's cache. A file that cannot be opened is made anew once when `mayReplace`.
+// Opens the session's cache. A file that cannot be opened is made anew once when `mayReplace`; one that another process
+// holds is not, and the session works without.
 bool OpenCache(SessionImpl& session, bool mayReplace)
 {
     const ZV_WS_CacheParam2 param = CacheParamOf(session.m_Params);
-    session.m_Cache = std::make_unique<CacheMgr>();
-    if (session.m_Cache->Open(param) == 0) return true;
     const char* file = param.path.c_str();
-    return mayReplace && ZVFile::Exist(file) && ZVFile::Remove(file) && session.m_Cache->Open(param) == 0;
+    session.m_Cache = std::make_unique<CacheMgr>();
+    int code = session.m_Cache->Open(param);
+    if (CacheMgr::IsLocked(code)) {
+        session.m_Cache.reset();
+        ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR, "%s is locked by another process, working without a cache\n",
+                     file);
+        return true;
+    }
+    if (code != 0 && mayReplace && ZVFile::Exist(file) && ZVFile::Remove(file)) code = session.m_Cache->Open(param);
+    if (code != 0) return false;
+    if (param.type == CacheType_File && session.Caches(ZV_WS_CacheParam::CacheData_BoxArtImage))
+        session.m_WaitingImages = WaitingImages::Of(param.path);
+    return true;
+}
+
+// The first opening of a cache by a session.
+bool OpenAndSweepCache(SessionImpl& session)
+{
+    CacheSweep sweep(session.m_Params.CachePath);
+    if (!OpenCache(session, true)) return false;
+    if (session.m_Cache && session.m_Params.CacheKind == CacheType_File) sweep.AfterOpening();
+    return true;
 }
 
 void PutSession(ZV_WS_Session& handle, std::unique_ptr<SessionImpl> session)
@@ -196,7 +221,7 @@ ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
     if (!deployment) return ZV_WS_Status_file_operation_error;
     if (params.CacheParam.Type == CacheType_File) {
         const ZVString folder = CacheFolder(params.CacheParam.Path);
-        if (!ZVFile::FolderExist(folder.c_str()) && !ZVFile::CreateFolder(folder.c_str())) {
+        if (!ZVFile::FolderExist(folder.c_str()) && !ZVFile::CreateFolder(folder.c_str(), kPrivateFolder)) {
             return ZV_WS_Status_failed_to_create_cache_folder;
         }
     }
@@ -222,7 +247,7 @@ ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
     InitFacade(session);
 
     if (own.CacheKind == CacheType_None) return ZV_WS_Status_ok;
-    if (!OpenCache(session, true)) return ZV_WS_Status_local_cache_error;
+    if (!OpenAndSweepCache(session)) return ZV_WS_Status_local_cache_error;
     ZV_WS_updateLocalCache(handle, ZV_WS_CacheParam::CacheData_Metadata | ZV_WS_CacheParam::CacheData_Userdata);
     return ZV_WS_Status_ok;
 }
@@ -233,7 +258,11 @@ ZV_WS_Status WithSession(const ZV_WS_Session* handle, Output* out, Use use)
 {
     ZV_ASSERT(out != 0);
     return GuardCall([&] {
-        if constexpr (Records::kIsRecord<Output>) Records::Tag(*out);
+        if constexpr (Records::kIsRecord<Output>) {
+            Records::Tag(*out);
+        } else {
+            *out = Output();
+        }
         if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
         return use(*handle->_pSessionImpl);
     });
@@ -246,6 +275,13 @@ ZV_WS_Status SetText(ZV_WS_String& to, const ZVString& text)
 }
 
 }  // namespace
+
+SessionImpl::~SessionImpl()
+{
+    if (!m_Cache || !m_WaitingImages) return;
+    m_Cache->SetPatience(kLastPatience);
+    WithinMemory([&] { ImageStore::WriteWaiting(*this); });
+}
 
 ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* params)
 {

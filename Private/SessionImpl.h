@@ -1,4 +1,5 @@
-// What a session handle points to. Used by one thread at a time.
+// What a session handle points to. Used by one thread at a time, but for its settings, which any thread may read once
+// the session is set up.
 #pragma once
 
 #include <memory>
@@ -7,6 +8,7 @@
 #include "RealTimeBrowse.h"
 #include "SetupParams2.h"
 #include "StreamDownloadAPI.h"
+#include "WaitingImages.h"
 #include "ZVMutex.h"
 
 struct SessionImpl {
@@ -18,6 +20,11 @@ struct SessionImpl {
     StreamDownloadAPI m_Facade;
     ZV_WS_SetupParams2 m_Params;
     std::unique_ptr<CacheInterface> m_Cache;  ///< Null when nothing is cached.
+    /// Of all sessions on the file of the cache; null where no images are kept in files.
+    std::shared_ptr<WaitingImages> m_WaitingImages;
+    bool m_IsSetUp = false;  ///< Else no service can be asked.
+
+    ~SessionImpl();
 
     /// Whether there is a cache for that kind of data.
     bool Caches(ZV_WS_CacheParam::CacheData kind) const { return m_Cache && (m_Params.CacheData & kind) != 0; }
@@ -26,8 +33,10 @@ struct SessionImpl {
 /// Held while a handle gets or loses its session, and while ZV_WS_abort, which may come from another thread, uses one.
 ZVMutex& HandleMutex();
 
-/// The session behind a handle; null when there is none. For the thread that uses the handle.
+/// The session behind a handle; null when there is none, or one whose set-up has failed. For the thread that uses the
+/// handle.
 inline SessionImpl* SessionOf(const ZV_WS_Session* handle)
 {
-    return handle ? handle->_pSessionImpl : nullptr;
+    SessionImpl* session = handle ? handle->_pSessionImpl : nullptr;
+    return session && session->m_IsSetUp ? session : nullptr;
 }

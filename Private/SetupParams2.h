@@ -1,19 +1,23 @@
-// A session's own copy of its settings.
+// A session's own copy of its settings, which stay as they are once it is set up, and what it shares with its
+// duplicates.
 #pragma once
 
+#include <memory>
+
+#include "Account.h"
 #include "ZVString.h"
 #include "ZVWSLib.h"
 
 struct ZV_WS_SetupParams2 {
     ZVString APIKey;
-    ZVString AuthToken;
+    /// Shared by a session and its duplicates: the authorisation token, the bandwidth address.
+    std::shared_ptr<Account> Customer = std::make_shared<Account>();
     ZVString DestinationUniqueID;
     int DestinationTypeID = 0;
     ZVString UserName;
     ZVString Password;
     ZVString ServiceBaseURL;  ///< From discovery, never from the caller.
     ZV_WS_EnvID EnvID = ENVID_APISTG;
-    ZVString BandwidthCheckURL;  ///< Empty until the first bandwidth check has learnt it.
     CacheType CacheKind = CacheType_None;
     unsigned int CacheData = 0;
     unsigned int CacheLimit = 0;

@@ -119,6 +119,7 @@ void Transport::BeginExchange()
 {
     m_Begun = ZVUtilities::MillisecondTime();
     m_Connected = false;
+    m_HasSent = false;
     m_Received = 0;
     m_Soap.start = static_cast<ULONG64>(time(nullptr));  // of transfer_timeout; the runtime sets it for SOAP alone
     m_SentSecrets.Restart();
@@ -217,6 +218,7 @@ int Transport::CloseHook(soap* context, SOAP_SOCKET socket)
 int Transport::SendHook(soap* context, const char* data, size_t length)
 {
     Transport& self = Of(context);
+    self.m_HasSent = true;
     TrafficLog::Sent(self.m_SentSecrets, data, length);
     return self.m_Send(context, data, length);
 }

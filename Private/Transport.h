@@ -57,6 +57,9 @@ public:
     /// Before an exchange: what KeptConnectionDied tells is about bytes from here on.
     void BeginExchange();
 
+    /// Whether anything was sent since then: the peer may have acted on it.
+    bool HasSent() const { return m_HasSent; }
+
     /// True when the exchange went over a connection kept from an earlier one and no byte of an answer came: the peer
     /// may have closed it before it saw the request.
     bool KeptConnectionDied() const;
@@ -97,6 +100,7 @@ private:
     ZVString m_UserAgent;
     uint64_t m_Begun = 0;  // of the exchange, by ZVUtilities::MillisecondTime
     bool m_Connected = false;
+    bool m_HasSent = false;
     size_t m_Received = 0;
     SecretFilter m_SentSecrets;
     SecretFilter m_ReceivedSecrets;

@@ -20,24 +20,17 @@ ZV_WS_Status ChangeItem(const char* function, ZV_WS_Session* handle, int titleID
     ServiceCall<Op> call(function, handle, answer);
     if (!call.Accepts()) return call.Refusal();
     call->TitleID = titleID;
-    const ZV_WS_Status status = DropStale(call.session(), kListTable, call.Into(answer));
-    CacheInterface* cache = call.session().m_Cache.get();
-    if (status == ZV_WS_Status_ok && cache) WithinMemory([&] { cache->WriteWishlistFlag(titleID, wished); });
+    const ZV_WS_Status status = call.Into(answer);
+    const bool isKnown = call.change() == ServiceCallBase::Change::Made;
+    DropStale(call, kListTable, [=](CacheInterface& cache) {
+        return isKnown ? cache.WriteWishlistFlag(titleID, wished) : cache.RemoveWishlistFlag(titleID);
+    });
     return status;
 }
 
-// The flags of all the titles from the cache; false when it lacks one.
-bool ReadFlags(const SessionImpl& session, const int* titleIDs, ZV_WS_TitlesInWishlist& answers)
-{
-    for (unsigned int i = 0; i < answers.size; ++i) {
-        if (!session.m_Cache->ReadWishlistFlag(titleIDs[i], answers.IsAvailInUserWishlist[i])) return false;
-    }
-    return true;
-}
-
 // Keeps what was found out. A list narrowed to a type tells nothing of the titles that it leaves out.
-void WriteFlags(const SessionImpl& session, const int* titleIDs, const ZV_WS_TitlesInWishlist& answers,
-                bool isWholeList)
+void KeepFlags(SessionImpl& session, const int* titleIDs, const ZV_WS_TitlesInWishlist& answers, bool isWholeList,
+               const SessionCache::Stamp& stamp)
 {
     ZVWS_IntVector titles;
     ZVWS_BoolVector flags;
@@ -46,7 +39,7 @@ void WriteFlags(const SessionImpl& session, const int* titleIDs, const ZV_WS_Tit
         titles.push_back(titleIDs[i]);
         flags.push_back(answers.IsAvailInUserWishlist[i]);
     }
-    session.m_Cache->WriteWishlistFlags(titles, flags);
+    SessionCache(session).KeepFlags(titles, flags, stamp);
 }
 
 // The titles of the whole list.
@@ -73,7 +66,7 @@ ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortO
                                     ZV_WS_TitleTypeFilter typeFilter, ZV_WS_WishlistItemsResponse* items)
 {
     ServiceCall<Operation::getWishlistItems> call(__func__, handle, items);
-    if (!call.Accepts(page)) return call.Refusal();
+    if (!call.Accepts(IsPage(page))) return call.Refusal();
     call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, kListTable, sortOrder, page->CurrentPageNumber,
                  page->ItemsPerPage, typeFilter);
     call->sortOrder = ZVUtilities::SortOrder2Int(sortOrder);
@@ -94,25 +87,26 @@ ZV_WS_Status ZV_WS_removeItemFromWishlist(ZV_WS_Session* handle, int titleID, ZV
 
 ZV_WS_Status ZV_WS_removeAllItemsFromWishlist(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer)
 {
-    const ZV_WS_Status status = Ask<Operation::removeAllItemsFromWishList>(__func__, handle, answer);
-    if (status != ZV_WS_Status_ok) return status;
-    const SessionImpl& session = *handle->_pSessionImpl;
-    if (session.m_Cache) WithinMemory([&] { session.m_Cache->RemoveAllWishlistFlags(); });
-    return DropStale(session, kListTable, status);
+    ServiceCall<Operation::removeAllItemsFromWishList> call(__func__, handle, answer);
+    if (!call.Accepts()) return call.Refusal();
+    const ZV_WS_Status status = call.Into(answer);
+    DropStale(call, kListTable, [](CacheInterface& cache) { return cache.RemoveAllWishlistFlags(); });
+    return status;
 }
 
 ZV_WS_Status ZV_WS_checkTitleInWishlist(ZV_WS_Session* handle, int titleID, bool* isInWishlist)
 {
     ServiceCall<Operation::getTitleListing> call(__func__, handle, isInWishlist);
     if (!call.Accepts()) return call.Refusal();
-    CacheInterface* cache = call.session().m_Cache.get();
+    SessionCache cache(call.session());
+    SessionCache::Stamp stamp;
     bool isKnown = false;
-    if (cache) WithinMemory([&] { isKnown = cache->ReadWishlistFlag(titleID, *isInWishlist); });
+    WithinMemory([&] { isKnown = cache.FindFlags(&titleID, 1, isInWishlist, stamp); });
     if (isKnown) return LogAnswer(__func__, LogStatus(__func__, ZV_WS_Status_ok), *isInWishlist);
     call->TitleID = titleID;
     const ZV_WS_Status status =
         call.Into([&](const ZV1__TitleListingResponse* listing) { *isInWishlist = listing->IsAvailInUserWishList; });
-    if (cache && status == ZV_WS_Status_ok) WithinMemory([&] { cache->WriteWishlistFlag(titleID, *isInWishlist); });
+    if (status == ZV_WS_Status_ok) WithinMemory([&] { cache.KeepFlags({titleID}, {*isInWishlist}, stamp); });
     return LogAnswer(__func__, status, *isInWishlist);
 }
 
@@ -122,21 +116,22 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
     ZV_ASSERT(answers != 0);
     return LogStatus(__func__, GuardCall([&] {
                          Records::Tag(*answers);
-                         if (!SessionOf(handle) || (!titleIDs && count != 0)) return ZV_WS_Status_invalid_param;
-                         const SessionImpl& session = *handle->_pSessionImpl;
+                         if (!SessionOf(handle) || !IsArray(titleIDs, count)) return ZV_WS_Status_invalid_param;
+                         if (count == 0) return ZV_WS_Status_ok;
+                         SessionImpl& session = *handle->_pSessionImpl;
                          Records::Allocate(answers->size, answers->IsAvailInUserWishlist, count);
-                         if (count == 0 || (session.m_Cache && ReadFlags(session, titleIDs, *answers)))
-                             return ZV_WS_Status_ok;
+                         bool* flags = answers->IsAvailInUserWishlist;
+                         SessionCache::Stamp stamp;
+                         if (SessionCache(session).FindFlags(titleIDs, count, flags, stamp)) return ZV_WS_Status_ok;
                          std::set<int> wished;
                          const ZV_WS_Status status = ReadList(handle, typeFilter, wished);
                          if (status != ZV_WS_Status_ok) {
                              Records::FreeMembers(*answers);
                              return status;
                          }
-                         std::transform(titleIDs, titleIDs + count, answers->IsAvailInUserWishlist,
+                         std::transform(titleIDs, titleIDs + count, flags,
                                         [&](int titleID) { return wished.count(titleID) != 0; });
-                         if (session.m_Cache)
-                             WriteFlags(session, titleIDs, *answers, typeFilter == TITLE_TYPE_FILTER_ANY);
+                         KeepFlags(session, titleIDs, *answers, typeFilter == TITLE_TYPE_FILTER_ANY, stamp);
                          return ZV_WS_Status_ok;
                      }));
 }

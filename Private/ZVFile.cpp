@@ -4,6 +4,7 @@
 #include <errno.h>
 #include <fnmatch.h>
 #include <string.h>
+#include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -24,6 +25,12 @@ bool Exists(const char* path)
 {
     struct stat entry;
     return stat(path, &entry) == 0;
+}
+
+// Or another process has just made it.
+bool MakeFolder(const char* path, mode_t mode)
+{
+    return mkdir(path, mode) == 0 || (errno == EEXIST && IsFolder(path));
 }
 
 bool EndsIn(const ZVString& text, const char* end)
@@ -88,6 +95,22 @@ bool ZVFile::Flush()
     return m_File && fflush(m_File) == 0;
 }
 
+bool ZVFile::Sync()
+{
+    return Flush() && fdatasync(fileno(m_File)) == 0;
+}
+
+bool ZVFile::TryLock()
+{
+    return m_File && flock(fileno(m_File), LOCK_EX | LOCK_NB) == 0;
+}
+
+bool ZVFile::IsLinked() const
+{
+    struct stat entry;
+    return m_File && fstat(fileno(m_File), &entry) == 0 && entry.st_nlink > 0;
+}
+
 zv_int64 ZVFile::GetSize()
 {
     if (!m_File) return 0;
@@ -139,18 +162,20 @@ bool ZVFile::FolderExist(const char* path)
     return IsFolder(path);
 }
 
-bool ZVFile::CreateFolder(const char* path)
+bool ZVFile::CreateFolder(const char* path, mode_t mode)
 {
     ZV_ASSERT(path != 0);
     ZVString copy = path;
     for (size_t i = 1; i < copy.length(); ++i) {
         if (copy[i] != PATH_SEPERATOR) continue;
         copy[i] = '\0';
-        const bool there = Exists(copy.c_str()) ? IsFolder(copy.c_str()) : mkdir(copy.c_str(), kFolderMode) == 0;
+        const bool isLast = path[i + strspn(path + i, "/")] == '\0';
+        const bool there =
+            Exists(copy.c_str()) ? IsFolder(copy.c_str()) : MakeFolder(copy.c_str(), isLast ? mode : kFolderMode);
         if (!there) return false;
         copy[i] = PATH_SEPERATOR;
     }
-    return Exists(path) || mkdir(path, kFolderMode) == 0;
+    return Exists(path) || MakeFolder(path, mode);
 }
 
 ZVString ZVFile::GetFolderName(const char* path)

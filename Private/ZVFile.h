@@ -4,6 +4,7 @@
 
 #include <stdint.h>
 #include <stdio.h>
+#include <sys/types.h>
 
 #include "ZVString.h"
 
@@ -27,6 +28,14 @@ public:
     /// Writes all; less only after a failure. The bytes written.
     zv_int64 Write(const void* buffer, zv_int64 size);
     bool Flush();
+    /// The same, and what was written is on the disk.
+    bool Sync();
+
+    /// Keeps the file for this object, as long as it is open (flock). False when another object, of this process or
+    /// another, has it. Nobody is kept from reading or writing it.
+    bool TryLock();
+    /// Whether the open file still has a name in some folder.
+    bool IsLinked() const;
 
     /// The position stays.
     zv_int64 GetSize();
@@ -41,8 +50,8 @@ public:
     static bool Remove(const char* filename);
     static bool Rename(const char* oldname, const char* newname);
     static bool FolderExist(const char* path);
-    /// Makes every missing folder of the path, mode 0755.
-    static bool CreateFolder(const char* path);
+    /// Makes every missing folder of the path, mode 0755, and the last one with `mode`.
+    static bool CreateFolder(const char* path, mode_t mode = 0755);
 
     /// Up to and including the last "/". A bare name is taken for a folder: "b.txt/"; an empty path is "./".
     static ZVString GetFolderName(const char* path);

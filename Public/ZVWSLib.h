@@ -166,8 +166,10 @@ struct ZV_WS_CacheParam {
     CacheType Type = CacheType_None;
     unsigned int Data = 0;
     unsigned int Limit = 0;  ///< Bytes for everything cached; 0 is no limit, else at least 358400.
-    const char* Path =
-        nullptr;  ///< Cache folder, made when absent. Needed for CacheType_File; "" is the current folder.
+    /// Cache folder, made when absent, for the owner alone. Needed for CacheType_File; "" is the current folder. The
+    /// folder is the cache's own: images in it of which no cache knows are removed, and caches that nobody has used for
+    /// 30 days.
+    const char* Path = nullptr;
 };
 
 /// Proxy for all connections of the session; none when Host is null or empty.
@@ -540,9 +542,10 @@ struct ZV_WS_AuthorizeDeviceResponse : ZV_WS_StandardResponse {
 ///  - ZV_WS_Status_local_cache_error: the cache cannot be opened, not even anew.
 ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* params);
 
-/// Makes a session with the settings of `source`, for another thread. Nothing is asked from the network.
-/// ZV_WS_Status_invalid_param without a source session. After ssl_error or local_cache_error the new handle has to be
-/// released.
+/// Makes a session with the settings of `source`, for another thread; another thread may be in the middle of a call
+/// with `source`. Both share what they know of the customer: the authorisation token, and what a change has made stale.
+/// Nothing is asked from the network. ZV_WS_Status_invalid_param without a source session. After ssl_error or
+/// local_cache_error the new handle has to be released.
 ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* source);
 
 /// Frees whatever the record owns and empties it; ends a session. Always ZV_WS_Status_ok; null and empty records are
@@ -561,10 +564,10 @@ ZV_WS_Status ZV_WS_getVersion(ZV_WS_VersionInfo* version);
 /// The environments to choose from at set-up. Needs no session.
 ZV_WS_Status ZV_WS_getAvailableEnvLists(ZV_WS_EnvironmentLists* list);
 
-/// Asks the service for the device's environment anew. ZV_WS_Status_net_error when it cannot be reached.
+/// Asks the service for the device's environment anew: blocks. ZV_WS_Status_net_error when it cannot be reached.
 ZV_WS_Status ZV_WS_getDefaultEnvID(ZV_WS_Session* handle, ZV_WS_EnvID* env);
 
-/// The environment found at set-up.
+/// The environment found at set-up. 0 after a failure, as above.
 ZV_WS_Status ZV_WS_getDeviceEnv(ZV_WS_Session* handle, ZV_WS_EnvID* env);
 
 /// The text that every request carries as its user agent; empty when neither revisions nor model were given.
@@ -574,53 +577,68 @@ ZV_WS_Status ZV_WS_getUserAgent(ZV_WS_Session* handle, ZV_WS_String* userAgent);
 ZV_WS_Status ZV_WS_getDestinationUniqueID(ZV_WS_Session* handle, ZV_WS_String* id);
 
 // ---- Catalogue. Ids that the service does not know are its refusals (ZV_WS_Status_general_error).
+//
+// "Cached with the catalogue": a session that caches CacheData_Metadata answers from its cache without asking, as long
+// as the service's catalogue stays the one it was. The answers are dropped when ZV_WS_updateLocalCache finds a later
+// load time (set-up looks by itself), all together when they have outgrown their share of the limit, and by
+// ZV_WS_clearLocalCache. An answer that was asked for before such a moment is not kept after it.
+//
+// Numbers of elements and pages above 2,147,483,647 are ZV_WS_Status_invalid_param.
 
+/// Cached with the catalogue.
 ZV_WS_Status ZV_WS_getNavigation(ZV_WS_Session* handle, ZV_WS_GenreArray* genres);
 
 ZV_WS_Status ZV_WS_getGenreLabel(ZV_WS_Session* handle, int genreID, ZV_WS_GenreLabelResponse* label);
 
-/// A page of a genre's titles. `purchaseType` is a ZV_WS_PurchaseType.
+/// A page of a genre's titles. `purchaseType` is a ZV_WS_PurchaseType. Cached with the catalogue.
 ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pagination* page, int purchaseType,
                              ZV_WS_TitlesResponse* titles);
 
-/// The same page of each of `count` genres.
+/// The same page of each of `count` genres. Never cached.
 ZV_WS_Status ZV_WS_getTitlesByGenreIDs(ZV_WS_Session* handle, const int* genreIDs, unsigned int count,
                                        const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
                                        ZV_WS_TitlesResponseArray* titles);
 
+/// All four are cached with the catalogue. The listings, which tell of the wish list, are also dropped with all that is
+/// cached of the customer (ZV_WS_getWishlistItems), and when the wish list is emptied.
 ZV_WS_Status ZV_WS_getTitleListing(ZV_WS_Session* handle, int titleID, ZV_WS_TitleListingResponse* listing);
 ZV_WS_Status ZV_WS_getTvEpisodeListing(ZV_WS_Session* handle, int episodeID, ZV_WS_TitleListingResponse* listing);
 ZV_WS_Status ZV_WS_getTvEpisodeListByTitleID(ZV_WS_Session* handle, int titleID, ZV_WS_TvEpisodeListResponse* episodes);
 ZV_WS_Status ZV_WS_getAllTvEpisodeListings(ZV_WS_Session* handle, int titleID,
                                            ZV_WS_TitleListingResponseArray* listings);
 
+/// Both are cached with the catalogue.
 ZV_WS_Status ZV_WS_translateSkuID(ZV_WS_Session* handle, int skuID, ZV_WS_TranslateSkuIDResponse* title);
 ZV_WS_Status ZV_WS_translateTivoExternalID(ZV_WS_Session* handle, const char* externalID,
                                            ZV_WS_TranslateTivoExternalIDResponse* title);
 
-/// Titles whose names hold the text.
+/// Titles whose names hold the text. Cached with the catalogue.
 ZV_WS_Status ZV_WS_searchForTitle(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
                                   ZV_WS_TitleTypeFilter typeFilter, const char* query, ZV_WS_TitlesResponse* titles);
-/// The same with all that the service knows of each title.
+/// The same with all that the service knows of each title. Cached with the catalogue.
 ZV_WS_Status ZV_WS_searchForTitleDetail(ZV_WS_Session* handle, const ZV_WS_Pagination* page,
                                         ZV_WS_PurchaseType purchaseType, ZV_WS_TitleTypeFilter typeFilter,
                                         const char* query, ZV_WS_TitlesResponse* titles);
 
+/// Titles like that one. Cached with the catalogue.
 ZV_WS_Status ZV_WS_getRecommendedTitles(ZV_WS_Session* handle, int titleID, ZV_WS_RecommendedTitlesResponse* titles);
 
 // ---- The device at the service
 
 ZV_WS_Status ZV_WS_getFileType(ZV_WS_Session* handle, ZV_WS_FileType* fileType);
 
-/// Activates the device with the PIN that the customer was shown. On success the session's later requests carry the
-/// token; other sessions, also duplicates made before, do not. A PIN is required.
+/// Activates the device with the PIN that the customer was shown. On success the next requests of the session, its
+/// duplicates and the session that it is a duplicate of carry the new token, and all that is cached of the customer
+/// before is dropped. A PIN is required.
 ZV_WS_Status ZV_WS_authorizeDevice(ZV_WS_Session* handle, const char* pin, ZV_WS_AuthorizeDeviceResponse* answer);
+/// Ends the activation: likewise, and the requests carry no token.
 ZV_WS_Status ZV_WS_deactivateDevice(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
 
 /// Whether the service still takes the session's token.
 ZV_WS_Status ZV_WS_checkAuthToken(ZV_WS_Session* handle, bool* isValid);
 
 ZV_WS_Status ZV_WS_getConfig(ZV_WS_Session* handle, ZV_WS_ConfigResponse* config);
+/// Cached with the customer's data (see below).
 ZV_WS_Status ZV_WS_getSettingsPageInfo(ZV_WS_Session* handle, ZV_WS_SettingsPageInfoResponse* info);
 ZV_WS_Status ZV_WS_getCountryID(ZV_WS_Session* handle, int* countryID);
 
@@ -629,8 +647,15 @@ ZV_WS_Status ZV_WS_setAudioDefaultProperty(ZV_WS_Session* handle, ZV_WS_AudioPro
 ZV_WS_Status ZV_WS_getAudioDefaultProperty(ZV_WS_Session* handle, ZV_WS_AudioProfile* profile);
 
 // ---- The customer's account
+//
+// "Cached with the customer's data": a session that caches CacheData_Userdata answers from its cache without asking, as
+// long as the device belongs to the same customer. All of it is dropped by every set-up, by ZV_WS_updateLocalCache with
+// CacheData_Userdata, by ZV_WS_authorizeDevice and ZV_WS_deactivateDevice, together with the catalogue's answers when
+// either has outgrown its share of the limit, and by ZV_WS_clearLocalCache; some of it by the changes named below, also
+// when their answer was lost and nobody knows whether they were made. What was asked for before is not kept after it.
 
-/// A page of what the customer bought or rented. `watchStatus` is a ZV_WS_WatchStatus.
+/// A page of what the customer bought or rented. `watchStatus` is a ZV_WS_WatchStatus. Cached with the customer's data,
+/// but for devices that download; dropped by a purchase and by ZV_WS_removeAllMyPurchases.
 ZV_WS_Status ZV_WS_getMyVideos(ZV_WS_Session* handle, const ZV_WS_Pagination* page, ZV_WS_PurchaseType purchaseType,
                                ZV_WS_TitleTypeFilter typeFilter, int watchStatus, ZV_WS_MyVideosResponse* videos);
 
@@ -645,25 +670,31 @@ ZV_WS_Status ZV_WS_checkRentalExpiration(ZV_WS_Session* handle, int passID, ZV_W
 /// Forgets every purchase of the account. The account's password is required.
 ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* password, ZV_WS_StandardResponse* answer);
 
+/// A page of the wish list. Cached with the customer's data; dropped by every change of the list.
 ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortOrder, const ZV_WS_Pagination* page,
                                     ZV_WS_TitleTypeFilter typeFilter, ZV_WS_WishlistItemsResponse* items);
+/// Changes of the wish list. What is known then of the title, or of all of them, is cached.
 ZV_WS_Status ZV_WS_addItemToWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer);
 ZV_WS_Status ZV_WS_removeItemFromWishlist(ZV_WS_Session* handle, int titleID, ZV_WS_StandardResponse* answer);
 ZV_WS_Status ZV_WS_removeAllItemsFromWishlist(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
+/// Answers from what is cached of the title (a change of it, an earlier check), else from its listing, asked anew.
 ZV_WS_Status ZV_WS_checkTitleInWishlist(ZV_WS_Session* handle, int titleID, bool* isInWishlist);
 
-/// One answer for each of `count` titles; asks for as many pages of the wish list as it has.
+/// One answer for each of `count` titles: from what is cached when that tells of all of them, else from the wish list,
+/// of which as many pages are asked for as it has.
 ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* titleIDs, unsigned int count,
                                          ZV_WS_TitleTypeFilter typeFilter, ZV_WS_TitlesInWishlist* answers);
 
 ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
                                                  ZV_WS_CheckAdultVerificationEnabledResponse* answer);
-/// The PIN is sent with at least four digits.
+/// The PIN is sent with at least four digits, and once only: the service may count wrong ones.
 ZV_WS_Status ZV_WS_checkAdultVerificationPin(ZV_WS_Session* handle, int pin,
                                              ZV_WS_CheckAdultVerificationPinResponse* answer);
 
+/// Both are cached with the customer's data.
 ZV_WS_Status ZV_WS_getEmailAddress(ZV_WS_Session* handle, ZV_WS_EmailAddressResponse* address);
 ZV_WS_Status ZV_WS_getBillingInfo(ZV_WS_Session* handle, ZV_WS_BillingInfoResponse* billing);
+/// These two are never cached.
 ZV_WS_Status ZV_WS_getBillingInfoAndPPCBalance(ZV_WS_Session* handle, ZV_WS_BillingInfoAndPPCBalanceResponse* billing);
 ZV_WS_Status ZV_WS_getPrePaidCardBalance(ZV_WS_Session* handle, ZV_WS_PPCardBalanceResponse* balance);
 ZV_WS_Status ZV_WS_assignGiftCertificateToUser(ZV_WS_Session* handle, const char* code,
@@ -701,7 +732,9 @@ ZV_WS_Status ZV_WS_returnTimeout(ZV_WS_Session* handle, ZV_WS_StandardResponse* 
 ZV_WS_Status ZV_WS_returnError(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
 
 // ---- Local cache. Calls of the catalogue and the account answer from it without asking the service, and keep there
-// what the service answered with success. A cache that fails never fails a call.
+// what the service answered with success. A cache that fails never fails a call: a broken file is made anew, one that
+// was removed comes back, and one that another process keeps locked for 10 s is not used for a while, or by a session
+// that is just set up not at all.
 
 /// Whether the catalogue has changed since that time (a text as ZV_WS_getLastCacheLoadTimeUTC gives it), by the
 /// service's opinion. The time is required.
@@ -722,12 +755,15 @@ ZV_WS_Status ZV_WS_clearLocalCache(const char* folder);
 // ZV_WS_Status_invalid_param. Others: connection_error; net_error; file_operation_error; file_not_found_on_server. An
 // image that cannot be revalidated is answered as it is cached.
 
-/// An image's bytes, from the cache or the image host.
+/// An image's bytes, from the cache or the image host. Cached images stay until ZV_WS_updateLocalCache with
+/// CacheData_BoxArtImage marks them, after which the next call asks the host whether it has another one, and keeps the
+/// old one when the host cannot be asked; until the oldest titles make room in a cache that has outgrown its share of
+/// the limit; and until ZV_WS_clearLocalCache.
 ZV_WS_Status ZV_WS_getBoxArtImageData(ZV_WS_Session* handle, ZV_WS_BoxArtSize size, const char* prefix,
                                       ZV_WS_Image* image);
 
-/// Where an image is: the file in the folder of a file cache that keeps images, fetched when it is not there; for other
-/// sessions its address, and nothing is fetched.
+/// Where an image is: the file in the folder of a file cache that keeps images, fetched when it is not there whole, for
+/// as long as above; for other sessions its address, and nothing is fetched.
 ZV_WS_Status ZV_WS_getBoxArtImage(ZV_WS_Session* handle, ZV_WS_BoxArtSize size, const char* prefix,
                                   ZV_WS_String* place);
 
