@@ -26,6 +26,7 @@ constexpr int kEnoughForSize = 10000;
 
 // Three instances: each has one to three services and the image host, and one for each kind that it fetches ahead.
 constexpr long kMostConnections = 3 * (3 + 3);
+constexpr long kMostImages = 8;  // whose rows wait for others
 
 struct Footprint {
     long kibibytes = 0;
@@ -139,7 +140,7 @@ TEST(Soak, NothingGrows)
 
     for (const Footprint& now : {early, late}) {
         EXPECT_EQ(idle.threads, now.threads);
-        EXPECT_EQ(idle.files, now.files);
+        EXPECT_LE(now.files, idle.files + kMostImages);
         EXPECT_LE(now.sockets, idle.sockets + kMostConnections);
     }
     if (kSizeCounts && calls >= kEnoughForSize) {

@@ -26,7 +26,7 @@ void Discovery(SessionImpl& session)
 
 void Bandwidth(ZV_WS_Session* handle)
 {
-    handle->_pSessionImpl->m_Params.BandwidthCheckURL = "http://127.0.0.1:1/file";
+    handle->_pSessionImpl->m_Params.Customer->SetBandwidthCheckURL("http://127.0.0.1:1/file");
     unsigned int bitsPerSecond = 0;
     const ZV_WS_Status status = ZV_WS_checkBandwidth(handle, &bitsPerSecond);
     Require((status == ZV_WS_Status_ok) == (bitsPerSecond != 0), "a measure is a number above 0");

@@ -175,8 +175,15 @@ TEST_F(Calls, RefusalCodesHaveTheirStatus)
 
 TEST_F(Calls, WrongArgumentsSendNothing)
 {
-    const ZV_WS_Pagination page = Page(1, 1);
+    constexpr unsigned int kTooMany = 0x80000000u;  // the contract's numbers end before
+    const ZV_WS_Pagination page = Page(1, 1), farPage = Page(kTooMany, 1), fullPage = Page(1, kTooMany);
+    const int ids[] = {1, 2};
     const AnyCall calls[] = {
+        Asking(ZV_WS_getTitles, 1, &farPage, 2),
+        Asking(ZV_WS_getWishlistItems, SORT_ORDER_RATING, &fullPage, TITLE_TYPE_FILTER_ANY),
+        Asking(ZV_WS_getTitlesByGenreIDs, ids, kTooMany, &page, PURCHASE_TYPE_ANY),
+        Asking(ZV_WS_getTitleListingPurchaseds, ids, kTooMany),
+        Asking(ZV_WS_checkTitlesInWishlist, ids, kTooMany, TITLE_TYPE_FILTER_ANY),
         Asking(ZV_WS_getTitles, 1, nullptr, 2),
         Asking(ZV_WS_getTitlesByGenreIDs, nullptr, 2, &page, PURCHASE_TYPE_ANY),
         Asking(ZV_WS_removeAllMyPurchases, ""),

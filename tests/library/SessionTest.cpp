@@ -1,5 +1,6 @@
 
 #include <fstream>
+#include <thread>
 
 #include "Store.h"
 
@@ -65,6 +66,27 @@ TEST_F(Session, DiscoveryAsksTheDeviceEnvironment)
 
     ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getFileType)(&session));
     EXPECT_EQ("ZVSDK: F|A ZVMODEL:X1", Header(store->Log().back(), "user-agent"));
+}
+
+// Workers get their sessions while others are at work.
+TEST_F(Session, ASessionInTheMiddleOfACallIsDuplicated)
+{
+    ASSERT_EQ(ZV_WS_Status_ok, Initialize());
+    store->ClearLog();
+    Fault("authorizeDevice=hold");
+    std::thread calling([&] {
+        EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_authorizeDevice, StorefrontAccount::kActivationPin)(&session));
+    });
+    ASSERT_TRUE(store->WaitForRequests(1));
+    ZV_WS_Session copy;
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
+    EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getNavigation)(&copy));
+    store->ClearFaults();
+    calling.join();
+    bool isValid = false;
+    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_checkAuthToken(&copy, &isValid));
+    EXPECT_TRUE(isValid) << "the copy has the token that came later";
+    ZV_WS_release(&copy);
 }
 
 // Every answer that is not exactly one digit is production; no answer at all is a failure.
@@ -162,6 +184,12 @@ TEST_F(Session, DeploymentFileMistakesAreRefused)
     setenv("ZV_DEPLOYMENT", file.c_str(), 1);
     EXPECT_EQ(ZV_WS_Status_ssl_error, Initialize());
     EXPECT_NE(nullptr, session._pImpl);
+    // What is left of it is no session that could ask anything.
+    ZV_WS_Session copy;
+    EXPECT_EQ(ZV_WS_Status_invalid_param, Asking(ZV_WS_getNavigation)(&session));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, Asking(ZV_WS_getBoxArtImage, BOX_ART_SIZE_95, "ZV00012")(&session));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, Asking(ZV_WS_getUserAgent)(&session));
+    EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_duplicate(&copy, &session));
 }
 
 TEST_F(Session, CallsWithoutASessionTagTheirOutput)
@@ -175,6 +203,11 @@ TEST_F(Session, CallsWithoutASessionTagTheirOutput)
     bool flag = true;
     EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_checkForPurchasedSku(&session, 1, &flag));
     EXPECT_FALSE(flag);
+    for (const auto call : {ZV_WS_getDeviceEnv, ZV_WS_getDefaultEnvID}) {
+        ZV_WS_EnvID env = ENVID_PRODUCTION;
+        EXPECT_EQ(ZV_WS_Status_invalid_param, call(&session, &env));
+        EXPECT_EQ(0, env);
+    }
     EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_release(nullptr));
 }
 

@@ -107,6 +107,11 @@ TEST_F(Transport, WhatChangesSomethingIsSentOnce)
     EXPECT_EQ(ZV_WS_Status_timeout_error, Asking(ZV_WS_doPurchaseSavedBilling, sku, "10.0.0.1", false)(&session));
     EXPECT_EQ(1u, store->Log().size());
     EXPECT_EQ(passes + 1, Number("SELECT COUNT(*) FROM pass"));
+    Fault("checkAdultVerificationPin=cut");  // the service may count wrong PINs
+    EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getConfig)(&session));
+    store->ClearLog();
+    EXPECT_EQ(ZV_WS_Status_timeout_error, Asking(ZV_WS_checkAdultVerificationPin, 1234)(&session));
+    EXPECT_EQ(1u, store->Log().size());
 }
 
 // A broken connection must neither kill the process nor change its handling of the signal.

@@ -14,7 +14,7 @@ inline ZV_WS_SetupParams2 TestParams()
 {
     ZV_WS_SetupParams2 params;
     params.APIKey = "key<&>1";
-    params.AuthToken = "token-1";
+    params.Customer->ChangeToken("token-1");
     params.DestinationUniqueID = "device-1";
     params.DestinationTypeID = 48;
     params.UserName = "customer";

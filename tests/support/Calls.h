@@ -2,6 +2,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "ZVWSLib.h"
 
@@ -12,5 +13,9 @@ struct CallResult {
     bool operator==(const CallResult& other) const { return status == other.status && output == other.output; }
 };
 
-/// False when there is no such call ("getTitles" is ZV_WS_getTitles).
-bool MakeCall(const std::string& name, ZV_WS_Session* session, CallResult& result);
+/// All of them, in a table.
+std::vector<std::string> CallNames();
+
+/// False when there is no such call ("getTitles" is ZV_WS_getTitles). `after` is called when it has returned, before its
+/// output is read.
+bool MakeCall(const std::string& name, ZV_WS_Session* session, CallResult& result, void (*after)() = nullptr);

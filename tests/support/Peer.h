@@ -21,8 +21,8 @@ public:
     /// From now on the context's connections lead to the peer that exists then.
     static void Attach(soap& context);
 
-    /// No further connection is accepted.
-    void Refuse() { m_Accepts = 0; }
+    /// How many further connections are accepted.
+    void Accept(int connections) { m_Accepts = connections; }
 
 private:
     static SOAP_SOCKET Open(soap* context, const char* endpoint, const char* host, int port);
@@ -55,6 +55,10 @@ public:
     }
     bool ReadWishlistFlag(int, bool&) override { return false; }
     bool WriteWishlistFlag(int, bool) override { return false; }
+    bool Together(const std::function<bool()>& work) override { return work(); }
+    bool Look(const std::function<bool()>& work) override { return work(); }
+    unsigned int Generation() override { return 1; }
+    bool PurgeUserData(const ZVString&) override { return true; }
 
 private:
     std::map<std::string, ZVString> m_Texts;

@@ -6,7 +6,7 @@
 
 #include <algorithm>
 
-#include "Target.h"
+#include "Require.h"
 
 Peer* Peer::s_Current;
 
@@ -86,7 +86,7 @@ PeerSession::PeerSession()
     SessionImpl& own = session();
     ZV_WS_SetupParams2& params = own.m_Params;
     params.APIKey = "desktop";
-    params.AuthToken = "token";
+    params.Customer->ChangeToken("token");
     params.DestinationUniqueID = "device";
     params.UserName = "customer";
     params.Password = "secret";
@@ -101,4 +101,5 @@ PeerSession::PeerSession()
     Peer::Attach(own.m_Stream);
     Peer::Attach(own.m_Download);
     own.m_Cache = std::make_unique<MemoryCache>();
+    own.m_IsSetUp = true;
 }

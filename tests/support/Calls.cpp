@@ -57,7 +57,7 @@ T Argument()
 }
 
 template <class... Parameters>
-CallResult Make(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), ZV_WS_Session* session)
+CallResult Make(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), ZV_WS_Session* session, void (*after)())
 {
     using Output = std::remove_pointer_t<std::tuple_element_t<sizeof...(Parameters) - 1, std::tuple<Parameters...>>>;
     CallResult result;
@@ -71,6 +71,7 @@ CallResult Make(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), ZV_WS_Sessi
         }
     };
     result.status = call(session, argument(static_cast<Parameters*>(nullptr))...);
+    if (after) after();
     Writer{result.output}.Value(output);
     if constexpr (Records::kIsRecord<Output>) ZV_WS_release(&output);
     return result;
@@ -78,10 +79,10 @@ CallResult Make(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), ZV_WS_Sessi
 
 struct Row {
     const char* name;
-    CallResult (*make)(ZV_WS_Session* session);
+    CallResult (*make)(ZV_WS_Session* session, void (*after)());
 };
 
-#define ROW(call) {#call, [](ZV_WS_Session* session) { return Make(ZV_WS_##call, session); }},
+#define ROW(call) {#call, [](ZV_WS_Session* session, void (*after)()) { return Make(ZV_WS_##call, session, after); }},
 
 const Row kRows[] = {
     // clang-format off
@@ -105,11 +106,19 @@ const Row kRows[] = {
 
 }  // namespace
 
-bool MakeCall(const std::string& name, ZV_WS_Session* session, CallResult& result)
+std::vector<std::string> CallNames()
+{
+    std::vector<std::string> names;
+    for (const Row& row : kRows)
+        names.emplace_back(row.name);
+    return names;
+}
+
+bool MakeCall(const std::string& name, ZV_WS_Session* session, CallResult& result, void (*after)())
 {
     for (const Row& row : kRows) {
         if (name != row.name) continue;
-        result = row.make(session);
+        result = row.make(session, after);
         return true;
     }
     return false;
