@@ -13,6 +13,8 @@
 struct CheckedRequest {
     const OperationRow* operation = nullptr;
     Arguments arguments;
+    int account = 0;     ///< Of the customer who asks.
+    std::string device;  ///< That asks: its DestinationUniqueID.
 };
 
 class RequestCheck {

@@ -18,7 +18,8 @@ struct StorefrontAccount {
     static constexpr char kPassword[] = "secret";
     static constexpr char kApiKey[] = "desktop";
     static constexpr char kAdultPin[] = "0042";
-    static constexpr char kActivationPin[] = "123456";  ///< "000000" locks the device out.
+    static constexpr char kActivationPin[] = "123456";        ///< "000000" locks the device out.
+    static constexpr char kSecondActivationPin[] = "654321";  ///< Signs in the second customer, on the same player.
 };
 
 struct StorefrontOptions {
