@@ -235,6 +235,7 @@ void NoteHeader(const Node& header, Database& database, CheckedRequest& checked,
                 log.soap.emplace_back(child.Name(), token ? "***" : child.Content());
             }
             const TokenStanding standing = StandingOf(database, block.Child(kService, "AuthToken").Content());
+            log.soap.emplace_back("token", standing.name);
             checked.account = standing.account;
             checked.device = block.Child(kService, "DestinationUniqueID").Content();
         }

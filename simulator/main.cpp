@@ -80,7 +80,7 @@ void PrintHelp()
         "its\n"
         "token was given out to. Without a token, or with one that was never given out or was withdrawn when its "
         "device was\n"
-        "deactivated, it is answered for the first.\n\n",
+        "deactivated, it is answered for the first. How the token stands is in the log, the token is not.\n\n",
         StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey,
         StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin, StorefrontAccount::kSecondActivationPin);
     printf("%s\n", Storefront::HelpOnFaults().c_str());

@@ -1,4 +1,4 @@
-// Two customers on one player: for whom a request is answered.
+// Two customers on one player: for whom a request is answered, and what the log tells of its token.
 #include <gtest/gtest.h>
 
 #include "RawClient.h"
@@ -24,6 +24,20 @@ protected:
     }
     std::string First() { return Activate(StorefrontAccount::kActivationPin); }
     std::string Second() { return Activate(StorefrontAccount::kSecondActivationPin); }
+
+    // How the token of a request stands that is answered for the account.
+    std::string Standing(const std::string& token, int account)
+    {
+        EXPECT_EQ(store->Query("SELECT email FROM account WHERE id = " + std::to_string(account)),
+                  AskAs(token, "getEmailAddress").Element("EmailAddress"));
+        const LoggedRequest entry = LastLogged();
+        EXPECT_EQ(token.empty() ? "" : "***", Value(entry.soap, "AuthToken"));
+        const std::string standing = Value(entry.soap, "token");
+        const bool isGood = standing == "current" || standing == "replaced";
+        EXPECT_EQ(isGood ? "true" : "false",
+                  AskAs("", "checkAuthToken", Children({{"AuthToken", token}})).Element("checkAuthTokenResult"));
+        return standing;
+    }
 };
 
 const std::string kPage = "<z:CurrentPageNumber>1</z:CurrentPageNumber><z:ItemsPerPage>9</z:ItemsPerPage>";
@@ -115,6 +129,33 @@ TEST_F(CustomerTest, NothingOfTheOthersIsReached)
         EXPECT_EQ(*row.code == '0', before != all("2")) << row.operation;
         EXPECT_EQ(first, all("1")) << row.operation;
     }
+}
+
+TEST_F(CustomerTest, TheLogTellsHowATokenStands)
+{
+    EXPECT_EQ("none", Standing("", 1));
+    EXPECT_EQ("unknown", Standing("token-2", 1));
+    const std::string first = First();
+    EXPECT_EQ("current", Standing(first, 1));
+    const std::string second = Second();
+    EXPECT_EQ("current", Standing(second, 2));
+    EXPECT_EQ("replaced", Standing(first, 1));
+    EXPECT_EQ("", Activate("111111"));
+    Order("authorizeDevice=code:1");
+    EXPECT_EQ("", First());
+    EXPECT_EQ("current", Standing(second, 2)) << "a refusal gives no token out";
+    const std::string elsewhere = Activate(StorefrontAccount::kSecondActivationPin, "bedroom");
+    EXPECT_EQ("current", Standing(second, 2)) << "each device has its last one";
+    AskAs("", "deactivateDevice");
+    for (const std::string& token : {first, second})
+        EXPECT_EQ("withdrawn", Standing(token, 1)) << token;
+    EXPECT_EQ("current", Standing(elsewhere, 2));
+
+    SoapRequest wrong = {"StreamAPI", "getConfig", "<z:Extra/>"};
+    wrong.token = second;
+    EXPECT_EQ(500, Send(wrong).status);
+    EXPECT_EQ("withdrawn", Value(LastLogged().soap, "token")) << "of refused requests, too";
+    EXPECT_EQ(std::string::npos, Plain("/control/log").body.find(second));
 }
 
 }  // namespace
