@@ -32,7 +32,7 @@ protected:
                   AskAs(token, "getEmailAddress").Element("EmailAddress"));
         const LoggedRequest entry = LastLogged();
         EXPECT_EQ(token.empty() ? "" : "***", Value(entry.soap, "AuthToken"));
-        const std::string standing = Value(entry.soap, "token");
+        std::string standing = Value(entry.soap, "token");
         const bool isGood = standing == "current" || standing == "replaced";
         EXPECT_EQ(isGood ? "true" : "false",
                   AskAs("", "checkAuthToken", Children({{"AuthToken", token}})).Element("checkAuthTokenResult"));
