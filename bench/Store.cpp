@@ -1,8 +1,13 @@
 #include "Store.h"
 
+#include <errno.h>
+#include <spawn.h>
 #include <stdio.h>
 #include <stdlib.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
+#include <chrono>
 #include <filesystem>
 
 ZV_WS_Pagination FirstPage()
@@ -16,7 +21,7 @@ ZV_WS_Pagination FirstPage()
 void Check(bool holds, const char* what)
 {
     if (holds) return;
-    fprintf(stderr, "zv_bench: failed: %s\n", what);
+    fprintf(stderr, "%s: failed: %s\n", program_invocation_short_name, what);
     exit(1);
 }
 
@@ -32,7 +37,51 @@ Storefront& TheStore()
     return *store;
 }
 
-BenchSession::BenchSession(const char* cacheFolder)
+namespace {
+
+// The line has its end.
+bool EndsIn(const std::string& line, const std::string& text)
+{
+    const std::string end = text + "\n";
+    return line.size() >= end.size() && line.compare(line.size() - end.size(), end.size(), end) == 0;
+}
+
+}  // namespace
+
+double RunClient(const char* movie, const char* text)
+{
+    using Clock = std::chrono::steady_clock;
+    TheStore();
+    setenv("STAGECRAFT_MOVIE", movie, 1);
+    int ends[2];
+    Check(pipe(ends) == 0, "a pipe");
+    posix_spawn_file_actions_t actions;
+    posix_spawn_file_actions_init(&actions);
+    posix_spawn_file_actions_adddup2(&actions, ends[1], STDOUT_FILENO);
+    posix_spawn_file_actions_addclose(&actions, ends[0]);
+    posix_spawn_file_actions_addclose(&actions, ends[1]);
+    char name[] = "zv_stagecraft", number[] = "5";
+    char* arguments[] = {name, number, nullptr};
+    pid_t process = 0;
+    const Clock::time_point start = Clock::now();
+    Check(posix_spawn(&process, CLIENT, &actions, nullptr, arguments, environ) == 0, "start of " CLIENT);
+    close(ends[1]);
+    posix_spawn_file_actions_destroy(&actions);
+    FILE* output = fdopen(ends[0], "r");
+    double seconds = -1;
+    char line[4096];
+    while (fgets(line, sizeof line, output)) {
+        if (seconds < 0 && EndsIn(line, text))  // other output may stand before it
+            seconds = std::chrono::duration<double>(Clock::now() - start).count();
+    }
+    fclose(output);
+    int status = -1;
+    waitpid(process, &status, 0);
+    Check(status == 0 && seconds >= 0, movie);
+    return seconds;
+}
+
+BenchSession::BenchSession(const char* cacheFolder, unsigned int kinds)
 {
     TheStore();
     ZV_WS_SetupParams setup;
@@ -45,7 +94,7 @@ BenchSession::BenchSession(const char* cacheFolder)
     setup.EnvNum = ENVNUM_PRODUCTION;
     if (cacheFolder) {
         setup.CacheParam.Type = CacheType_File;
-        setup.CacheParam.Data = ZV_WS_CacheParam::CacheData_Metadata;
+        setup.CacheParam.Data = kinds;
         setup.CacheParam.Path = cacheFolder;
     }
     Check(ZV_WS_initialize(&m_Handle, &setup) == ZV_WS_Status_ok, "ZV_WS_initialize");

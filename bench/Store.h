@@ -18,10 +18,14 @@ Storefront& TheStore();
 /// Exits with a line on the error stream when it does not hold: a measurement of something that failed is worthless.
 void Check(bool holds, const char* what);
 
+/// Runs the client's process with the movie, which must end well; the seconds until it wrote a line that ends in the
+/// text.
+double RunClient(const char* movie, const char* text);
+
 class BenchSession {
 public:
-    /// `cacheFolder`: of a file cache; null for none.
-    explicit BenchSession(const char* cacheFolder = nullptr);
+    /// `cacheFolder`: of a file cache for `kinds` of answers; null for none.
+    explicit BenchSession(const char* cacheFolder = nullptr, unsigned int kinds = ZV_WS_CacheParam::CacheData_Metadata);
     ~BenchSession() { ZV_WS_release(&m_Handle); }
     BenchSession(const BenchSession&) = delete;
     BenchSession& operator=(const BenchSession&) = delete;

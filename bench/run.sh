@@ -1,6 +1,6 @@
 #!/bin/bash
 # Runs every measurement and writes docs/performance.md. Further arguments go to zv_bench (--benchmark_filter=warm, for
-# one; then the table has only those rows). Wants a machine that does nothing else.
+# one; then its table has only those rows). Wants a machine that does nothing else.
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 source cmake/setup.sh
@@ -10,8 +10,12 @@ zv_build default zv_bench
 table=$(build/bin/zv_bench --benchmark_repetitions=5 --benchmark_min_time=0.2 \
     --benchmark_enable_random_interleaving=true "$@" 2>build/bench.log) ||
     { tail -n 5 build/bench.log >&2; exit 1; }
+flash=$(bench/flash.sh)
 {
     cat bench/performance.head.md
     echo "$table"
+    cat bench/flash.head.md
+    echo "$flash"
 } >docs/performance.md
 echo "$table"
+echo "$flash"

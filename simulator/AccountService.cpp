@@ -3,18 +3,9 @@
 #include <ctime>
 
 #include "PurchaseList.h"
-#include "Storefront.h"
+#include "Tokens.h"
 
 namespace {
-
-int AccountInt(Call& call, const char* column)
-{
-    return call.database.Int(std::string("SELECT ") + column + " FROM account");
-}
-std::string AccountText(Call& call, const char* column)
-{
-    return call.database.Text(std::string("SELECT ") + column + " FROM account");
-}
 
 // ---- The device
 
@@ -22,23 +13,21 @@ void authorizeDevice(Call& call)
 {
     const std::string pin = call.Text("PIN");
     if (pin == "000000") return call.Refuse(2, "device locked out");
-    if (pin != StorefrontAccount::kActivationPin) return call.Refuse(1, "invalid PIN");
-    const std::string token = "token-" + std::to_string(AccountInt(call, "active") + 1);
-    call.database.Run("UPDATE account SET token = ?, active = active + 1", {token});
+    const int account = call.database.Int("SELECT id FROM account WHERE pin = ?", {pin});
+    if (account == 0) return call.Refuse(1, "invalid PIN");
     call.Standard();
-    call.xml.Element("AuthToken", token);
+    call.xml.Element("AuthToken", GiveToken(call.database, account, call.device));
 }
 
 void deactivateDevice(Call& call)
 {
-    call.database.Run("UPDATE account SET token = ''");
+    WithdrawTokens(call.database, call.device);
     call.Standard();
 }
 
 void checkAuthToken(Call& call)
 {
-    const std::string token = call.Text("AuthToken");
-    call.xml.Raw(!token.empty() && token == AccountText(call, "token") ? "true" : "false");
+    call.xml.Raw(StandingOf(call.database, call.Text("AuthToken")).isGood ? "true" : "false");
 }
 
 void getConfig(Call& call)
@@ -64,14 +53,12 @@ void getConfig(Call& call)
 void getSettingsPageInfo(Call& call)
 {
     call.Standard();
-    call.xml.Element("Account", AccountText(call, "name"))
-        .Element("DeviceID", "1")
-        .Element("DeviceName", "Living room");
+    call.xml.Element("Account", call.AccountText("name")).Element("DeviceID", "1").Element("DeviceName", "Living room");
 }
 
 void GetCountryID(Call& call)
 {
-    call.xml.Raw(AccountText(call, "country"));
+    call.xml.Raw(call.AccountText("country"));
 }
 
 // ---- Wish list
@@ -81,31 +68,34 @@ void addItemToWishlist(Call& call)
     const int title = call.Int("TitleID");
     if (call.database.Int("SELECT COUNT(*) FROM title WHERE id = ?", {title}) == 0)
         return call.Refuse(1, "no such title");
-    call.database.Run("INSERT OR IGNORE INTO wish SELECT ?, COALESCE(MAX(added), 0) + 1 FROM wish", {title});
+    call.database.Run("INSERT OR IGNORE INTO wish SELECT ?, ?, COALESCE(MAX(added), 0) + 1 FROM wish WHERE account = ?",
+                      {call.account, title, call.account});
     call.Standard();
 }
 
 void removeItemFromWishList(Call& call)
 {
-    const bool removed = call.database.Run("DELETE FROM wish WHERE title = ?", {call.Int("TitleID")}) == 1;
+    const bool removed =
+        call.database.Run("DELETE FROM wish WHERE account = ? AND title = ?", {call.account, call.Int("TitleID")}) == 1;
     call.Standard(removed ? 0 : 1, removed ? "OK" : "not in the wish list");
 }
 
 void removeAllItemsFromWishList(Call& call)
 {
-    call.database.Run("DELETE FROM wish");
+    call.database.Run("DELETE FROM wish WHERE account = ?", {call.account});
     call.Standard();
 }
 
 void getWishlistItems(Call& call)
 {
     static const char* const kOrders[] = {"added", "name", "rating", "stars DESC"};
-    static const char* const kByType[] = {"", " WHERE is_tv = 1", " WHERE is_tv = 0"};
+    static const char* const kByType[] = {"", " AND is_tv = 1", " AND is_tv = 0"};
     const int order = call.Int("sortOrder");
     if (order < 0 || order > 3) return call.Refuse(2, "no such order");
-    const bool written = WritePurchaseList(
-        call, "wish JOIN title ON title.id = wish.title" + std::string(kByType[call.Int("TitleType")]), "wish.title",
-        "0", std::string(kOrders[order]) + ", wish.title");
+    const std::string from =
+        "wish JOIN title ON title.id = wish.title WHERE account = " + std::to_string(call.account) +
+        kByType[call.Int("TitleType")];
+    const bool written = WritePurchaseList(call, from, "wish.title", "0", std::string(kOrders[order]) + ", wish.title");
     if (written) call.xml.Element("SortOrder", order);
 }
 
@@ -114,21 +104,21 @@ void getWishlistItems(Call& call)
 void getEmailAddress(Call& call)
 {
     call.Standard();
-    call.xml.Element("EmailAddress", AccountText(call, "email"));
+    call.xml.Element("EmailAddress", call.AccountText("email"));
 }
 
 void getBillingInfo(Call& call)
 {
-    if (AccountText(call, "card").empty()) return call.Refuse(2, "no card on file");
+    if (call.AccountText("card").empty()) return call.Refuse(2, "no card on file");
     call.Standard();
-    call.xml.Element("CCLastFour", AccountText(call, "card")).Element("CCTypeId", AccountInt(call, "card_type"));
-    call.xml.Element("CCType", AccountText(call, "card_name"));
+    call.xml.Element("CCLastFour", call.AccountText("card")).Element("CCTypeId", call.AccountInt("card_type"));
+    call.xml.Element("CCType", call.AccountText("card_name"));
 }
 
 void showPrePaidCardBalance(Call& call)
 {
     call.Standard();
-    call.xml.Element("Balance", AccountInt(call, "prepaid"));
+    call.xml.Element("Balance", call.AccountInt("prepaid"));
 }
 
 void assignGiftCertificateToUser(Call& call)
@@ -138,9 +128,9 @@ void assignGiftCertificateToUser(Call& call)
     const int amount = call.database.Int("SELECT amount FROM gift WHERE code = ? AND used = 0", {code});
     if (amount == 0) return call.Refuse(1, "unknown or used code");
     call.database.Run("UPDATE gift SET used = 1 WHERE code = ?", {code});
-    call.database.Run("UPDATE account SET prepaid = prepaid + ?", {amount});
+    call.database.Run("UPDATE account SET prepaid = prepaid + ? WHERE id = ?", {amount, call.account});
     call.Standard();
-    call.xml.Element("Balance", AccountInt(call, "prepaid"));
+    call.xml.Element("Balance", call.AccountInt("prepaid"));
 }
 
 int Cents(const std::string& price)
@@ -159,16 +149,15 @@ void doPurchaseSavedbilling(Call& call)
     if (price.empty()) return call.Refuse(1, "no such product");
     if (funds != "yes" && funds != "no") return call.Refuse(7, "neither yes nor no");
     if (funds == "yes") {
-        if (AccountInt(call, "prepaid") < Cents(price)) return call.Refuse(12, "not enough prepaid money");
-        call.database.Run("UPDATE account SET prepaid = prepaid - ?", {Cents(price)});
-    } else if (AccountText(call, "card").empty()) {
+        if (call.AccountInt("prepaid") < Cents(price)) return call.Refuse(12, "not enough prepaid money");
+        call.database.Run("UPDATE account SET prepaid = prepaid - ? WHERE id = ?", {Cents(price), call.account});
+    } else if (call.AccountText("card").empty()) {
         return call.Refuse(11, "no card on file");
     }
     call.database.Run(
-        "INSERT INTO pass (title, sku, type, watch, status, position, hours, stream) SELECT title, sku, type, 0, 1, 0, "
-        "period, '' "
-        "FROM product WHERE sku = ?",
-        {sku});
+        "INSERT INTO pass (account, title, sku, type, watch, status, position, hours, stream) SELECT ?, title, sku, "
+        "type, 0, 1, 0, period, '' FROM product WHERE sku = ?",
+        {call.account, sku});
     const int pass = call.database.LastId();
     call.Standard();
     call.xml.Element("PassID", pass)
@@ -179,7 +168,7 @@ void doPurchaseSavedbilling(Call& call)
 void checkRentalExpiration(Call& call)
 {
     const int pass = call.Int("PassId");
-    if (call.database.Int("SELECT COUNT(*) FROM pass WHERE id = ?", {pass}) == 0) return call.Refuse(1, "no such pass");
+    if (!HasPass(call, "id", pass)) return call.Refuse(1, "no such pass");
     const int hours = call.database.Int("SELECT hours FROM pass WHERE id = ?", {pass});
     call.Standard();
     call.xml.Flag("ShouldDisplay", hours > 0 && hours < 48).Element("HoursRemaining", hours);
@@ -190,21 +179,20 @@ void checkRentalExpiration(Call& call)
 void checkAdultVerificationEnabled(Call& call)
 {
     call.Standard();
-    call.xml.Flag("IsAdultVerificationEnabled", AccountInt(call, "adult_enabled"));
+    call.xml.Flag("IsAdultVerificationEnabled", call.AccountInt("adult_enabled"));
 }
 
 void checkAdultVerificationPin(Call& call)
 {
     call.Standard();
-    call.xml.Flag("IsPinVerified", call.Text("Pin") == AccountText(call, "adult_pin"));
+    call.xml.Flag("IsPinVerified", call.Text("Pin") == call.AccountText("adult_pin"));
 }
 
 // ---- The account service alone
 
 void checkForPurchasedTitle(Call& call)
 {
-    call.xml.Raw(call.database.Int("SELECT COUNT(*) FROM pass WHERE title = ?", {call.Int("TitleID")}) ? "true"
-                                                                                                       : "false");
+    call.xml.Raw(HasPass(call, "title", call.Int("TitleID")) ? "true" : "false");
 }
 
 void getMyVideos(Call& call)

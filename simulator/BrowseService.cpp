@@ -166,13 +166,13 @@ void getFileType(Call& call)
 
 void shouldUpdateCache(Call& call)
 {
-    const std::string loaded = call.database.Text("SELECT load_time FROM account");
+    const std::string loaded = call.database.Text("SELECT load_time FROM service");
     call.xml.Raw(call.Text("UTCTime") == loaded ? "0" : "1");
 }
 
 void getLastCacheLoadTimeUTC(Call& call)
 {
-    call.xml.Raw(XmlEscape(call.database.Text("SELECT load_time FROM account")));
+    call.xml.Raw(XmlEscape(call.database.Text("SELECT load_time FROM service")));
 }
 
 }  // namespace

@@ -3,10 +3,14 @@
 #include <array>
 #include <cstdint>
 #include <cstdio>
+#include <vector>
 
 #include "Storefront.h"
 
 namespace {
+
+// Counted up with every change of the tables, or of what fills them.
+constexpr int kSchemaVersion = 2;
 
 const char kSchema[][512] = {
     "CREATE TABLE genre (id INTEGER PRIMARY KEY, name TEXT, visible INTEGER, parent INTEGER, label TEXT)",
@@ -23,18 +27,61 @@ const char kSchema[][512] = {
     "CREATE TABLE bonus (id INTEGER PRIMARY KEY, title INTEGER, profile INTEGER)",
     "CREATE INDEX bonus_title ON bonus (title)",
     "CREATE INDEX title_season ON title (season)",
-    "CREATE TABLE account (user TEXT, password TEXT, api_key TEXT, email TEXT, name TEXT, prepaid INTEGER, adult_pin "
-    "TEXT, "
-    "adult_enabled INTEGER, card TEXT, card_type INTEGER, card_name TEXT, audio INTEGER, country INTEGER, active "
-    "INTEGER, "
-    "token TEXT, load_time TEXT)",
-    "CREATE TABLE wish (title INTEGER PRIMARY KEY, added INTEGER)",
-    "CREATE TABLE pass (id INTEGER PRIMARY KEY, title INTEGER, sku INTEGER, type INTEGER, watch INTEGER, status "
-    "INTEGER, "
-    "position INTEGER, hours INTEGER, stream TEXT)",
+    // One row: what players sign in with, whoever is the customer, and when the catalogue was loaded.
+    "CREATE TABLE service (user TEXT, password TEXT, api_key TEXT, load_time TEXT)",
+    // A row for each customer, with the PIN that activates a player for it. Wishes, passes and tokens name their
+    // account.
+    "CREATE TABLE account (id INTEGER PRIMARY KEY, pin TEXT UNIQUE, email TEXT, name TEXT, prepaid INTEGER, adult_pin "
+    "TEXT, adult_enabled INTEGER, card TEXT, card_type INTEGER, card_name TEXT, audio INTEGER, country INTEGER)",
+    // Every token that was ever given out, and the player that has it.
+    "CREATE TABLE token (number INTEGER PRIMARY KEY, text TEXT UNIQUE, account INTEGER, device TEXT, withdrawn "
+    "INTEGER)",
+    "CREATE TABLE wish (account INTEGER, title INTEGER, added INTEGER, PRIMARY KEY (account, title))",
+    "CREATE TABLE pass (id INTEGER PRIMARY KEY, account INTEGER, title INTEGER, sku INTEGER, type INTEGER, watch "
+    "INTEGER, status INTEGER, position INTEGER, hours INTEGER, stream TEXT)",
     "CREATE TABLE gift (code TEXT PRIMARY KEY, amount INTEGER, used INTEGER)",
     "CREATE TABLE config (key TEXT, value TEXT)",
     "CREATE TABLE report (kind TEXT)",
+};
+
+struct Purchase {
+    int title, type, status, position, hours;
+};
+
+// Accounts 1 and 2. Each bought before: one video watched in part; the first customer also a rental that has run out
+// and a fresh one.
+const struct {
+    const char* pin;
+    const char* email;
+    const char* name;
+    int prepaid;  // cents
+    bool adultEnabled;
+    const char* card;
+    int cardType;
+    const char* cardName;
+    std::vector<Purchase> purchases;
+    std::vector<int> wishes;
+} kCustomers[] = {
+    {StorefrontAccount::kActivationPin,
+     "ana@customer.example",
+     "Ana S\u00e3o Jorge",
+     2500,
+     true,
+     "4242",
+     2,
+     "Visa",
+     {{12, 0, 2, 1860, 30}, {24, 0, 1, 0, 0}, {36, 1, 1, 0, 0}},
+     {7, 19, 1001}},
+    {StorefrontAccount::kSecondActivationPin,
+     "ben@customer.example",
+     "Ben Carter",
+     700,
+     false,
+     "1881",
+     1,
+     "Mastercard",
+     {{48, 1, 2, 600, 0}},
+     {8, 20}},
 };
 
 // The same numbers on every machine.
@@ -88,7 +135,7 @@ public:
             Movie();
         for (int i = 0; i < kSeries; ++i)
             Series(i);
-        Account();
+        Accounts();
     }
 
 private:
@@ -191,26 +238,32 @@ private:
         }
     }
 
-    void Account()
+    void Accounts()
     {
-        m_Database.Run(
-            "INSERT INTO account VALUES (?, ?, ?, 'ana@customer.example', 'Ana S\u00e3o Jorge', 2500, ?, 1, '4242', 2, "
-            "'Visa', 0, 1, 1, '', '11/1/2026 6:00:00 AM')",
-            {StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey,
-             StorefrontAccount::kAdultPin});
+        m_Database.Run("INSERT INTO service VALUES (?, ?, ?, '11/1/2026 6:00:00 AM')",
+                       {StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey});
         for (int i = 1; i <= 5; ++i) {
             m_Database.Run("INSERT INTO gift VALUES (?, ?, 0)", {"GIFT" + std::to_string(i), i * 1000});
         }
-        // Three purchases made before: one watched in part, one rental run out, one fresh.
-        const int passes[][5] = {{12, 0, 2, 1860, 30}, {24, 0, 1, 0, 0}, {36, 1, 1, 0, 0}};
-        for (const auto& pass : passes) {
+        int account = 0;
+        for (const auto& customer : kCustomers) {
+            ++account;
             m_Database.Run(
-                "INSERT INTO pass (title, sku, type, watch, status, position, hours, stream) VALUES (?, ?, ?, ?, ?, ?, "
-                "?, '')",
-                {pass[0], pass[0] * 10 + pass[1], pass[1], pass[1] == 0 && pass[4] == 0, pass[2], pass[3], pass[4]});
+                "INSERT INTO account VALUES (?, ?, ?, ?, ?, ?, ?, ?, ?, ?, 0, 1)",
+                {account, customer.pin, customer.email, customer.name, customer.prepaid, StorefrontAccount::kAdultPin,
+                 customer.adultEnabled, customer.card, customer.cardType, customer.cardName});
+            for (const Purchase& bought : customer.purchases) {
+                m_Database.Run(
+                    "INSERT INTO pass (account, title, sku, type, watch, status, position, hours, stream) VALUES (?, "
+                    "?, ?, ?, ?, ?, ?, ?, '')",
+                    {account, bought.title, bought.title * 10 + bought.type, bought.type,
+                     bought.type == 0 && bought.hours == 0, bought.status, bought.position, bought.hours});
+            }
+            for (const int title : customer.wishes)
+                m_Database.Run("INSERT INTO wish VALUES (?, ?, ?)", {account, title, title});
         }
-        for (const int title : {7, 19, 1001})
-            m_Database.Run("INSERT INTO wish VALUES (?, ?)", {title, title});
+        // The player was activated once before, and deactivated.
+        m_Database.Run("INSERT INTO token VALUES (1, 'token-1', 1, 'desktop-player', 1)");
     }
 
     Database& m_Database;
@@ -220,12 +273,25 @@ private:
 
 }  // namespace
 
-void FillCatalogue(Database& database)
+bool FillCatalogue(Database& database, std::string& error)
 {
-    if (database.Int("SELECT COUNT(*) FROM sqlite_master WHERE name = 'report'") != 0) return;
+    const bool isNew = database.Int("SELECT COUNT(*) FROM sqlite_master") == 0;
+    const int version = isNew ? kSchemaVersion : database.Int("PRAGMA user_version");
+    if (version != kSchemaVersion) {
+        error = database.File() + ": has tables of version " + std::to_string(version) + ", not " +
+                std::to_string(kSchemaVersion) +
+                "; remove it to start with new data, or name another folder with --data";
+        return false;
+    }
     database.Run("BEGIN");
-    for (const char* statement : kSchema)
-        database.Run(statement);
-    Filler(database).Fill();
-    database.Run("COMMIT");
+    bool isWritten = database.Run("PRAGMA user_version = " + std::to_string(kSchemaVersion)) >= 0;
+    if (isNew) {
+        for (const char* statement : kSchema)
+            isWritten = isWritten && database.Run(statement) >= 0;
+        Filler(database).Fill();
+    }
+    if (isWritten && database.Run("COMMIT") >= 0) return true;
+    database.Run("ROLLBACK");
+    error = database.File() + ": cannot write the database; name a folder that can be written with --data";
+    return false;
 }

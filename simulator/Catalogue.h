@@ -3,5 +3,6 @@
 
 #include "Database.h"
 
-/// Makes the tables and fills them unless that is done; within a second.
-void FillCatalogue(Database& database);
+/// Makes the tables of a new database and fills them; within a second. False, with the reason and what to do, when the
+/// database has tables of another version, which stay as they are, or cannot be written.
+bool FillCatalogue(Database& database, std::string& error);

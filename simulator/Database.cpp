@@ -45,7 +45,8 @@ std::unique_ptr<Database> Database::Open(const std::string& file, std::string& e
         sqlite3_busy_timeout(opened, 5000);
         sqlite3_create_function(opened, "fold", 1, SQLITE_UTF8 | SQLITE_DETERMINISTIC, nullptr, FoldFunction, nullptr,
                                 nullptr);
-        if (database->Run("PRAGMA synchronous = OFF") >= 0 && database->Run("PRAGMA user_version = 1") >= 0) {
+        // The first statement that reads the file finds out whether it is a database.
+        if (database->Run("PRAGMA synchronous = OFF") >= 0 && database->Run("PRAGMA user_version") >= 0) {
             return database;
         }
     }
@@ -93,13 +94,21 @@ void Database::Each(const std::string& sql, const Values& values, const std::fun
 int Database::Int(const std::string& sql, const Values& values, int standard)
 {
     int value = standard;
-    Each(sql, values, [&](const Row& row) { value = row.Int(0); });
+    bool isFirst = true;
+    Each(sql, values, [&](const Row& row) {
+        if (isFirst) value = row.Int(0);
+        isFirst = false;
+    });
     return value;
 }
 
 std::string Database::Text(const std::string& sql, const Values& values)
 {
     std::string value;
-    Each(sql, values, [&](const Row& row) { value = row.Text(0); });
+    bool isFirst = true;
+    Each(sql, values, [&](const Row& row) {
+        if (isFirst) value = row.Text(0);
+        isFirst = false;
+    });
     return value;
 }

@@ -42,8 +42,11 @@ public:
     int Run(const std::string& sql, const Values& values = {});
     /// Calls `use` for each row.
     void Each(const std::string& sql, const Values& values, const std::function<void(const Row&)>& use);
+    /// The first column of the first row.
     int Int(const std::string& sql, const Values& values = {}, int standard = 0);
     std::string Text(const std::string& sql, const Values& values = {});
+    /// Its path.
+    std::string File() { return sqlite3_db_filename(m_Database.get(), "main"); }
     int LastId() { return static_cast<int>(sqlite3_last_insert_rowid(m_Database.get())); }
 
     /// Held for the whole of one request, so that requests see each other's effects whole.

@@ -1,4 +1,4 @@
-// Pages of purchases and wishes, which have the same shape.
+// The customer's purchases, and pages of purchases and wishes, which have the same shape.
 #pragma once
 
 #include "TitleXml.h"
@@ -7,6 +7,9 @@
 bool WritePurchaseList(Call& call, const std::string& from, const std::string& titleColumn,
                        const std::string& passColumn, const std::string& order);
 
-/// The account's purchases, narrowed by the request's three filters.
+/// Whether one of the customer's purchases has that value in the column.
+bool HasPass(Call& call, const char* column, int value);
+
+/// The customer's purchases, narrowed by the request's three filters.
 void WriteMyVideos(Call& call);
 const std::vector<Child>& MyVideosChildren();

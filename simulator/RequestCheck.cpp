@@ -9,6 +9,8 @@
 #include <ctime>
 #include <memory>
 
+#include "Tokens.h"
+
 namespace {
 
 const char kEnvelope[] = "http://schemas.xmlsoap.org/soap/envelope/";
@@ -215,8 +217,8 @@ bool IsSecret(const std::string& name)
     return name == "password" || name == "PIN" || name == "Pin" || name == "AuthToken" || name == "GiftCertificateCode";
 }
 
-// What the log tells of a header, right or wrong.
-void NoteHeader(const Node& header, LoggedRequest& log)
+// What the log tells of a header, right or wrong, and who asks.
+void NoteHeader(const Node& header, Database& database, CheckedRequest& checked, LoggedRequest& log)
 {
     for (const Node& block : header.Children()) {
         if (block.Is(kSecurity, "Security")) {
@@ -232,6 +234,10 @@ void NoteHeader(const Node& header, LoggedRequest& log)
                 const bool token = child.Name() == "AuthToken" && !child.Content().empty();
                 log.soap.emplace_back(child.Name(), token ? "***" : child.Content());
             }
+            const TokenStanding standing = StandingOf(database, block.Child(kService, "AuthToken").Content());
+            log.soap.emplace_back("token", standing.name);
+            checked.account = standing.account;
+            checked.device = block.Child(kService, "DestinationUniqueID").Content();
         }
     }
 }
@@ -281,7 +287,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
                       XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING),
         xmlFreeDoc);
     const Node envelope(document ? xmlDocGetRootElement(document.get()) : nullptr);
-    NoteHeader(envelope.Child(kEnvelope, "Header"), log);
+    NoteHeader(envelope.Child(kEnvelope, "Header"), m_Database, checked, log);
     const std::vector<Node> bodies = envelope.Child(kEnvelope, "Body").Children();
     const Node body = bodies.empty() ? Node() : bodies[0];
     log.operation = body.Name();
@@ -323,10 +329,10 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     const std::string nonce = Unbase64(token.Child(kSecurity, "Nonce").Content());
     const std::string created = token.Child(kUtility, "Created").Content();
     const std::string secret =
-        m_Database.Text("SELECT password FROM account WHERE user = ?", {token.Child(kSecurity, "Username").Content()});
+        m_Database.Text("SELECT password FROM service WHERE user = ?", {token.Child(kSecurity, "Username").Content()});
     if (secret.empty() || password.Content() != Sha1(nonce + created + secret)) return "authentication failed";
     if (!IsNewNonce(nonce)) return "the nonce was used before";
 
-    wrong = CheckSettings(blocks[5], m_Database.Text("SELECT api_key FROM account"));
+    wrong = CheckSettings(blocks[5], m_Database.Text("SELECT api_key FROM service"));
     return wrong.empty() ? CheckChildren(body, *checked.operation, checked.arguments) : wrong;
 }

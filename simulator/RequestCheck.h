@@ -13,6 +13,8 @@
 struct CheckedRequest {
     const OperationRow* operation = nullptr;
     Arguments arguments;
+    int account = 0;     ///< Of the customer who asks.
+    std::string device;  ///< That asks: its DestinationUniqueID.
 };
 
 class RequestCheck {
@@ -20,7 +22,7 @@ public:
     explicit RequestCheck(Database& database) : m_Database(database) {}
 
     /// Checks a request to the service whose endpoint is `endpoint`. Empty when it is right, else what is wrong with
-    /// it. `log` gets the operation and its children either way, as far as they were found.
+    /// it. `log` gets the operation, its children and the token's standing either way, as far as they were found.
     std::string Check(const HttpRequest& request, const ServiceRow& service, const std::string& endpoint,
                       CheckedRequest& checked, LoggedRequest& log);
 

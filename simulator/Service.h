@@ -47,9 +47,14 @@ struct Call {
     XmlWriter& xml;
     const char* refusal;  ///< The operation's.
     std::string address;  ///< "host:port" of the plain HTTP side, for addresses in answers.
+    int account;          ///< Of the customer who asks.
+    std::string device;   ///< That asks: its DestinationUniqueID.
 
     int Int(const char* name) const { return arguments.Int(name); }
     std::string Text(const char* name) const { return arguments.Text(name); }
+    /// What the column of the customer's account holds.
+    int AccountInt(const char* column) const;
+    std::string AccountText(const char* column) const;
     /// The head of most results.
     void Standard(int code = 0, const std::string& message = "OK") const
     {

@@ -67,6 +67,16 @@ const std::vector<ServiceRow>& Services()
     return services;
 }
 
+int Call::AccountInt(const char* column) const
+{
+    return database.Int(std::string("SELECT ") + column + " FROM account WHERE id = ?", {account});
+}
+
+std::string Call::AccountText(const char* column) const
+{
+    return database.Text(std::string("SELECT ") + column + " FROM account WHERE id = ?", {account});
+}
+
 void Call::Refuse(int code, const std::string& message) const
 {
     const std::string text = refusal;
@@ -98,8 +108,12 @@ const ServiceRow* SoapService::Find(const std::string& path)
 
 std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& fault)
 {
-    XmlWriter xml;
-    Call call{m_Database, checked.arguments, xml, checked.operation->refusal, m_PlainAddress};
+    XmlWriter xml, refusal;
+    const auto into = [&](XmlWriter& writer) {
+        return Call{m_Database,     checked.arguments, writer,        checked.operation->refusal,
+                    m_PlainAddress, checked.account,   checked.device};
+    };
+    Call call = into(xml);
     const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
     if (ClaimsFailure(fault)) {
         m_Database.Run("SAVEPOINT request");
@@ -110,9 +124,7 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
         checked.operation->handle(call);
     }
     if (!fault.Is("code") || checked.operation->bare) return xml.Text();
-    XmlWriter refusal;
-    Call refused{m_Database, checked.arguments, refusal, checked.operation->refusal, m_PlainAddress};
-    refused.Refuse(fault.Number(1), "refused as asked");
+    into(refusal).Refuse(fault.Number(1), "refused as asked");
     return refusal.Text();
 }
 

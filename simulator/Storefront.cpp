@@ -205,7 +205,9 @@ bool Simulator::WriteFiles(std::string& error)
 {
     std::ofstream account(m_Folder + "/account.txt");
     account << "user = " << StorefrontAccount::kUser << "\npassword = " << StorefrontAccount::kPassword
-            << "\napi key = " << StorefrontAccount::kApiKey << "\n";
+            << "\napi key = " << StorefrontAccount::kApiKey
+            << "\nactivation PIN = " << StorefrontAccount::kActivationPin
+            << "\nsecond activation PIN = " << StorefrontAccount::kSecondActivationPin << "\n";
     std::ofstream file(DeploymentFile());
     file << "# Written by the storefront simulator when it starts.\n";
     for (const char* key : {"production_host", "api_staging_host", "internal_staging_host", "adult_production_host",
@@ -231,9 +233,8 @@ bool Simulator::Begin(std::string& error)
     m_Certificates = Certificates::Open(m_Folder, error);
     if (!m_Certificates) return false;
     m_Database = Database::Open(m_Folder + "/storefront.db", error);
-    if (!m_Database) return false;
+    if (!m_Database || !FillCatalogue(*m_Database, error)) return false;
     xmlInitParser();
-    FillCatalogue(*m_Database);
     m_Soap = std::make_unique<SoapService>(*m_Database, "localhost:" + std::to_string(m_HttpPort));
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.oldTls);
     if (!WriteFiles(error)) return false;

@@ -18,7 +18,8 @@ struct StorefrontAccount {
     static constexpr char kPassword[] = "secret";
     static constexpr char kApiKey[] = "desktop";
     static constexpr char kAdultPin[] = "0042";
-    static constexpr char kActivationPin[] = "123456";  ///< "000000" locks the device out.
+    static constexpr char kActivationPin[] = "123456";        ///< "000000" locks the device out.
+    static constexpr char kSecondActivationPin[] = "654321";  ///< Signs in the second customer, on the same player.
 };
 
 struct StorefrontOptions {
@@ -39,8 +40,9 @@ struct LoggedRequest {
     std::string operation;  ///< SOAP operation; the service's name for the others; the prefix for box art.
     std::vector<std::pair<std::string, std::string>> headers;  ///< HTTP headers, names in lower case.
     std::vector<std::pair<std::string, std::string>>
-        soap;  ///< The SOAP header's: user, messageID, to, settings (the block's name) and the settings' children, the
-               ///< token as "***".
+        soap;  ///< The SOAP header's: user, messageID, to, settings (the block's name), the settings' children,
+               ///< AuthToken as "***", and token: "none", "current" (the one that its device was given last),
+               ///< "replaced" (given out before that one), "withdrawn" or "unknown", as it was when the request came.
     std::vector<std::pair<std::string, std::string>>
         children;  ///< The request's, in order; passwords and PINs as "***".
     unsigned long connection = 0;

@@ -18,7 +18,8 @@ void getMyStreamingVideos(Call& call)
 void getTitleListingsPurchasedForPasses(Call& call)
 {
     for (const int pass : call.arguments.arrays.at("Passes")) {
-        const int title = call.database.Int("SELECT title FROM pass WHERE id = ?", {pass});
+        const int title =
+            call.database.Int("SELECT title FROM pass WHERE id = ? AND account = ?", {pass, call.account});
         if (title == 0) continue;
         call.xml.Group("TitleListingPurchasedForPass", [&] {
             WritePurchased(call, title, pass, 1);
@@ -27,26 +28,20 @@ void getTitleListingsPurchasedForPasses(Call& call)
     }
 }
 
-void WriteFlag(Call& call, const char* where, int value)
-{
-    call.xml.Raw(call.database.Int(std::string("SELECT COUNT(*) FROM pass WHERE ") + where, {value}) ? "true"
-                                                                                                     : "false");
-}
-
 void checkForPurchasedStream(Call& call)
 {
-    WriteFlag(call, "sku = ?", call.Int("SkuID"));
+    call.xml.Raw(HasPass(call, "sku", call.Int("SkuID")) ? "true" : "false");
 }
 void checkForPurchasedStreamByTitleID(Call& call)
 {
-    WriteFlag(call, "title = ?", call.Int("TitleID"));
+    call.xml.Raw(HasPass(call, "title", call.Int("TitleID")) ? "true" : "false");
 }
 
 void removeAllMyPurchases(Call& call)
 {
-    if (call.Text("password") != call.database.Text("SELECT password FROM account"))
+    if (call.Text("password") != call.database.Text("SELECT password FROM service"))
         return call.Refuse(1, "wrong password");
-    call.database.Run("DELETE FROM pass");
+    call.database.Run("DELETE FROM pass WHERE account = ?", {call.account});
     call.Standard();
 }
 
@@ -68,13 +63,15 @@ void LocatePass(Call& call, bool resume)
 {
     const int pass = call.Int("PassID");
     bool found = false;
-    call.database.Each("SELECT title, status, position FROM pass WHERE id = ?", {pass}, [&](const Database::Row& row) {
-        found = true;
-        const std::string stream = "stream-" + std::to_string(pass);
-        const std::string profile = call.Text("FileProfile");
-        WriteLocation(call, row.Text(0) + "-" + profile + ".mp4", pass * 100 + call.Int("FileProfile"), stream,
-                      row.Int(1), resume ? row.Int(2) : 0);
-    });
+    call.database.Each("SELECT title, status, position FROM pass WHERE id = ? AND account = ?", {pass, call.account},
+                       [&](const Database::Row& row) {
+                           found = true;
+                           const std::string stream = "stream-" + std::to_string(pass);
+                           const std::string profile = call.Text("FileProfile");
+                           WriteLocation(call, row.Text(0) + "-" + profile + ".mp4",
+                                         pass * 100 + call.Int("FileProfile"), stream, row.Int(1),
+                                         resume ? row.Int(2) : 0);
+                       });
     if (!found) return call.Refuse(2, "no such pass");
     call.database.Run("UPDATE pass SET stream = 'stream-' || id WHERE id = ?", {pass});
 }
@@ -100,16 +97,14 @@ void manageStreamInstanceStatus(Call& call)
 {
     const std::string stream = call.Text("StreamID");
     const bool known = stream.rfind("trailer-", 0) == 0 ||
-                       call.database.Run("UPDATE pass SET status = ?, position = ? WHERE stream = ?",
-                                         {call.Int("Status"), call.Int("StopTimeSeconds"), stream}) == 1;
+                       call.database.Run("UPDATE pass SET status = ?, position = ? WHERE stream = ? AND account = ?",
+                                         {call.Int("Status"), call.Int("StopTimeSeconds"), stream, call.account}) == 1;
     call.Standard(known ? 0 : 1, known ? "OK" : "no such stream");
 }
 
 void getTHXMediaDirector(Call& call)
 {
-    if (call.database.Int("SELECT COUNT(*) FROM pass WHERE id = ?", {call.Int("PassID")}) == 0) {
-        return call.Refuse(2, "no such pass");
-    }
+    if (!HasPass(call, "id", call.Int("PassID"))) return call.Refuse(2, "no such pass");
     call.Standard();
     call.xml.Element("LongFormat", "THX-LONG-" + call.Text("AudioSetting")).Element("ShortFormat", "THX-S");
 }
@@ -127,13 +122,13 @@ void getTHXMediaDirectorBonusAsset(Call& call)
 
 void setAudioDefaultProperty(Call& call)
 {
-    call.database.Run("UPDATE account SET audio = ?", {call.Int("AudioSetting")});
+    call.database.Run("UPDATE account SET audio = ? WHERE id = ?", {call.Int("AudioSetting"), call.account});
     call.Standard();
 }
 
 void getAudioDefaultProperty(Call& call)
 {
-    call.xml.Raw(EnumText(ChildType::AudioProfile, call.database.Int("SELECT audio FROM account")));
+    call.xml.Raw(EnumText(ChildType::AudioProfile, call.AccountInt("audio")));
 }
 
 void calcOrderTax(Call& call)
@@ -151,13 +146,13 @@ void getBillingInfoAndPPCBalance(Call& call)
 {
     call.xml.Group("BillingInfo", [&] {
         call.Standard();
-        call.xml.Element("CCLastFour", call.database.Text("SELECT card FROM account"));
-        call.xml.Element("CCTypeId", call.database.Int("SELECT card_type FROM account"));
-        call.xml.Element("CCType", call.database.Text("SELECT card_name FROM account"));
+        call.xml.Element("CCLastFour", call.AccountText("card"));
+        call.xml.Element("CCTypeId", call.AccountInt("card_type"));
+        call.xml.Element("CCType", call.AccountText("card_name"));
     });
     call.xml.Group("PPCardBalance", [&] {
         call.Standard();
-        call.xml.Element("Balance", call.database.Int("SELECT prepaid FROM account"));
+        call.xml.Element("Balance", call.AccountInt("prepaid"));
     });
 }
 
@@ -201,10 +196,17 @@ bool WritePurchaseList(Call& call, const std::string& from, const std::string& t
     return true;
 }
 
+bool HasPass(Call& call, const char* column, int value)
+{
+    return call.database.Int(std::string("SELECT COUNT(*) FROM pass WHERE account = ? AND ") + column + " = ?",
+                             {call.account, value}) != 0;
+}
+
 void WriteMyVideos(Call& call)
 {
     static const char* const kByType[] = {"", " AND is_tv = 1", " AND is_tv = 0"};
-    std::string from = "pass JOIN title ON title.id = pass.title WHERE 1" + std::string(kByType[call.Int("TitleType")]);
+    std::string from = "pass JOIN title ON title.id = pass.title WHERE account = " + std::to_string(call.account) +
+                       kByType[call.Int("TitleType")];
     if (call.Int("PurchaseType") != 2) from += " AND type = " + std::to_string(call.Int("PurchaseType"));
     if (call.Int("WatchStatusFilter") != 3) from += " AND watch = " + std::to_string(call.Int("WatchStatusFilter"));
     WritePurchaseList(call, from, "pass.title", "pass.id", "pass.id");

@@ -81,8 +81,9 @@ void WriteTitleDetails(Call& call, int title)
                 .Optional("Writers", row.Text(4))
                 .Optional("Producers", row.Text(5));
             call.xml.Optional("Copyright", row.Text(6)).Optional("RunTime", row.Text(7));
-            call.xml.Flag("IsAvailInUserWishList",
-                          call.database.Int("SELECT COUNT(*) FROM wish WHERE title = ?", {title}));
+            call.xml.Flag(
+                "IsAvailInUserWishList",
+                call.database.Int("SELECT COUNT(*) FROM wish WHERE account = ? AND title = ?", {call.account, title}));
             call.xml.Optional("RatingReason", row.Text(8));
         });
 }

@@ -75,17 +75,21 @@ void PrintHelp()
         "Account: user \"%s\", password \"%s\", API key \"%s\", adult PIN %s, activation PIN %s (000000 locks out), "
         "gift\n"
         "codes GIFT1 to GIFT5. Products 9001 to 9022 refuse to be bought with response code 1 to 22, 9101 to 9122 to "
-        "be taxed.\n\n",
+        "be taxed.\n"
+        "Activation PIN %s signs in a second customer on the same player: a request is answered for the customer whom "
+        "its\n"
+        "token was given out to. Without a token, or with one that was never given out or was withdrawn when its "
+        "device was\n"
+        "deactivated, it is answered for the first. How the token stands is in the log, the token is not.\n\n",
         StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey,
-        StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin);
+        StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin, StorefrontAccount::kSecondActivationPin);
     printf("%s\n", Storefront::HelpOnFaults().c_str());
     printf(
         "Control, on the plain HTTP port: POST /control/faults (a fault a line), GET and DELETE /control/faults,\n"
         "GET /control/log (a JSON object a line), DELETE /control/log.\n\n"
         "Not checked: which device asks (any DestinationUniqueID and type will do), whether it is activated before it "
-        "buys, the\n"
-        "value of AuthToken in the device settings, the user agent's text, unused namespace declarations, and anything "
-        "behind\n"
+        "buys,\n"
+        "which device a token was given to, the user agent's text, unused namespace declarations, and anything behind\n"
         "the addresses of streams and licences. Header blocks that the client has no use for (RelatesTo, From, "
         "FaultTo) are\n"
         "refused, and so are the operations that it never calls.\n");

@@ -78,7 +78,7 @@ std::string Object(const std::string& properties)
 }
 std::string Account(const std::string& properties)
 {
-    return "SELECT json_object(" + kOk + ", " + properties + ") FROM account";
+    return "SELECT json_object(" + kOk + ", " + properties + ") FROM account WHERE id = 1";
 }
 std::string Value(const std::string& json)
 {
@@ -113,11 +113,12 @@ std::vector<Row> Rows(const Storefront& store)
         "SELECT DISTINCT title FROM title_genre WHERE genre = (SELECT MAX(genre) FROM title_genre WHERE title = 12) "
         "AND title > 12 ORDER BY title LIMIT 5";
     const std::string wishRows =
-        "SELECT title.*, row_number() OVER (ORDER BY name, id) AS row FROM wish JOIN title ON title = id ORDER BY "
-        "name, id";
+        "SELECT title.*, row_number() OVER (ORDER BY name, id) AS row FROM wish JOIN title ON title = id WHERE "
+        "account = 1 ORDER BY name, id";
     const std::string passRows =
         "SELECT title.*, pass.id AS pass, pass.type AS p_type, watch, status, position, row_number() OVER (ORDER BY "
-        "pass.id) AS row FROM pass JOIN title ON title.id = pass.title ORDER BY pass.id";
+        "pass.id) AS row FROM pass JOIN title ON title.id = pass.title WHERE account = 1 "
+        "ORDER BY pass.id";
     return {
         {"getNavigation", "{}",
          "SELECT json_group_array(json_object('ID', id, 'Name', name, 'Visible', " + Flag("visible") +
@@ -160,7 +161,7 @@ std::vector<Row> Rows(const Storefront& store)
         {"removeItemFromWishlist", "{titleid: 60}", Object(kOk)},
         {"removeAllItemsFromWishlist", "{}", Object(kOk)},
         {"doPurchaseSavedBilling", "{skuid: " + sku + ", ipaddress: '10.0.0.1', useprepaidfund: true}",
-         Object(kOk + ", 'PassID', 4, 'TransactionID', 5004, 'TransactionAuthNum', 'A4'")},
+         Object(kOk + ", 'PassID', 5, 'TransactionID', 5005, 'TransactionAuthNum', 'A5'")},
         {"checkForPurchasedTitle", "{titleid: 61}", Value("false")},
         {"checkForPurchasedSku", "{skuid: " + sku + "}", Value("true")},
         {"checkAdultVerificationEnabled", "{}", Object(kOk + ", 'IsAdultVerificationEnabled', json('true')")},

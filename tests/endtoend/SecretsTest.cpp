@@ -68,7 +68,7 @@ protected:
                                StorefrontAccount::kActivationPin,
                                "111111",
                                "GIFT1",
-                               "token-" + store->Query("SELECT active FROM account"),
+                               store->Query("SELECT text FROM token ORDER BY number DESC"),
                                ContentOf(store->DataFolder() + "/device.key")};
         for (const std::string& secret : secrets) {
             ASSERT_LE(5u, secret.size());

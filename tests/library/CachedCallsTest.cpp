@@ -148,7 +148,7 @@ TEST_F(Cached, ANewCatalogueDropsTheAnswers)
     store->ClearLog();
     Listing();
     EXPECT_TRUE(store->Log().empty());
-    store->Query("UPDATE account SET load_time = '11/21/2026 6:00:00 AM'");
+    store->Query("UPDATE service SET load_time = '11/21/2026 6:00:00 AM'");
     EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_shouldUpdateCache(&session, time.data, &should));
     EXPECT_TRUE(should);
     // A new session looks by itself.

@@ -65,10 +65,10 @@ TEST_F(Calls, OfTheAccount)
     Owned<ZV_WS_BillingInfoAndPPCBalanceResponse> both;
     OK(ZV_WS_getBillingInfoAndPPCBalance(&session, &both));
     EXPECT_STREQ("Visa", both.BillingInfo.CCType);
-    EXPECT_EQ(Number("SELECT prepaid FROM account"), both.PPCardBalance.Balance);
+    EXPECT_EQ(Number("SELECT prepaid FROM account WHERE id = 1"), both.PPCardBalance.Balance);
     EXPECT_EQ(ZV_WS_Status_general_error, Asking(ZV_WS_removeAllMyPurchases, "wrong")(&session));
     OK(Asking(ZV_WS_removeAllMyPurchases, StorefrontAccount::kPassword)(&session));
-    EXPECT_EQ(0, Number("SELECT COUNT(*) FROM pass"));
+    EXPECT_EQ(0, Number("SELECT COUNT(*) FROM pass WHERE account = 1"));
     OK(Asking(ZV_WS_returnTimeout)(&session));
     OK(Asking(ZV_WS_returnError)(&session));
     EXPECT_EQ("timeout,error", store->Query("SELECT group_concat(kind) FROM report"));

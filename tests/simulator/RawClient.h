@@ -95,6 +95,8 @@ struct SoapRequest {
     std::string password = "secret";
     long long created_offset = 0;  ///< seconds from now
     std::string nonce = {};        ///< of one's own; else a fresh one
+    std::string token = {};        ///< from "authorizeDevice"
+    std::string device = "desktop-player";
 
     std::string Envelope(int port) const
     {
@@ -128,10 +130,10 @@ struct SoapRequest {
                std::to_string(port) + base + service +
                R"(.asmx</a:To><a:Action e:mustUnderstand="1">http://api.zorvane.example/api/)" + operation +
                "</a:Action><z:" + block +
-               R"( e:mustUnderstand="1"><z:APIKey>desktop</z:APIKey><z:DestinationUniqueID>desktop-player)"
-               "</z:DestinationUniqueID><z:DestinationTypeID>48</z:DestinationTypeID></z:" +
-               block + "></e:Header><e:Body><z:" + operation + ">" + children + "</z:" + operation +
-               "></e:Body></e:Envelope>";
+               R"( e:mustUnderstand="1"><z:APIKey>desktop</z:APIKey><z:DestinationUniqueID>)" + device +
+               "</z:DestinationUniqueID><z:DestinationTypeID>48</z:DestinationTypeID>" +
+               (token.empty() ? "" : "<z:AuthToken>" + token + "</z:AuthToken>") + "</z:" + block +
+               "></e:Header><e:Body><z:" + operation + ">" + children + "</z:" + operation + "></e:Body></e:Envelope>";
     }
     std::string Head(int port, size_t length) const
     {

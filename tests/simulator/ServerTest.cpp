@@ -4,6 +4,7 @@
 #include <chrono>
 #include <filesystem>
 
+#include "Database.h"
 #include "Process.h"
 #include "RawClient.h"
 #include "TempFolder.h"
@@ -87,6 +88,13 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
 {
     Begin();
     const std::string taken = std::to_string(store->HttpPort());
+    const TempFolder old;
+    const auto tables = [&] {
+        std::string error;
+        return Database::Open(old / "storefront.db", error);
+    };
+    tables()->Run("CREATE TABLE account (user TEXT)");
+    tables()->Run("PRAGMA user_version = 1");
     const struct {
         Lines arguments;
         int code;
@@ -98,13 +106,16 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
                 {{"--certificate", "bad"}, 2, "--certificate needs KIND"},
                 {{"--fault", "getConfig=sever"}, 1, "sever"},
                 {{"--http-port", taken}, 1, "port " + taken},
-                {{"--data", "/proc/storefront"}, 1, "/proc/storefront"}};
+                {{"--data", "/proc/storefront"}, 1, "/proc/storefront"},
+                {{"--data", old / ""}, 1, "storefront.db: has tables of version 1"}};
     for (const auto& row : rows) {
         Process program(Lines{STOREFRONT_PROGRAM} + row.arguments, {});
         EXPECT_EQ(row.code, WEXITSTATUS(program.WaitForEnd())) << row.text;
         ASSERT_EQ(1u, program.Errors().size()) << row.text;
         EXPECT_NE(std::string::npos, program.Errors()[0].find(row.text)) << program.Errors()[0];
     }
+    EXPECT_EQ("account 1", tables()->Text("SELECT name || ' ' || user_version FROM sqlite_master, pragma_user_version"))
+        << "nothing is lost";
 }
 
 }  // namespace
