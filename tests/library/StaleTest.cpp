@@ -1,5 +1,6 @@
 // What a change has made stale is shown to nobody, and what belongs to one customer not to another: whichever session
 // asked, and whenever its answer came.
+#include <algorithm>
 #include <filesystem>
 #include <thread>
 
@@ -77,7 +78,7 @@ TEST_F(Stale, AnAnswerThatAChangeOvertakesIsNotKept)
     const AnyCall add = Asking(ZV_WS_addItemToWishlist, kTitle);
     const AnyCall activate = Asking(ZV_WS_authorizeDevice, StorefrontAccount::kActivationPin);
     const AnyCall refresh = [&](ZV_WS_Session* session) {
-        store->Query("UPDATE account SET load_time = load_time || '1'");
+        store->Query("UPDATE service SET load_time = load_time || '1'");
         return ZV_WS_updateLocalCache(session, kAll);
     };
     const struct {
@@ -199,6 +200,57 @@ TEST_F(Stale, WhatCannotBePurgedIsNotShown)
     for (int i = 0; i < 2; ++i)
         EXPECT_EQ(4, WishlistItems(&other));
     EXPECT_EQ(1u, store->Log().size()) << "cached again";
+}
+
+// ---- Customers
+
+// Whoever activates the device, and from whichever of its sessions: from the next request on all of them are the new
+// customer's, and show nothing of the one before.
+TEST_F(Stale, AnotherCustomerOnTheSamePlayer)
+{
+    const auto seen = [](ZV_WS_Session* session) {
+        Owned<ZV_WS_EmailAddressResponse> address;
+        Owned<ZV_WS_BillingInfoResponse> billing;
+        Owned<ZV_WS_SettingsPageInfoResponse> settings;
+        Owned<ZV_WS_MyVideosResponse> videos;
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getEmailAddress(session, &address));
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getBillingInfo(session, &billing));
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getSettingsPageInfo(session, &settings));
+        EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_getMyVideos(session, &kPage, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY,
+                                                     WATCH_STATUS_UNDEFINED, &videos));
+        std::string all;
+        for (const char* text : {address.EmailAddress, billing.CCLastFour, settings.Account})
+            all += std::string(text ? text : "null") + " ";
+        for (unsigned int i = 0; i < videos.Titles.size; ++i)
+            all += std::to_string(videos.Titles.TitleListingPurchased[i].PassID) + " ";
+        return all + std::to_string(WishlistItems(session));
+    };
+    const AnyCall second = Asking(ZV_WS_authorizeDevice, StorefrontAccount::kSecondActivationPin);
+    for (const CacheType type : {CacheType_File, CacheType_Memory, CacheType_None}) {
+        for (const bool isByDuplicate : {false, true}) {
+            SCOPED_TRACE(testing::Message() << "cache " << type << ", by the duplicate " << isByDuplicate);
+            ASSERT_NO_FATAL_FAILURE(Begin(true, type));
+            ZV_WS_Session* const actor = isByDuplicate ? &other : &session;
+            const auto all = [&](const char* standing) {
+                store->ClearLog();
+                const std::string one = seen(&session), two = seen(&other);
+                EXPECT_EQ(one, two);
+                for (const LoggedRequest& request : store->Log())
+                    EXPECT_NE(0, std::count(request.soap.begin(), request.soap.end(),
+                                            std::make_pair(std::string("token"), std::string(standing))))
+                        << request.operation;
+                EXPECT_LE(5u, store->Log().size()) << "nothing was asked for the customer";
+                return one;
+            };
+            const std::string first = all("none");
+            EXPECT_EQ(ZV_WS_Status_ok, second(actor));
+            const std::string theirs = all("current");
+            EXPECT_NE(first, theirs);
+            EXPECT_NE(std::string::npos, theirs.find(store->Query("SELECT email FROM account WHERE id = 2")));
+            EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_deactivateDevice)(actor));
+            EXPECT_EQ(first, all("none"));
+        }
+    }
 }
 
 // ---- Trouble with the file
