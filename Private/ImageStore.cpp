@@ -3,7 +3,6 @@
 #include <sys/stat.h>
 
 #include "BoxArtNames.h"
-#include "CacheSweep.h"
 #include "ZVUtilities.h"
 
 ImageStore::ImageStore(SessionImpl& session, ZV_WS_BoxArtSize size, const char* prefix)
@@ -18,7 +17,7 @@ ImageStore::ImageStore(SessionImpl& session, ZV_WS_BoxArtSize size, const char* 
 bool ImageStore::FindRow()
 {
     ZV_BoxArtRow waiting;
-    if (m_Session.m_WaitingImages && m_Session.m_WaitingImages->Find(m_Prefix, m_Size, waiting)) {
+    if (KeepsFiles() && m_Session.m_Writer->Find(m_Prefix, m_Size, waiting)) {
         m_Row = {waiting.size, waiting.lastModified, waiting.needUpdate, ZVString()};
         return true;
     }
@@ -48,32 +47,15 @@ ZV_WS_Status ImageStore::BringFile(ZVString& fileName)
 ZV_WS_Status ImageStore::FetchFile(const ZVString& ifModifiedSince)
 {
     const ZV_WS_Status status = m_Downloader.DownloadToFile(m_Prefix, m_Size, ifModifiedSince, m_FileName);
-    if (status == ZV_WS_Status_ok) {
+    if (status == ZV_WS_Status_ok)
         m_Row = {m_Downloader.GetContentLength(), m_Downloader.GetLastModified(), 0, ZVString()};
-        KeepRow(m_Downloader.TakeFile());
-    }
-    if (status == ZV_WS_Status_file_not_modified_on_server) {
+    else if (status == ZV_WS_Status_file_not_modified_on_server)
         m_Row.needUpdate = 0;
-        KeepRow(nullptr);
-    }
+    else
+        return status;
+    m_Session.m_Writer->Add({m_Prefix, m_Size, m_Row.size, m_Row.lastModified, m_Row.needUpdate},
+                            m_Downloader.TakeFile());
     return status;
-}
-
-void ImageStore::KeepRow(std::unique_ptr<ImageFile> file)
-{
-    WaitingImages& images = *m_Session.m_WaitingImages;
-    images.Add({m_Prefix, m_Size, m_Row.size, m_Row.lastModified, m_Row.needUpdate}, std::move(file));
-    if (images.AreDue()) WriteWaiting(m_Session);
-}
-
-void ImageStore::WriteWaiting(const SessionImpl& session)
-{
-    WaitingImages::Claim claim(session.m_WaitingImages.get());
-    if (claim.rows().empty()) return claim.Settle();
-    bool evicted = false;
-    session.m_Cache->WriteBoxArts(claim.rows(), evicted);
-    claim.Settle();  // also what could not be written: the database will not want it later either
-    if (evicted) CacheSweep(session.m_Params.CachePath).AfterEviction();
 }
 
 bool ImageStore::ReadFile(ZVString& bytes) const

@@ -1,7 +1,7 @@
 // The one owner of a title's image in the cache: its row in the database and, for a file cache, its file beside it.
 //
 // An image of a file cache is there when its row is and its file has the row's size; everything else is fetched anew. A
-// fetched image is written as a whole file first and gets its row then, together with others (WaitingImages.h); an
+// fetched image is written as a whole file first and gets its row then, together with others (CacheWriter.h); an
 // evicted one loses the row first. So the two never disagree for longer than until the next look at them.
 //
 // A local object of one call on one thread.
@@ -23,9 +23,6 @@ public:
     /// The image's bytes, from whatever the session keeps images in, or the image host.
     ZV_WS_Status BringBytes(ZVString& bytes);
 
-    /// Writes the rows that wait into the session's cache.
-    static void WriteWaiting(const SessionImpl& session);
-
 private:
     /// An image's row in the cache.
     struct Row {
@@ -40,7 +37,6 @@ private:
     ZV_WS_Status FetchFile(const ZVString& ifModifiedSince);
     ZV_WS_Status FetchBytes(ZVString& bytes);
     bool ReadFile(ZVString& bytes) const;
-    void KeepRow(std::unique_ptr<ImageFile> file);
     void WriteRow(const ZVString& data);
 
     SessionImpl& m_Session;

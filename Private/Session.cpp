@@ -4,7 +4,6 @@
 #include "CacheMgr.h"
 #include "CacheSweep.h"
 #include "CallGuard.h"
-#include "ImageStore.h"
 #include "Records.h"
 #include "SessionImpl.h"
 #include "ZVAssert.h"
@@ -19,7 +18,6 @@ namespace {
 constexpr size_t kLongestUniqueID = 350;
 constexpr unsigned int kSmallestCacheLimit = 350 * 1024;
 constexpr mode_t kPrivateFolder = 0700;  // what is cached tells of the customer
-constexpr int kLastPatience = 200;       // milliseconds, for another process at a session's end
 
 const ZV_WS_Environment kEnvironments[] = {
     {ENVNUM_APISTG, "apistg"},
@@ -169,8 +167,7 @@ bool OpenCache(SessionImpl& session, bool mayReplace)
     }
     if (code != 0 && mayReplace && ZVFile::Exist(file) && ZVFile::Remove(file)) code = session.m_Cache->Open(param);
     if (code != 0) return false;
-    if (param.type == CacheType_File && session.Caches(ZV_WS_CacheParam::CacheData_BoxArtImage))
-        session.m_WaitingImages = WaitingImages::Of(param.path);
+    if (param.type == CacheType_File) session.m_Writer = CacheWriter::Of(param);
     return true;
 }
 
@@ -275,13 +272,6 @@ ZV_WS_Status SetText(ZV_WS_String& to, const ZVString& text)
 }
 
 }  // namespace
-
-SessionImpl::~SessionImpl()
-{
-    if (!m_Cache || !m_WaitingImages) return;
-    m_Cache->SetPatience(kLastPatience);
-    WithinMemory([&] { ImageStore::WriteWaiting(*this); });
-}
 
 ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* params)
 {

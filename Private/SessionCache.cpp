@@ -1,9 +1,5 @@
 #include "SessionCache.h"
 
-#include <algorithm>
-
-#include "CacheSweep.h"
-
 static constexpr auto kUserData = ZV_WS_CacheParam::CacheData_Userdata;
 
 SessionCache::SessionCache(SessionImpl& session)
@@ -25,9 +21,18 @@ bool SessionCache::MayUse(ZV_WS_CacheParam::CacheData kind)
 SessionCache::Stamp SessionCache::Now()
 {
     Stamp stamp;
-    stamp.account = m_Account.Generation();
+    stamp.account = m_Session.m_Params.Customer;
+    stamp.generation = m_Account.Generation();
     if (m_Cache) stamp.stored = m_Cache->Generation();
     return stamp;
+}
+
+bool SessionCache::Together(const std::function<bool()>& work)
+{
+    CacheWriter::Batch waiting(m_Session.m_Writer.get());
+    if (!m_Cache->Together([&] { return waiting.Write(*m_Cache) && work(); })) return false;
+    waiting.Settle();
+    return true;
 }
 
 // ---- Answers
@@ -36,9 +41,17 @@ bool SessionCache::Find(ZV_WS_CacheParam::CacheData kind, const char* table, con
                         Stamp& stamp)
 {
     if (!MayUse(kind)) return false;
+    CacheWriter::Answer waiting;
+    const bool waits = m_Session.m_Writer && m_Session.m_Writer->Find(kind, table, key, waiting);
     bool found = false;
     m_Cache->Look([&] {
-        found = kind == kUserData ? m_Cache->ReadUserData(table, key, text) : m_Cache->ReadMetaData(table, key, text);
+        found = waits && waiting.stamp.Holds(kind, m_Cache->Generation());
+        if (found) {
+            text = waiting.text;
+        } else {
+            found =
+                kind == kUserData ? m_Cache->ReadUserData(table, key, text) : m_Cache->ReadMetaData(table, key, text);
+        }
         if (!found) stamp = Now();
         return true;
     });
@@ -48,25 +61,18 @@ bool SessionCache::Find(ZV_WS_CacheParam::CacheData kind, const char* table, con
 void SessionCache::Keep(ZV_WS_CacheParam::CacheData kind, const char* table, const ZVString& key, const ZVString& text,
                         const Stamp& stamp)
 {
-    if (!m_Session.Caches(kind)) return;
-    KeepIf(stamp, [&] {
-        return kind == kUserData ? m_Cache->WriteUserData(table, key, text) : m_Cache->WriteMetaData(table, key, text);
-    });
-}
-
-// Images whose rows wait go with it: their flushes are the same.
-bool SessionCache::KeepIf(const Stamp& stamp, const std::function<bool()>& keep)
-{
-    if (stamp.stored == 0 || stamp.account != m_Account.Generation()) return false;
-    WaitingImages::Claim images(m_Session.m_WaitingImages.get());
-    bool evicted = false;
-    const bool kept = m_Cache->Together([&] {
-        return m_Cache->Generation() == stamp.stored && keep() &&
-               (images.rows().empty() || m_Cache->WriteBoxArts(images.rows(), evicted));
-    });
-    if (kept) images.Settle();
-    if (kept && evicted) CacheSweep(m_Session.m_Params.CachePath).AfterEviction();
-    return kept;
+    if (!m_Session.Caches(kind) || stamp.stored == 0) return;
+    CacheWriter::Answer answer;
+    answer.kind = kind;
+    answer.table = table;
+    answer.key = key;
+    answer.text = text;
+    answer.stamp = stamp;
+    if (m_Session.m_Writer) {
+        m_Session.m_Writer->Add(answer);
+    } else {
+        Together([&] { return stamp.Holds(kind, m_Cache->Generation()) && answer.Write(*m_Cache); });
+    }
 }
 
 // ---- Wish-list flags
@@ -87,39 +93,40 @@ bool SessionCache::FindFlags(const int* titleIDs, unsigned int count, bool* flag
 
 void SessionCache::KeepFlags(const ZVWS_IntVector& titleIDs, const ZVWS_BoolVector& flags, const Stamp& stamp)
 {
-    if (!m_Session.Caches(kUserData)) return;
-    KeepIf(stamp, [&] { return m_Cache->WriteWishlistFlags(titleIDs, flags); });
+    if (!m_Session.Caches(kUserData) || stamp.stored == 0) return;
+    Together(
+        [&] { return stamp.Holds(kUserData, m_Cache->Generation()) && m_Cache->WriteWishlistFlags(titleIDs, flags); });
 }
 
 // ---- Changes
 
 void SessionCache::UserDataChanged(const char* table, const std::function<bool(CacheInterface&)>& more)
 {
-    const uint64_t generation = m_Account.RaiseGeneration();
-    if (!m_Session.Caches(kUserData)) return;
-    if (m_Cache->Together([&] { return m_Cache->PurgeUserData(table) && (!more || more(*m_Cache)); }))
-        m_Account.Purged(generation);
+    uint64_t generation = 0;  // raised once, after what waits from before it was written
+    const auto raise = [&] {
+        if (generation == 0) generation = m_Account.RaiseGeneration();
+    };
+    const bool purged = m_Session.Caches(kUserData) && Together([&] {
+                            raise();
+                            return m_Cache->PurgeUserData(table) && (!more || more(*m_Cache));
+                        });
+    raise();
+    if (purged) m_Account.Purged(generation);
 }
 
 void SessionCache::AccountChanged(const ZVString& token)
 {
     const uint64_t generation = m_Account.ChangeToken(token);
-    if (m_Session.Caches(kUserData) && m_Cache->PurgeUserData("")) m_Account.PurgedAll(generation);
+    if (m_Session.Caches(kUserData) && Together([&] { return m_Cache->PurgeUserData(""); }))
+        m_Account.PurgedAll(generation);
 }
 
 void SessionCache::Refresh(const ZVString& loadTime, bool images, bool userData)
 {
     const uint64_t generation = userData ? m_Account.RaiseGeneration() : 0;
-    WaitingImages::Claim waiting(m_Session.m_WaitingImages.get());
-    bool evicted = false;
-    const bool done = m_Cache->Together([&] {
+    const bool done = Together([&] {
         return (loadTime.empty() || m_Cache->UpdateLastCacheLoadTime(loadTime)) &&
-               (!images || ((waiting.rows().empty() || m_Cache->WriteBoxArts(waiting.rows(), evicted)) &&
-                            m_Cache->SetBoxArtNeedUpdate())) &&
-               (!userData || m_Cache->PurgeUserData(""));
+               (!images || m_Cache->SetBoxArtNeedUpdate()) && (!userData || m_Cache->PurgeUserData(""));
     });
-    if (!done) return;
-    if (images) waiting.Settle();
-    if (userData) m_Account.PurgedAll(generation);
-    if (evicted) CacheSweep(m_Session.m_Params.CachePath).AfterEviction();
+    if (done && userData) m_Account.PurgedAll(generation);
 }

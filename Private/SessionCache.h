@@ -5,6 +5,9 @@
 // What could not be dropped because the database failed is not shown, and dropped when it can be. A cache that fails is
 // a miss and never fails a call. Memory exhaustion is thrown (std::bad_alloc).
 //
+// What is kept waits to be written together with others (CacheWriter.h) and is there meanwhile. A change writes it
+// first, in the same step.
+//
 // A view of the session on its thread; cheap to make.
 #pragma once
 
@@ -14,11 +17,7 @@
 
 class SessionCache {
 public:
-    /// What must still hold when an answer is to be kept.
-    struct Stamp {
-        uint64_t account = 0;     ///< Account's generation.
-        unsigned int stored = 0;  ///< The cache's; 0 is none.
-    };
+    using Stamp = CacheWriter::Stamp;
 
     explicit SessionCache(SessionImpl& session);
 
@@ -47,7 +46,8 @@ public:
 
 private:
     bool MayUse(ZV_WS_CacheParam::CacheData kind);
-    bool KeepIf(const Stamp& stamp, const std::function<bool()>& keep);
+    /// Writes what waits, and does `work` with it.
+    bool Together(const std::function<bool()>& work);
 
     SessionImpl& m_Session;
     CacheInterface* const m_Cache;

@@ -5,10 +5,10 @@
 #include <memory>
 
 #include "CacheInterface.h"
+#include "CacheWriter.h"
 #include "RealTimeBrowse.h"
 #include "SetupParams2.h"
 #include "StreamDownloadAPI.h"
-#include "WaitingImages.h"
 #include "ZVMutex.h"
 
 struct SessionImpl {
@@ -20,11 +20,9 @@ struct SessionImpl {
     StreamDownloadAPI m_Facade;
     ZV_WS_SetupParams2 m_Params;
     std::unique_ptr<CacheInterface> m_Cache;  ///< Null when nothing is cached.
-    /// Of all sessions on the file of the cache; null where no images are kept in files.
-    std::shared_ptr<WaitingImages> m_WaitingImages;
+    /// Writes for all sessions on the file of the cache; null without a file.
+    std::shared_ptr<CacheWriter> m_Writer;
     bool m_IsSetUp = false;  ///< Else no service can be asked.
-
-    ~SessionImpl();
 
     /// Whether there is a cache for that kind of data.
     bool Caches(ZV_WS_CacheParam::CacheData kind) const { return m_Cache && (m_Params.CacheData & kind) != 0; }

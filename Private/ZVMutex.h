@@ -6,17 +6,17 @@
 #include <mutex>
 
 #ifdef __clang__
-#define ZV_THREAD_ATTRIBUTE(x) __attribute__((x))
+#define ZV_THREAD_ATTRIBUTE(...) __attribute__((__VA_ARGS__))
 #else
-#define ZV_THREAD_ATTRIBUTE(x)
+#define ZV_THREAD_ATTRIBUTE(...)
 #endif
 
 /// The member is read and written only with the mutex held.
 #define ZV_GUARDED_BY(mutex) ZV_THREAD_ATTRIBUTE(guarded_by(mutex))
 /// The caller holds the mutex.
 #define ZV_REQUIRES(mutex) ZV_THREAD_ATTRIBUTE(requires_capability(mutex))
-/// The caller does not hold the mutex.
-#define ZV_EXCLUDES(mutex) ZV_THREAD_ATTRIBUTE(locks_excluded(mutex))
+/// The caller holds none of the mutexes.
+#define ZV_EXCLUDES(...) ZV_THREAD_ATTRIBUTE(locks_excluded(__VA_ARGS__))
 
 class ZV_THREAD_ATTRIBUTE(capability("mutex")) ZVMutex {
 public:

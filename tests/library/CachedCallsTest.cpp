@@ -289,7 +289,7 @@ TEST_F(BoxArt, OldImagesMakeRoom)
     size_t bytes = 0;
     for (const auto& entry : fs::directory_iterator(folder))
         bytes += entry.file_size();
-    EXPECT_LT(bytes, limit + 50000);
+    EXPECT_LT(bytes, limit + 100000);
 }
 
 TEST_F(BoxArt, PrefixesThatLeaveTheFolderAreRefused)

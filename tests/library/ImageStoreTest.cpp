@@ -11,7 +11,7 @@
 #include <set>
 
 #include "CacheFile.h"
-#include "ImageStore.h"
+#include "SessionImpl.h"
 #include "Store.h"
 #include "TempFolder.h"
 
@@ -49,7 +49,7 @@ protected:
     }
 
     std::string Database() const { return session._pSessionImpl->m_Params.CachePath.c_str(); }
-    void WriteRows() const { ImageStore::WriteWaiting(*session._pSessionImpl); }
+    void WriteRows() const { session._pSessionImpl->m_Writer->Flush(); }
 
     std::set<std::string> Files(const std::string& extension = ".jpg") const
     {
@@ -62,6 +62,7 @@ protected:
 
     void SetUp() override
     {
+        CacheWriter::SetPatience(3600000);  // rows are written when the test says so
         Store::SetUp();
         fs::create_directory(folder);
     }
@@ -135,28 +136,6 @@ TEST_F(Images, FilesWithoutARowDoNotPileUp)
     const int rows = atoi(CacheFile(Database()).Query("SELECT COUNT(*) FROM BoxArt").c_str());
     EXPECT_GT(rows, 5);
     EXPECT_LE(Files().size(), static_cast<size_t>(rows));
-}
-
-// Rows wait for others; what another session of the process has fetched is there all the same, and nothing is lost with
-// a session.
-TEST_F(Images, RowsThatWaitAreThereForAllSessions)
-{
-    ASSERT_EQ(ZV_WS_Status_ok, Begin());
-    ZV_WS_Session copy;
-    ASSERT_EQ(ZV_WS_Status_ok, ZV_WS_duplicate(&copy, &session));
-    EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getBoxArtImage, BOX_ART_SIZE_135S, "ZV00012")(&copy));
-    EXPECT_EQ("0 ", CacheFile(Database()).Query("SELECT COUNT(*) FROM BoxArt"));
-    EXPECT_EQ(folder + "/ZV00012135.jpg", Bring("ZV00012"));
-    EXPECT_EQ(1u, store->Log().size());
-    ZV_WS_release(&copy);
-    EXPECT_EQ("ZV00012 ", CacheFile(Database()).Query("SELECT Prefix FROM BoxArt"));
-    for (int title = 20; title < 28; ++title)
-        Bring("ZV000" + std::to_string(title));
-    EXPECT_EQ("9 ", CacheFile(Database()).Query("SELECT COUNT(*) FROM BoxArt")) << "eight of them are enough";
-    Bring("ZV00030");
-    EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_clearLocalCache(folder.c_str()));
-    ASSERT_EQ(ZV_WS_Status_ok, Begin());
-    EXPECT_EQ("0 ", CacheFile(Database()).Query("SELECT COUNT(*) FROM BoxArt")) << "a row for a file that was cleared";
 }
 
 TEST_F(Images, OpeningSweepsTheFolder)

@@ -190,6 +190,7 @@ TEST_F(Stale, WhatCannotBePurgedIsNotShown)
     ASSERT_NO_FATAL_FAILURE(Begin(true));
     const std::string file = session._pSessionImpl->m_Params.CachePath.c_str();
     EXPECT_EQ(3, WishlistItems(&session));
+    session._pSessionImpl->m_Writer->Flush();
     CacheFile(file).Run(
         "CREATE TRIGGER refuse BEFORE DELETE ON Userdata BEGIN SELECT RAISE(ABORT, 'the disk is full'); END");
     EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_addItemToWishlist, kTitle)(&session));

@@ -17,7 +17,6 @@
 
 #include "CacheFile.h"
 #include "Calls.h"
-#include "ImageStore.h"
 #include "Peer.h"
 #include "Records.h"
 #include "SettingsFolder.h"
@@ -233,11 +232,13 @@ class Torture : public Store {
 protected:
     void Begin(unsigned int data)
     {
+        CacheWriter::SetPatience(3600000);  // on this thread alone something fails
         folder = store->DataFolder() + "/cache";
         ZV_WS_SetupParams setup = Setup();
         if (data) setup.CacheParam = {CacheType_File, data, 0, folder.c_str()};
         ASSERT_EQ(ZV_WS_Status_ok, Initialize(setup));
         ASSERT_EQ(ZV_WS_Status_ok, Titles(1));
+        if (data) session._pSessionImpl->m_Writer->Flush();
         first = Take();
         ASSERT_NE(std::string::npos, first.find("TitleListing2:")) << first;
         store->ClearLog();
@@ -412,7 +413,11 @@ TEST_F(Torture, AnAnswerThatTheDiskHasNoRoomFor)
     unsigned int number = 1;
     AtEachWrite([&](long n, bool all) {
         ++number;
-        EXPECT_EQ(ZV_WS_Status_ok, Failing(t_Disk, n, all, [&] { return Titles(number); }));
+        EXPECT_EQ(ZV_WS_Status_ok, Failing(t_Disk, n, all, [&] {
+                      const ZV_WS_Status status = Titles(number);
+                      session._pSessionImpl->m_Writer->Flush();
+                      return status;
+                  }));
         const std::string answer = Take();
         store->ClearLog();
         EXPECT_EQ(ZV_WS_Status_ok, Titles(1));
@@ -444,7 +449,7 @@ protected:
     {
         Owned<ZV_WS_String> place;
         const ZV_WS_Status status = ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_321, prefix, &place);
-        ImageStore::WriteWaiting(*session._pSessionImpl);
+        session._pSessionImpl->m_Writer->Flush();
         return status;
     }
 

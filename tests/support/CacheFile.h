@@ -8,7 +8,11 @@
 
 class CacheFile {
 public:
-    explicit CacheFile(const std::string& path) { EXPECT_EQ(SQLITE_OK, sqlite3_open(path.c_str(), &m_DB)); }
+    explicit CacheFile(const std::string& path)
+    {
+        EXPECT_EQ(SQLITE_OK, sqlite3_open(path.c_str(), &m_DB));
+        sqlite3_busy_timeout(m_DB, 60000);
+    }
     ~CacheFile() { sqlite3_close(m_DB); }
     CacheFile(const CacheFile&) = delete;
     CacheFile& operator=(const CacheFile&) = delete;
