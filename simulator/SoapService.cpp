@@ -99,7 +99,7 @@ const ServiceRow* SoapService::Find(const std::string& path)
 std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& fault)
 {
     XmlWriter xml;
-    Call call{m_Database, checked.arguments, xml, checked.operation->refusal, m_PlainAddress};
+    Call call{m_Database, checked.arguments, xml, checked.operation->refusal, m_PlainAddress, m_LargestPage};
     const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
     if (ClaimsFailure(fault)) {
         m_Database.Run("SAVEPOINT request");
@@ -111,7 +111,7 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
     }
     if (!fault.Is("code") || checked.operation->bare) return xml.Text();
     XmlWriter refusal;
-    Call refused{m_Database, checked.arguments, refusal, checked.operation->refusal, m_PlainAddress};
+    Call refused{m_Database, checked.arguments, refusal, checked.operation->refusal, m_PlainAddress, m_LargestPage};
     refused.Refuse(fault.Number(1), "refused as asked");
     return refusal.Text();
 }

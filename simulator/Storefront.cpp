@@ -233,7 +233,8 @@ bool Simulator::Begin(std::string& error)
     if (!m_Database) return false;
     xmlInitParser();
     FillCatalogue(*m_Database);
-    m_Soap = std::make_unique<SoapService>(*m_Database, "localhost:" + std::to_string(m_HttpPort));
+    m_Soap =
+        std::make_unique<SoapService>(*m_Database, "localhost:" + std::to_string(m_HttpPort), m_Options.largestPage);
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.oldTls);
     if (!WriteFiles(error)) return false;
     const std::lock_guard<std::mutex> lock(m_Mutex);
