@@ -13,6 +13,13 @@
 // is called, once. The status is a ZV_WS_Status; the result is built also when it is a failure. "init" on an instance
 // that is initialised returns kStarted, too, and does nothing: no "onComplete" follows.
 //
+// Their parameters are properties of the parameter object, each read once. One that is missing, undefined or null is 0,
+// "" or false. Numbers become integers as the script's own bit operations make them. "useprepaidfund" is false for
+// false, 0, NaN and the texts "", "0" and "false", else true; an object counts as what its valueOf returns, or as its
+// text. "titleids" has to be an Array, of at most 10000 elements. A property that cannot be read refuses the call with
+// kWrongArguments, and nothing is sent: its getter throws, its value or an element cannot be converted (valueOf or
+// toString throws, a symbol), the length of an Array is none.
+//
 // Methods that answer at once, with arguments of their own:
 //   clone(instance)             a session like that of another instance; ReturnCode
 //   idle()                      0; updates go on until the next result or "quitFlash"
@@ -29,7 +36,8 @@
 //   setLogAreaIDsAndTargetConfig({LogAreaIDs, LogTarget, SettingsFile, PreferenceFile})
 //                               bits of areas and target, as numbers or texts in any base of C; the log file stands
 //                               beside the first file given with a folder. ZV_LOG ("areas,target,folder")
-//                               in the environment overrides. 0; 1 no target, 2 file cannot be opened, -3 no object
+//                               in the environment overrides. 0; 1 no target, 2 file cannot be opened, -3 no object,
+//                               or a property that cannot be read: the log stays as it is
 //   trace(value)                prints the value's text
 #pragma once
 
@@ -107,7 +115,8 @@ public:
         kStarted = 0,              ///< The worker runs ("clone": the instance is ready).
         kNotInitialized = -1,      ///< "init" has not succeeded.
         kBusy = -2,                ///< A call of this instance has not been delivered yet; it goes on undisturbed.
-        kWrongArguments = -3,      ///< Not one Array of two objects ("clone": not another, initialised instance).
+        kWrongArguments = -3,      ///< Not one Array of two objects ("clone": not another, initialised instance), or a
+                                   ///< property that cannot be read.
         kAlreadyInitialized = -4,  ///< "clone" only.
         kDuplicateFailed = -5,     ///< "clone" only: no session of its own, also because the other instance is busy.
     };

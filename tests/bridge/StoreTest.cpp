@@ -62,6 +62,102 @@ ready(function next() {
     EXPECT_EQ(requests, Requests());
 }
 
+// ---- Properties that cannot be read
+
+// Every method with properties, in the order in which they are read. What stands before a name tells what it is read
+// as: # a number, $ a text, ? a boolean, @ an array of numbers.
+const char kProperties[] = R"(var methods = {
+    init: '$APIKey $UserName $Password #DestinationTypeID $AuthToken $DestinationUniqueID $ServiceBaseURL #Type ' +
+        '#CacheType #CacheData $CachePath #CacheLimit $ProxyHost $ProxyUserName #ProxyPort $ProxyPassword #AccessType ' +
+        '$ApplicationRevision #EnvNum $firmwareVersion $modelNumber',
+    getTitles: '#genreid #CurrentPageNumber #ItemsPerPage #purchasetype',
+    getTitleListing: '#titleid',
+    searchForTitle: '#CurrentPageNumber #ItemsPerPage #purchasetype #typefilter $query',
+    getRecommendedTitles: '#titleid', translateSkuID: '#skuid', getTvEpisodeListing: '#episodeid',
+    getTvEpisodeListByTitleID: '#titleid', getAllTvEpisodeListings: '#titleid', authorizeDevice: '$pin',
+    getBoxArtImage: '#boxartsize $boxartprefix',
+    getMyVideos: '#CurrentPageNumber #ItemsPerPage #purchasetype #typefilter #watchstatus',
+    getWishlistItems: '#sortorder #CurrentPageNumber #ItemsPerPage #typefilter',
+    addItemToWishlist: '#titleid', removeItemFromWishlist: '#titleid', checkTitleInWishlist: '#titleid',
+    checkTitlesInWishlist: '@titleids #typefilter',
+    doPurchaseSavedBilling: '#skuid $ipaddress ?useprepaidfund',
+    checkForPurchasedTitle: '#titleid', checkForPurchasedSku: '#skuid', checkAdultVerificationPin: '#pin',
+    assignGiftCertificateToUser: '$giftcertificatecode', checkRentalExpiration: '#passid',
+    getStreamingAssetLocation: '#passid #fileprofile', getStreamingBonusAssetLocation: '#bonusassetid',
+    loadLastStreamingAssetLocation: '#passid #fileprofile',
+    manageStreamingInstanceStatus: '$streamid #streamstatus #stoptimeSeconds',
+    getTHXMediaDirector: '#passid #fileprofile #audioprofile',
+    getTHXMediaDirectorBonusAsset: '#bonusassetid #fileprofile #bonusassettype',
+    updateLocalCache: '#operations', calcOrderTax: '#skuid', setAudioDefaultProperty: '#audioprofile'};
+function fail() { throw new Error('on purpose'); }
+function withLength(get) {
+    return new Proxy([1], {get: function (array, name) { return name === 'length' ? get() : array[name]; }}); }
+function withItem(item) { return [1, item, 3]; }
+var toPrimitive = {}; toPrimitive[Symbol.toPrimitive] = fail;
+// Values that are no text, and so no number either; values that are no number; arrays of those.
+var noTexts = [{toString: fail}, toPrimitive, Symbol('s'), Object.create(null), {toString: function () { return {}; }}];
+var noNumbers = noTexts.concat([{valueOf: fail}]);
+var noArrays = noNumbers.map(withItem).concat([withLength(fail), withLength(function () { return {valueOf: fail}; }),
+    Object.defineProperty([1, 2, 3], 1, {get: fail}), 7, undefined, {length: 1, 0: 1}]);
+var bad = {'#': noNumbers, '?': noNumbers, '$': noTexts, '@': noArrays};
+)";
+
+TEST_F(Movies, APropertyThatCannotBeReadRefusesTheCall)
+{
+    EXPECT_EQ("done\n0\n", Report(kProperties + std::string(R"(
+function refuse(object, method, name, property, what) {
+    var code = object[method]([{}, Object.defineProperty({titleids: [1]}, name, property)]);
+    if (code !== -3) report(method + ' took ' + name + ' ' + what + ': ' + code);
+}
+ready(function () {
+    for (var method in methods) {
+        var object = method === 'init' ? new com.orvex.ZVWSLib() : ws;
+        methods[method].split(' ').forEach(function (property) {
+            var name = property.substr(1);
+            refuse(object, method, name, {get: fail}, 'of a getter');
+            bad[property[0]].forEach(function (value, at) { refuse(object, method, name, {value: value}, at); }); });
+    }
+    report('done');
+    call(ws, 'getCountryID', {}, function (status) { report(status); }); });)")));
+    EXPECT_EQ((std::vector<std::string>{"discovery(d=device,dt=48)", "GetCountryID()"}), Requests());
+}
+
+// Nothing is given, which is not the same.
+TEST_F(Movies, PropertiesAreReadInOrderAndOnce)
+{
+    EXPECT_EQ("", Report(kProperties + std::string(R"(
+ready(function () {
+    var names = Object.keys(methods);
+    (function next() {
+        var read = [], method = names.shift();
+        if (!method) return;
+        function watched(target) {
+            return new Proxy(target, {get: function (target, name) { read.push(name); return target[name]; }}); }
+        var ids = watched([7, {valueOf: function () { read.push('valueOf'); return 19; }}]);
+        call(method === 'init' ? new com.orvex.ZVWSLib() : ws, method,
+            watched(method === 'checkTitlesInWishlist' ? {titleids: ids} : {}), next);
+        var expected = methods[method].replace(/[#$?@]/g, '').replace('titleids', 'titleids length 0 1 valueOf');
+        if (read.join(' ') !== expected) report(method + ' read ' + read.join(' '));
+    })(); });)")));
+}
+
+TEST_F(Movies, PrepaidMoneyIsUsedWhenTheScriptSaysSo)
+{
+    EXPECT_EQ("", Report(R"(
+var values = [false, 0, -0, NaN, '', '0', 'false', undefined, null, new Boolean(false), new Number(0), new String('0'), [],
+              true, 1, -0.5, Infinity, '1', 'true', 'no', ' ', 'False', new Boolean(true), new Number(2), {}, new Date(1)];
+ready(function next() {
+    if (values.length === 0) return;
+    call(ws, 'doPurchaseSavedBilling', {skuid: 9001, ipaddress: '', useprepaidfund: values.shift()}, next); });)"));
+    std::string answers;
+    for (const LoggedRequest& request : store->Log()) {
+        for (const auto& child : request.children) {
+            if (child.first == "UsePrePaidFunds") answers += child.second + " ";
+        }
+    }
+    EXPECT_EQ("no no no no no no no no no no no no no yes yes yes yes yes yes yes yes yes yes yes yes yes ", answers);
+}
+
 TEST_F(Movies, TitleIdsMustBeAnArray)
 {
     EXPECT_EQ("-3\n-3\n-3\n-3\n0 []\ntrue,false,true\n",

@@ -175,7 +175,9 @@ struct Param_init : Param_base {
     }
 };
 
-/// Reads properties of a script object into fields of any type that occurs in a record. Main thread.
+/// Reads properties of a script object into fields of any type that occurs in a record. Main thread. Properties that
+/// are missing, undefined or null read as 0, "" and false. One that cannot be read (its getter throws, or the
+/// conversion of its value) is a failure; those after it are read all the same.
 class PropertyReader {
 public:
     explicit PropertyReader(ae::stagecraft::ASObject& object) : m_Object(object) {}
@@ -184,11 +186,14 @@ public:
     template <class Number>
     void operator()(const char* name, Number& field)
     {
-        field = static_cast<Number>(m_Object.GetInt(name));
+        int32_t number;
+        Require(m_Object.GetInt(name, number));
+        field = static_cast<Number>(number);
     }
-    void operator()(const char* name, bool& field) { field = m_Object.GetBoolean(name); }
-    void operator()(const char* name, AEString& field) { field = m_Object.GetText(name); }
-    void operator()(const char* name, AEArray<int>& field);
+    void operator()(const char* name, bool& field) { Require(m_Object.GetBoolean(name, field)); }
+    void operator()(const char* name, AEString& field) { Require(m_Object.GetText(name, field)); }
+    /// Must be there, and be an Array of at most 10000 elements, all of which can be read.
+    void operator()(const char* name, AEArray<int>& field) { Require(ReadArray(name, field)); }
 
     /// Two properties, whatever the field is called.
     void operator()(const char* /*name*/, ZV_WS_Pagination& page)
@@ -197,10 +202,13 @@ public:
         (*this)("ItemsPerPage", page.ItemsPerPage);
     }
 
-    /// false when a property cannot be taken at all: an array of integers that is none or endless.
+    /// Whether all properties could be read.
     bool Succeeded() const { return m_Succeeded; }
 
 private:
+    void Require(bool succeeded) { m_Succeeded = m_Succeeded && succeeded; }
+    bool ReadArray(const char* name, AEArray<int>& field);
+
     ae::stagecraft::ASObject& m_Object;
     bool m_Succeeded = true;
 };

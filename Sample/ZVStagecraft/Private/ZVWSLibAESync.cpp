@@ -207,12 +207,23 @@ int InitLogsAs(ZVString given)
 }
 
 // What the movie asks for. The log file stands beside the settings.
-int InitLogs(ASObject& settings)
+struct LogSettings {
+    AEString LogAreaIDs;
+    AEString LogTarget;
+    AEString SettingsFile;
+    AEString PreferenceFile;
+    ZVWS_PROPERTIES(LogAreaIDs, LogTarget, SettingsFile, PreferenceFile)
+};
+
+int InitLogs(ASObject& object)
 {
-    const unsigned int areas = NumberOf(settings.GetText("LogAreaIDs").c_str());
-    const auto target = static_cast<unsigned char>(NumberOf(settings.GetText("LogTarget").c_str()));
-    for (const char* property : {"SettingsFile", "PreferenceFile"}) {
-        const AEString path = settings.GetText(property);
+    LogSettings settings;
+    PropertyReader reader(object);
+    settings.ReadWith(reader);
+    if (!reader.Succeeded()) return ZVWSLibAE::kWrongArguments;
+    const unsigned int areas = NumberOf(settings.LogAreaIDs.c_str());
+    const auto target = static_cast<unsigned char>(NumberOf(settings.LogTarget.c_str()));
+    for (const AEString& path : {settings.SettingsFile, settings.PreferenceFile}) {
         if (!strchr(path.c_str(), ZVFile::PATH_SEPERATOR)) continue;
         return ZVWSAELog::InitWSLogs(areas, target, ZVFile::GetFolderName(path.c_str()).c_str());
     }
