@@ -17,8 +17,8 @@
 // "" or false. Numbers become integers as the script's own bit operations make them. "useprepaidfund" is false for
 // false, 0, NaN and the texts "", "0" and "false", else true; an object counts as what its valueOf returns, or as its
 // text. "titleids" has to be an Array, of at most 10000 elements. A property that cannot be read refuses the call with
-// kWrongArguments, and nothing is sent: its getter throws, its value or an element cannot be converted (valueOf or
-// toString throws, a symbol), the length of an Array is none.
+// kWrongArguments, and nothing is sent: its getter throws, or its value or an element of it cannot be converted
+// (valueOf or toString throws, a symbol).
 //
 // Methods that answer at once, with arguments of their own:
 //   clone(instance)             a session like that of another instance; ReturnCode
@@ -26,9 +26,8 @@
 //   quitFlash()                 0; ends the movie
 //   getUserAgent()              text, empty before "init"
 //   getDeviceEnv()              environment number, -1 before "init"
-//   getAvailableEnvLists()      Array of {endpoint, envNum}, with isDefault where the service says so: blocks while it
-//   is
-//                               asked, and does not ask before "init" or while a worker runs
+//   getAvailableEnvLists()      Array of {endpoint, envNum}, with isDefault where the service says so: blocks while
+//                               it is asked, and does not ask before "init" or while a worker runs
 //   getSysInfo(value)           the value's text
 //   fileExist(path)             boolean
 //   clearLocalCache(folder)     ZV_WS_Status
@@ -139,9 +138,11 @@ public:
     void OnUpdate(ae::stagecraft::StageWindow* window, ae::stagecraft::ASObject& object) override;
 
     /// The instance's insides, for its handlers and workers.
-    struct State;
+    class ForegroundCall;
+    class Prefetcher;
     class PrefetchMgr;
-    State& GetState() { return *m_State; }
+    ForegroundCall& GetCall() { return *m_Call; }
+    Prefetcher& GetPrefetcher() { return *m_Prefetcher; }
 
 private:
 #define ZVWSLIBAE_DECLARE(name)                                                      \
@@ -150,5 +151,7 @@ private:
     ZVWSLIBAE_METHODS(ZVWSLIBAE_DECLARE, ZVWSLIBAE_DECLARE)
 #undef ZVWSLIBAE_DECLARE
 
-    std::unique_ptr<State> m_State;
+    // The call's worker may use the prefetcher: the call goes first.
+    std::unique_ptr<Prefetcher> m_Prefetcher;
+    std::unique_ptr<ForegroundCall> m_Call;
 };

@@ -1,8 +1,7 @@
 // Fetching ahead, seen from the store: which pages are asked for after one was shown, in which order, and when not.
 #include <filesystem>
-#include <fstream>
-#include <thread>
 
+#include "CacheFile.h"
 #include "StoreMovie.h"
 
 namespace {
@@ -13,48 +12,55 @@ protected:
     // the store has seen `requests` of them.
     std::string Run(int data, size_t requests, const std::string& script)
     {
-        const std::string go = store->DataFolder() + "/go", cache = store->DataFolder() + "/cache";
-        std::filesystem::remove(go);
-        std::filesystem::remove_all(cache);
+        std::filesystem::remove_all(Cache());
         store->ClearLog();
-        std::thread opener([&] {
-            if (store->WaitForRequests(requests)) std::ofstream(go) << "go";
-        });
-        const std::string report = Report("var perPage, go = '" + go +
-                                          "';setup.EnvNum = 2; setup.CacheType = 2; setup.CachePath = '" + cache +
-                                          "'; setup.CacheData = " + std::to_string(data) + R"(;
+        const std::string report =
+            Report("var perPage; setup.EnvNum = 2; setup.CacheType = 2; setup.CachePath = '" + Cache() +
+                   "'; setup.CacheLimit = 358400; setup.CacheData = " + std::to_string(data) +
+                   "; function until(then) { when('all', " + std::to_string(requests) + R"(, then); }
 function ask(method, parameters, then) {
     call(ws, method, parameters, function (status, result) {
         if (status !== 0) report(method + ' ' + status);
         then(result);
     });
 }
-function until(then) {
-    var timer = setInterval(function () {
-        if (!ws.fileExist(go)) return;
-        clearInterval(timer);
-        then();
-    }, 10);
-}
 function titles(page, then) {
     ask('getTitles', {genreid: 100, CurrentPageNumber: page, ItemsPerPage: perPage, purchasetype: 2}, then);
 }
-ready(function () {)" + script + "});");
+ready(function () {)" +
+                   script + "});");
         store->ClearFaults();
-        opener.join();
         return report;
     }
 
-    // The pages asked for, in order.
-    std::vector<std::string> Pages(const std::string& operation) const
+    std::string AnswerTo(const std::string& question) override
     {
-        std::vector<std::string> pages;
+        if (question == "load a catalogue") return store->Query("UPDATE account SET load_time = load_time || '0'");
+        if (question == "all") return std::to_string(store->Log().size());
+        if (question != "lose all pages") return StoreMovie::AnswerTo(question);
+        for (const auto& entry : std::filesystem::directory_iterator(Cache())) {
+            if (entry.path().extension() == ".zv")
+                CacheFile(entry.path()).Run("PRAGMA busy_timeout = 10000; DELETE FROM Service");
+        }
+        return "";
+    }
+
+    std::string Cache() const { return store->DataFolder() + "/cache/"; }
+
+    // The values of a child in the requests of an operation, in order.
+    std::vector<std::string> Children(const std::string& operation, const std::string& name) const
+    {
+        std::vector<std::string> values;
         for (const LoggedRequest& request : store->Log()) {
             for (const auto& child : request.children) {
-                if (request.operation == operation && child.first == "CurrentPageNumber") pages.push_back(child.second);
+                if (request.operation == operation && child.first == name) values.push_back(child.second);
             }
         }
-        return pages;
+        return values;
+    }
+    std::vector<std::string> Pages(const std::string& operation) const
+    {
+        return Children(operation, "CurrentPageNumber");
     }
 
     // So many items on a page that genre 100 has that many pages.
@@ -137,17 +143,21 @@ TEST_F(Prefetch, BoxArtComesWhileTheScriptIsIdle)
     const std::string season =
         store->Query("SELECT season FROM title WHERE season > 0 GROUP BY season ORDER BY season LIMIT 1");
     const int episodes = Number("SELECT COUNT(*) FROM title WHERE season = " + season);
-    // Load time, listings, and the images of all episodes but the first.
-    EXPECT_EQ(
-        "", Run(3, static_cast<size_t>(2 + episodes - 1),
-                "ask('getAllTvEpisodeListings', {titleid: " + season + "}, function () { ws.idle(); until(quit); });"));
-    std::string prefixes;
-    for (const LoggedRequest& request : store->Log()) {
-        if (request.service == "boxart") prefixes += request.operation + " ";
+    // What is dropped from the cache does not take with it what waits.
+    for (const char* between :
+         {"(function (then) { then(); })", "ask.bind(null, 'updateLocalCache', {operations: 4})"}) {
+        // Load time, listings, and the images of all episodes but the first.
+        EXPECT_EQ("", Run(7, static_cast<size_t>(2 + episodes - 1),
+                          "ask('getAllTvEpisodeListings', {titleid: " + season + "}, function () { " + between +
+                              "(function () { ws.idle(); until(quit); }); });"));
+        std::string prefixes;
+        for (const LoggedRequest& request : store->Log()) {
+            if (request.service == "boxart") prefixes += request.operation + " ";
+        }
+        EXPECT_EQ(store->Query("SELECT group_concat(prefix || ' ', '') FROM (SELECT prefix FROM title WHERE season = " +
+                               season + " ORDER BY episode LIMIT -1 OFFSET 1)"),
+                  prefixes);
     }
-    EXPECT_EQ(store->Query("SELECT group_concat(prefix || ' ', '') FROM (SELECT prefix FROM title WHERE season = " +
-                           season + " ORDER BY episode LIMIT -1 OFFSET 1)"),
-              prefixes);
 }
 
 // A page that nobody waits for may hang: the customer's own call does not.
@@ -162,6 +172,67 @@ TEST_F(Prefetch, AForegroundCallWins)
                           "var asked = new Date().getTime();"
                           "ask('getTitleListing', {titleid: 12}, function () {"
                           "report(new Date().getTime() - asked < 1000 ? 'answered' : 'late'); quit(); }); }); });"));
+}
+
+// ---- What a page is known by
+
+// A listing as a script asks for it, all but the page, of which a store that gives one item on a page has some.
+struct Listed {
+    const char* method;
+    const char* parameters;
+    const char* operation;
+    std::vector<std::string> pages;  // page 2, shown first, and what is then fetched ahead
+};
+
+class CappedPrefetch : public Prefetch {
+protected:
+    void SetUp() override
+    {
+        StorefrontOptions options;
+        options.largestPage = 1;
+        Open(options);
+    }
+
+    // The script shows pages with show(page, perPage, then).
+    std::string RunOn(const Listed& listed, const std::string& script)
+    {
+        return Run(7, 0,
+                   std::string("function show(page, perPage, then) { ask('") + listed.method + "', {" +
+                       listed.parameters + ", CurrentPageNumber: page, ItemsPerPage: perPage}, then); }" +
+                       "function asked(count, then) { when('" + listed.operation + "', count, then); }" + script);
+    }
+
+    const Listed m_Titles = {
+        "getTitles", "genreid: 8010, purchasetype: 2", "getTitlesByNavigation", {"2", "3", "1", "4", "5"}};
+    const Listed m_Videos = {
+        "getMyVideos", "purchasetype: 2, typefilter: 0, watchstatus: 3", "getMyStreamingVideos", {"2", "3", "1"}};
+    const Listed m_Wishes = {"getWishlistItems", "sortorder: 1, typefilter: 0", "getWishlistItems", {"2", "3", "1"}};
+};
+
+// The store gives less on a page than it is asked for. All the same a page is fetched ahead as the script will ask for
+// it, and each is asked for once.
+TEST_F(CappedPrefetch, PagesAreKnownByTheirRequests)
+{
+    for (const Listed& listed : {m_Titles, m_Videos, m_Wishes}) {
+        EXPECT_EQ("1 on 2\n1 on 3\n1 on 1\n", RunOn(listed, "var count = " + std::to_string(listed.pages.size()) + R"(;
+function tell(page) { report(page.ItemsPerPage + ' on ' + page.CurrentPageNumber); }
+show(2, 50, function (page) { tell(page); asked(count, function () {
+    show(3, 50, function (page) { tell(page);
+        show(1, 50, function (page) { tell(page); quit(); }); }); }); });)"));
+        EXPECT_EQ(listed.pages, Pages(listed.operation));
+        EXPECT_EQ(Strings(listed.pages.size(), "50"), Children(listed.operation, "ItemsPerPage"));
+    }
+}
+
+// Sizes that the store makes equal are different requests: pages of one are not there for the other. Box art is fetched
+// when no page is any more.
+TEST_F(CappedPrefetch, AnotherPageSizeIsAnotherListing)
+{
+    EXPECT_EQ("", RunOn(m_Videos, R"(
+show(2, 50, function () { ws.idle(); when('boxart', 1, function () {
+    show(2, 40, function () { asked(6, quit); }); }); });)"));
+    EXPECT_EQ((Strings{"2", "3", "1", "2", "3", "1"}), Pages(m_Videos.operation));
+    EXPECT_EQ((Strings{"50", "50", "50", "40", "40", "40"}), Children(m_Videos.operation, "ItemsPerPage"));
 }
 
 }  // namespace

@@ -6,6 +6,7 @@
 #pragma once
 
 #include <tuple>
+#include <type_traits>
 
 #include "ZVWSLib.h"
 #include "ZV_WS_Records.h"
@@ -139,6 +140,10 @@ struct Param_One : Param_base {
 using Param_OneInteger = Param_One<int>;
 using Param_OneText = Param_One<AEString>;
 
+struct Param_getAllTvEpisodeListings : Param_OneInteger {
+    Param_getAllTvEpisodeListings() : Param_OneInteger("titleid") {}
+};
+
 /// Some properties are called otherwise than the fields they set.
 struct Param_init : Param_base {
     AEString APIKey;
@@ -174,6 +179,47 @@ struct Param_init : Param_base {
         read("modelNumber", ModelCode);
     }
 };
+
+// ---- A record's fields as arguments of a library call. Worker thread.
+
+namespace ZVWSLib {
+
+template <class Field>
+std::tuple<Field> Pass(const Field& field)
+{
+    return std::make_tuple(field);
+}
+inline std::tuple<const char*> Pass(const AEString& text)
+{
+    return std::make_tuple(text.c_str());
+}
+inline std::tuple<const ZV_WS_Pagination*> Pass(const ZV_WS_Pagination& page)
+{
+    return std::make_tuple(&page);
+}
+inline std::tuple<const int*, unsigned int> Pass(const AEArray<int>& numbers)
+{
+    return std::make_tuple(numbers.begin(), static_cast<unsigned int>(numbers.size()));
+}
+
+/// What a library call puts out: its last parameter points to one.
+template <class... Parameters>
+using OutputOf = std::remove_pointer_t<std::tuple_element_t<sizeof...(Parameters) - 1, std::tuple<Parameters...>>>;
+
+/// Calls the library with the record's fields.
+template <class Param, class... Parameters>
+ZV_WS_Status CallLibrary(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), ZV_WS_Session& session,
+                         const Param& param, OutputOf<Parameters...>& output)
+{
+    const auto with = [&](const auto&... fields) {
+        return std::apply(call, std::tuple_cat(std::make_tuple(&session), Pass(fields)..., std::make_tuple(&output)));
+    };
+    return std::apply(with, param.Arguments());
+}
+
+}  // namespace ZVWSLib
+
+// ---- Reading them
 
 /// Reads properties of a script object into fields of any type that occurs in a record. Main thread. Properties that
 /// are missing, undefined or null read as 0, "" and false. One that cannot be read (its getter throws, or the
