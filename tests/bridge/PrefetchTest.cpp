@@ -3,6 +3,9 @@
 
 #include "CacheFile.h"
 #include "StoreMovie.h"
+#include "TempFolder.h"
+#include "ZVWSLibAEPrefetchMgr.h"
+#include "stagecraft/IStagecraft.h"
 
 namespace {
 
@@ -233,6 +236,106 @@ show(2, 50, function () { ws.idle(); when('boxart', 1, function () {
     show(2, 40, function () { asked(6, quit); }); }); });)"));
     EXPECT_EQ((Strings{"2", "3", "1", "2", "3", "1"}), Pages(m_Videos.operation));
     EXPECT_EQ((Strings{"50", "50", "50", "40", "40", "40"}), Children(m_Videos.operation, "ItemsPerPage"));
+}
+
+// ---- What was dropped from the cache is not there
+
+// Each change leaves the listing as it is: only that the cache lost it tells that it has to be fetched ahead again.
+TEST_F(Prefetch, MarksAreForgottenWithWhatTheyDescribe)
+{
+    const char kTitles[] = "'getTitles', {genreid: 8010, purchasetype: 2";
+    const char kVideos[] = "'getMyVideos', {purchasetype: 0, typefilter: 0, watchstatus: 3";
+    const char kWishes[] = "'getWishlistItems', {sortorder: 1, typefilter: 2";
+    const struct {
+        const char* listing;
+        const char* operation;
+        Strings pages;
+        const char* drop;  // goes on with next()
+    } rows[] = {
+        {kVideos, "getMyStreamingVideos", {"1", "2"}, "ask('updateLocalCache', {operations: 4}, next);"},
+        {kVideos,
+         "getMyStreamingVideos",
+         {"1", "2"},
+         "ask('doPurchaseSavedBilling', {skuid: 121, ipaddress: '10.0.0.1'}, next);"},
+        {kWishes, "getWishlistItems", {"1", "2", "3"}, "ask('addItemToWishlist', {titleid: 2401}, next);"},
+        {kWishes, "getWishlistItems", {"1", "2", "3"}, "ask('removeItemFromWishlist', {titleid: 2401}, next);"},
+        {kTitles,
+         "getTitlesByNavigation",
+         {"1", "2", "5", "3", "4"},
+         "answer('load a catalogue'); ask('updateLocalCache', {operations: 1}, next);"},
+        {kTitles,
+         "getTitlesByNavigation",
+         {"1", "2", "5", "3", "4"},
+         "if (ws.clearLocalCache(setup.CachePath) !== 0) report('not cleared'); next();"},
+        // Large answers, until the table is over its share.
+        {kTitles, "getTitlesByNavigation", {"1", "2", "5", "3", "4"}, R"(var filled = 0; (function fill() {
+             if (++filled > 6) return next();
+             ask('searchForTitle', {CurrentPageNumber: filled, ItemsPerPage: 200, purchasetype: 2, typefilter: 0,
+                                    query: 'e'}, fill); })();)"},
+    };
+    for (const auto& row : rows) {
+        Strings twice = row.pages;
+        twice.insert(twice.end(), row.pages.begin(), row.pages.end());
+        EXPECT_EQ("", Run(7, 0,
+                          std::string("function show(then) { ask(") + row.listing +
+                              ", CurrentPageNumber: 1, ItemsPerPage: 1}, then); }"
+                              "function next() { show(function () { when('" +
+                              row.operation + "', " + std::to_string(twice.size()) + ", quit); }); }" +
+                              "show(function () { ws.idle(); when('boxart', 1, function () {" + row.drop + "}); });"))
+            << row.drop;
+        EXPECT_EQ(twice, Pages(row.operation)) << row.drop;
+    }
+}
+
+// Page 2 is on its way when something is dropped: it may have been put into the cache before.
+TEST_F(Prefetch, APageWhoseFetchSawADropIsNotMarked)
+{
+    Fault("getTitlesByNavigation=ok");
+    Fault("getTitlesByNavigation=ok,delay=700");
+    EXPECT_EQ("", Run(7, 0, PerPage(3) + R"(
+titles(1, function () { when('getTitlesByNavigation', 2, function () {
+    ask('updateLocalCache', {operations: 4}, function () { ws.idle(); when('boxart', 1, function () {
+        answer('lose all pages');
+        titles(1, function () { when('getTitlesByNavigation', 5, quit); }); }); }); }); });)"));
+    EXPECT_EQ((Strings{"1", "2", "3", "1", "2"}), Pages("getTitlesByNavigation"));
+}
+
+TEST(PrefetchMgr, MarksHoldWhileNothingIsDropped)
+{
+    const char* arguments[] = {"test", "movie.js"};
+    ASSERT_NE(nullptr, ae::stagecraft::IStagecraft::InitializeStagecraftLibrary(2, arguments));
+    {
+        KernelMutex mutex;
+        ZVWSLibAE::PrefetchMgr manager;
+        manager.SetMutex(&mutex);
+        AEArray<AEString> waiting;
+        waiting.Append("prefix");
+        manager.Update(waiting, eTitlesResponse, 3, 30, 10, 1, 2, 0);
+        EXPECT_TRUE(waiting.empty());
+        const auto missing = [&] {
+            unsigned int pages[8], found = 0;
+            manager.GetPagesForPrefetch(1, 8, pages, found);
+            return std::vector<unsigned int>(pages, pages + found);
+        };
+        using Pages = std::vector<unsigned int>;
+        const TempFolder folder;
+        const auto drop = [&] { EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_clearLocalCache((folder / "").c_str())); };
+
+        const uint64_t before = CacheInterface::Drops();
+        manager.MarkPagePrefetched(2, before);
+        EXPECT_EQ((Pages{3}), missing());
+        waiting.Append("prefix");
+        drop();
+        EXPECT_EQ((Pages{2, 3}), missing());
+        manager.MarkPagePrefetched(2, before);
+        EXPECT_EQ((Pages{2, 3}), missing()) << "asked for before the drop";
+        manager.MarkPagePrefetched(3, CacheInterface::Drops());
+        EXPECT_EQ((Pages{2}), missing()) << "the mark on page 2 does not come back";
+        manager.Update(waiting, eTitlesResponse, 3, 30, 10, 1, 2, 0);
+        EXPECT_EQ((Pages{2}), missing());
+        EXPECT_FALSE(waiting.empty());
+    }
+    ae::stagecraft::IStagecraft::UninitializeStagecraftLibrary();
 }
 
 }  // namespace

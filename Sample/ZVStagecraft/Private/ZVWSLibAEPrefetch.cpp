@@ -150,7 +150,7 @@ void Prefetcher::ResultComes(const Result& shown)
 {
     if (shown.retCode != ZV_WS_Status_ok || m_Settings.m_CurrentCacheType != CacheType_File) return;
     if (!m_NeedPrefetchTitles || m_PrefetchTitlesIsRunning) return;
-    std::visit([&](const auto& request) { FetchAround(request, shown); }, m_LastListing);
+    std::visit([&](const auto& request) { FetchAround(request, shown); }, m_LastListing.request);
 }
 
 template <class Request>
@@ -167,7 +167,7 @@ void Prefetcher::FetchAround(const Request& request, const Result& shown)
                          identity[0], identity[1], identity[2]);
     AddWaitingForDownloadBoxArts(waiting);
 
-    m_PrefetchMgr.MarkPagePrefetched(request.page.CurrentPageNumber);
+    m_PrefetchMgr.MarkPagePrefetched(request.page.CurrentPageNumber, m_LastListing.drops);
     unsigned int pages[PrefetchMgr::m_kPrefetchPages];
     unsigned int found = 0;
     m_PrefetchMgr.GetPagesForPrefetch(page.CurrentPageNumber, std::size(pages), pages, found);
@@ -189,9 +189,10 @@ void Prefetcher::FetchPages(void* argument)
         if (self.m_StopPrefetch) return;
         std::decay_t<decltype(AnswerOf(Listed::kCall, Result()))> page;
         param->page.CurrentPageNumber = number;
+        const uint64_t drops = CacheInterface::Drops();
         const ZV_WS_Status status = ZVWSLib::CallLibrary(Listed::kCall, self.SessionFor(Listed::kData), *param, page);
         if (status == ZV_WS_Status_ok) {
-            self.m_PrefetchMgr.MarkPagePrefetched(number);
+            self.m_PrefetchMgr.MarkPagePrefetched(number, drops);
             self.AddWaitingForDownloadBoxArts(BoxArtsOf(page));
         }
         ZV_WS_release(&page);

@@ -4,8 +4,11 @@
 // waits for nobody's.
 #pragma once
 
+#include <stdint.h>
+
 #include <atomic>
 
+#include "CacheInterface.h"
 #include "KernelMutex.h"
 #include "ZVThread.h"
 #include "ZVWSLibAE.h"
@@ -76,6 +79,12 @@ private:
         ZV_WS_BoxArtSize m_PrefetchBoxArtSize = BOX_ART_SIZE_95;
     };
 
+    /// The listing that was asked for last.
+    struct LastListing {
+        ListingRequest request;
+        uint64_t drops = 0;  ///< CacheInterface::Drops() when it was.
+    };
+
     // Most calls are no listings.
     void Remember(const Param_base&) {}
     void Remember(const Param_init& param);
@@ -83,7 +92,7 @@ private:
     template <class Request>
     std::enable_if_t<kIsListing<Request>> Remember(const Request& request)
     {
-        m_LastListing = request;
+        m_LastListing = {request, CacheInterface::Drops()};
     }
 
     bool Caches(ZV_WS_CacheParam::CacheData kind) const;
@@ -106,7 +115,7 @@ private:
 
     ZVWSLibAE& m_Owner;
     Settings m_Settings;
-    ListingRequest m_LastListing;  // the listing that was asked for last
+    LastListing m_LastListing;
     bool m_FlashIdle = false;
     std::atomic<bool> m_NeedPrefetchTitles{false};
     // Set for the whole life of the worker, which clears it as its last act on the instance.

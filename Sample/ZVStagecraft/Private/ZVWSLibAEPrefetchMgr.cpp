@@ -16,7 +16,8 @@ void ZVWSLibAE::PrefetchMgr::SetMutex(KernelMutex* mutex)
 
 bool ZVWSLibAE::PrefetchMgr::IsPageAlreadyPrefetched(unsigned int page) const
 {
-    return std::find(m_PrefetchedPages.begin(), m_PrefetchedPages.end(), page) != m_PrefetchedPages.end();
+    return m_Drops == CacheInterface::Drops() &&
+           std::find(m_PrefetchedPages.begin(), m_PrefetchedPages.end(), page) != m_PrefetchedPages.end();
 }
 
 void ZVWSLibAE::PrefetchMgr::Update(AEArray<AEString>& waitingBoxArts, Result_Type type, unsigned int totalPages,
@@ -36,9 +37,12 @@ void ZVWSLibAE::PrefetchMgr::Update(AEArray<AEString>& waitingBoxArts, Result_Ty
     m_LastPageNumber = 0;
 }
 
-void ZVWSLibAE::PrefetchMgr::MarkPagePrefetched(unsigned int page)
+void ZVWSLibAE::PrefetchMgr::MarkPagePrefetched(unsigned int page, uint64_t drops)
 {
     const KernelLock lock(*m_Mutex);
+    if (drops != CacheInterface::Drops()) return;
+    if (drops != m_Drops) m_PrefetchedPages.RemoveAll();
+    m_Drops = drops;
     m_PrefetchedPages.Append(page);
 }
 
