@@ -21,7 +21,7 @@
 // (valueOf or toString throws, a symbol).
 //
 // Methods that answer at once, with arguments of their own:
-//   clone(instance)             a session like that of another instance; ReturnCode
+//   clone(instance)             a session like that of another instance, which may have a call under way; ReturnCode
 //   idle()                      0; updates go on until the next result or "quitFlash"
 //   quitFlash()                 0; ends the movie
 //   getUserAgent()              text, empty before "init"
@@ -117,7 +117,7 @@ public:
         kWrongArguments = -3,      ///< Not one Array of two objects ("clone": not another, initialised instance), or a
                                    ///< property that cannot be read.
         kAlreadyInitialized = -4,  ///< "clone" only.
-        kDuplicateFailed = -5,     ///< "clone" only: no session of its own, also because the other instance is busy.
+        kDuplicateFailed = -5,     ///< "clone" only: a session of its own could not be made.
     };
 
     static const char* GetClassName();

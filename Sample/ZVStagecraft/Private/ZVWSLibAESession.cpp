@@ -90,8 +90,7 @@ ZVWSLibAE::ReturnCode Clone(ZVWSLibAE& self, ASValueArray& arguments)
     ZVWSLibAE* source = SourceOfClone(self, arguments);
     if (!source) return ZVWSLibAE::kWrongArguments;
 
-    // A session serves one thread at a time, and the worker of a busy source has it.
-    if (source->GetCall().IsBusy()) return ZVWSLibAE::kDuplicateFailed;
+    // The source's worker may be using its session. All else that is read of the source is the main thread's.
     if (ZV_WS_duplicate(&call.Session(), &source->GetCall().Session()) != ZV_WS_Status_ok) {
         ZV_WS_release(&call.Session());
         return ZVWSLibAE::kDuplicateFailed;
