@@ -17,10 +17,10 @@ protected:
     {
         std::filesystem::remove_all(Cache());
         store->ClearLog();
-        const std::string report =
-            Report("var perPage; setup.EnvNum = 2; setup.CacheType = 2; setup.CachePath = '" + Cache() +
-                   "'; setup.CacheLimit = 358400; setup.CacheData = " + std::to_string(data) +
-                   "; function until(then) { when('all', " + std::to_string(requests) + R"(, then); }
+        std::string report = Report("var perPage; setup.EnvNum = 2; setup.CacheType = 2; setup.CachePath = '" +
+                                    Cache() +
+                                    "'; setup.CacheLimit = 358400; setup.CacheData = " + std::to_string(data) +
+                                    "; function until(then) { when('all', " + std::to_string(requests) + R"(, then); }
 function ask(method, parameters, then) {
     call(ws, method, parameters, function (status, result) {
         if (status !== 0) report(method + ' ' + status);
@@ -30,8 +30,7 @@ function ask(method, parameters, then) {
 function titles(page, then) {
     ask('getTitles', {genreid: 100, CurrentPageNumber: page, ItemsPerPage: perPage, purchasetype: 2}, then);
 }
-ready(function () {)" +
-                   script + "});");
+ready(function () {)" + script + "});");
         store->ClearFaults();
         return report;
     }
