@@ -1,4 +1,5 @@
 // Fetching ahead, seen from the store: which pages are asked for after one was shown, in which order, and when not.
+#include <chrono>
 #include <filesystem>
 
 #include "CacheFile.h"
@@ -174,6 +175,21 @@ TEST_F(Prefetch, AForegroundCallWins)
                           "var asked = new Date().getTime();"
                           "ask('getTitleListing', {titleid: 12}, function () {"
                           "report(new Date().getTime() - asked < 1000 ? 'answered' : 'late'); quit(); }); }); });"));
+}
+
+// Neither the page nor the customer's own call gets an answer any more.
+TEST_F(Prefetch, TheEndWaitsForNoPage)
+{
+    Fault("getTitlesByNavigation=ok");
+    Fault("getTitlesByNavigation=stall");
+    Fault("getTitleListing=stall");
+    const auto started = std::chrono::steady_clock::now();
+    EXPECT_EQ("", Run(1, 4,
+                      PerPage(10) + "titles(1, function () { when('getTitlesByNavigation', 2, function () {"
+                                    "call(ws, 'getTitleListing', {titleid: 12}); until(quit); }); });"));
+    EXPECT_LT(std::chrono::steady_clock::now() - started, std::chrono::seconds(3));
+    EXPECT_EQ("stall", store->Log().at(2).fault);
+    EXPECT_EQ("stall", store->Log().at(3).fault);
 }
 
 // ---- What a page is known by

@@ -1,11 +1,21 @@
 // Methods against a storefront: what a script's parameters become on the wire, sessions, and the end of a busy
 // instance.
+#include <filesystem>
+
 #include "StoreMovie.h"
 
 namespace {
 
 class Movies : public StoreMovie {
 protected:
+    std::string AnswerTo(const std::string& question) override
+    {
+        const std::string verb = question.substr(0, 5);
+        if (verb == "lose ") return std::to_string(std::filesystem::remove_all(question.substr(5)));
+        if (verb == "find ") return std::to_string(std::filesystem::create_directory(question.substr(5)));
+        return StoreMovie::AnswerTo(question);
+    }
+
     // The requests since the log was cleared: "operation(child=value,...)".
     std::vector<std::string> Requests() const
     {
@@ -217,6 +227,19 @@ ready(function () {
                 when('getTitlesByNavigation', 5, quit); }); }); });)"));
     const std::vector<LoggedRequest> log = store->Log();
     EXPECT_EQ("stall", log.at(2).fault) << log[2].operation;
+}
+
+TEST_F(Movies, AFailedCloneCanBeRepeated)
+{
+    const std::string folder = store->DataFolder() + "/cache";
+    EXPECT_EQ("-5\n-1\n0\n", Report("setup.CacheType = 2; setup.CacheData = 1; setup.CachePath = '" + folder +
+                                    R"(';
+ready(function () {
+    var twin = new com.orvex.ZVWSLib();
+    answer('lose ' + setup.CachePath);
+    report(twin.clone(ws)); report(twin.getCountryID([{}, {}]));
+    answer('find ' + setup.CachePath);
+    report(twin.clone(ws)); });)"));
 }
 
 TEST_F(Movies, AnInitThatReadsACloneIntoBeingIsRefused)
