@@ -13,15 +13,21 @@
 // is called, once. The status is a ZV_WS_Status; the result is built also when it is a failure. "init" on an instance
 // that is initialised returns kStarted, too, and does nothing: no "onComplete" follows.
 //
+// Their parameters are properties of the parameter object, each read once. One that is missing, undefined or null is 0,
+// "" or false. Numbers become integers as the script's own bit operations make them. "useprepaidfund" is false for
+// false, 0, NaN and the texts "", "0" and "false", else true; an object counts as what its valueOf returns, or as its
+// text. "titleids" has to be an Array, of at most 10000 elements. A property that cannot be read refuses the call with
+// kWrongArguments, and nothing is sent: its getter throws, or its value or an element of it cannot be converted
+// (valueOf or toString throws, a symbol).
+//
 // Methods that answer at once, with arguments of their own:
-//   clone(instance)             a session like that of another instance; ReturnCode
+//   clone(instance)             a session like that of another instance, which may have a call under way; ReturnCode
 //   idle()                      0; updates go on until the next result or "quitFlash"
 //   quitFlash()                 0; ends the movie
 //   getUserAgent()              text, empty before "init"
 //   getDeviceEnv()              environment number, -1 before "init"
-//   getAvailableEnvLists()      Array of {endpoint, envNum}, with isDefault where the service says so: blocks while it
-//   is
-//                               asked, and does not ask before "init" or while a worker runs
+//   getAvailableEnvLists()      Array of {endpoint, envNum}, with isDefault where the service says so: blocks while
+//                               it is asked, and does not ask before "init" or while a worker runs
 //   getSysInfo(value)           the value's text
 //   fileExist(path)             boolean
 //   clearLocalCache(folder)     ZV_WS_Status
@@ -29,7 +35,8 @@
 //   setLogAreaIDsAndTargetConfig({LogAreaIDs, LogTarget, SettingsFile, PreferenceFile})
 //                               bits of areas and target, as numbers or texts in any base of C; the log file stands
 //                               beside the first file given with a folder. ZV_LOG ("areas,target,folder")
-//                               in the environment overrides. 0; 1 no target, 2 file cannot be opened, -3 no object
+//                               in the environment overrides. 0; 1 no target, 2 file cannot be opened, -3 no object,
+//                               or a property that cannot be read: the log stays as it is
 //   trace(value)                prints the value's text
 #pragma once
 
@@ -107,9 +114,10 @@ public:
         kStarted = 0,              ///< The worker runs ("clone": the instance is ready).
         kNotInitialized = -1,      ///< "init" has not succeeded.
         kBusy = -2,                ///< A call of this instance has not been delivered yet; it goes on undisturbed.
-        kWrongArguments = -3,      ///< Not one Array of two objects ("clone": not another, initialised instance).
+        kWrongArguments = -3,      ///< Not one Array of two objects ("clone": not another, initialised instance), or a
+                                   ///< property that cannot be read.
         kAlreadyInitialized = -4,  ///< "clone" only.
-        kDuplicateFailed = -5,     ///< "clone" only: no session of its own, also because the other instance is busy.
+        kDuplicateFailed = -5,     ///< "clone" only: a session of its own could not be made.
     };
 
     static const char* GetClassName();
@@ -130,9 +138,11 @@ public:
     void OnUpdate(ae::stagecraft::StageWindow* window, ae::stagecraft::ASObject& object) override;
 
     /// The instance's insides, for its handlers and workers.
-    struct State;
+    class ForegroundCall;
+    class Prefetcher;
     class PrefetchMgr;
-    State& GetState() { return *m_State; }
+    ForegroundCall& GetCall() { return *m_Call; }
+    Prefetcher& GetPrefetcher() { return *m_Prefetcher; }
 
 private:
 #define ZVWSLIBAE_DECLARE(name)                                                      \
@@ -141,5 +151,7 @@ private:
     ZVWSLIBAE_METHODS(ZVWSLIBAE_DECLARE, ZVWSLIBAE_DECLARE)
 #undef ZVWSLIBAE_DECLARE
 
-    std::unique_ptr<State> m_State;
+    // The call's worker may use the prefetcher: the call goes first.
+    std::unique_ptr<Prefetcher> m_Prefetcher;
+    std::unique_ptr<ForegroundCall> m_Call;
 };

@@ -28,7 +28,7 @@ public:
 
     void OnUpdate(StageWindow* window, ASObject& object) override
     {
-        const bool delivers = GetState().m_NeedFireEvent;  // waits on purpose, and runs the movie's code
+        const bool delivers = GetCall().HasResult();  // waits on purpose, and runs the movie's code
         const Clock::time_point start = Clock::now();
         ZVWSLibAE::OnUpdate(window, object);
         if (!delivers) s_Ticks.push_back(std::chrono::duration<double>(Clock::now() - start).count());

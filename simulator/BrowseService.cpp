@@ -9,7 +9,7 @@ constexpr int kMostPerPage = 200;
 void WriteTitles(Call& call, const std::string& where, const Database::Values& values, int genre)
 {
     const int page = call.Int("CurrentPageNumber");
-    const int perPage = std::min(call.Int("ItemsPerPage"), kMostPerPage);
+    const int perPage = std::min(call.PageSize(), kMostPerPage);
     if (page < 1 || perPage < 1 || page > kHighestPage) return call.Refuse(2, "pages start at 1 and hold an item");
     std::string sql = " FROM title WHERE " + where;
     const int type = call.Int("PurchaseType");

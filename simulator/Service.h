@@ -1,6 +1,7 @@
 // What the three SOAP services have in common: operations as rows, and what a row's handler gets.
 #pragma once
 
+#include <algorithm>
 #include <map>
 #include <string>
 #include <vector>
@@ -49,12 +50,19 @@ struct Call {
     std::string address;  ///< "host:port" of the plain HTTP side, for addresses in answers.
     int account;          ///< Of the customer who asks.
     std::string device;   ///< That asks: its DestinationUniqueID.
+    int largestPage;      ///< Items that a page holds at most; 0: as many as are asked for.
 
     int Int(const char* name) const { return arguments.Int(name); }
     std::string Text(const char* name) const { return arguments.Text(name); }
     /// What the column of the customer's account holds.
     int AccountInt(const char* column) const;
     std::string AccountText(const char* column) const;
+    /// How many items the page that is asked for holds.
+    int PageSize() const
+    {
+        const int asked = Int("ItemsPerPage");
+        return largestPage > 0 ? std::min(asked, largestPage) : asked;
+    }
     /// The head of most results.
     void Standard(int code = 0, const std::string& message = "OK") const
     {

@@ -110,8 +110,8 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
 {
     XmlWriter xml, refusal;
     const auto into = [&](XmlWriter& writer) {
-        return Call{m_Database,     checked.arguments, writer,        checked.operation->refusal,
-                    m_PlainAddress, checked.account,   checked.device};
+        return Call{m_Database,     checked.arguments, writer,         checked.operation->refusal,
+                    m_PlainAddress, checked.account,   checked.device, m_LargestPage};
     };
     Call call = into(xml);
     const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());

@@ -6,8 +6,8 @@
 
 class SoapService {
 public:
-    SoapService(Database& database, std::string plainAddress)
-        : m_Database(database), m_Check(database), m_PlainAddress(std::move(plainAddress))
+    SoapService(Database& database, std::string plainAddress, int largestPage)
+        : m_Database(database), m_Check(database), m_PlainAddress(std::move(plainAddress)), m_LargestPage(largestPage)
     {}
 
     /// The service behind a path, or null.
@@ -33,4 +33,5 @@ private:
     Database& m_Database;
     RequestCheck m_Check;
     std::string m_PlainAddress;
+    int m_LargestPage;
 };

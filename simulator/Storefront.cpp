@@ -235,7 +235,8 @@ bool Simulator::Begin(std::string& error)
     m_Database = Database::Open(m_Folder + "/storefront.db", error);
     if (!m_Database || !FillCatalogue(*m_Database, error)) return false;
     xmlInitParser();
-    m_Soap = std::make_unique<SoapService>(*m_Database, "localhost:" + std::to_string(m_HttpPort));
+    m_Soap =
+        std::make_unique<SoapService>(*m_Database, "localhost:" + std::to_string(m_HttpPort), m_Options.largestPage);
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.oldTls);
     if (!WriteFiles(error)) return false;
     const std::lock_guard<std::mutex> lock(m_Mutex);

@@ -31,6 +31,7 @@ struct StorefrontOptions {
     bool oldTls = false;  ///< At most TLS 1.1.
     bool gzip = true;     ///< Compress answers for clients that accept it.
     int environment = 2;  ///< What discovery answers.
+    int largestPage = 0;  ///< Items that a page holds at most, whatever is asked for; 0: only the catalogue has one.
     std::vector<std::string> faults;
 };
 

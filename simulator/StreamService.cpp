@@ -177,7 +177,7 @@ bool WritePurchaseList(Call& call, const std::string& from, const std::string& t
                        const std::string& passColumn, const std::string& order)
 {
     const int page = call.Int("CurrentPageNumber");
-    const int perPage = call.Int("ItemsPerPage");
+    const int perPage = call.PageSize();
     if (page < 1 || perPage < 1 || page > kHighestPage || perPage > kHighestPage) {
         call.Refuse(2, "pages start at 1 and hold an item");
         return false;

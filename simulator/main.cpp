@@ -56,6 +56,9 @@ const Option kOptions[] = {
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 600000, o.latency); }},
     {"--environment", "N", "what discovery answers, 0 to 9 (default 2: production)",
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 9, o.environment); }},
+    {"--largest-page", "N",
+     "items that a page holds at most, whatever is asked for (default 0: only the catalogue has one, 200)",
+     [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 32767, o.largestPage); }},
     {"--certificate", "KIND", "good, untrusted, expired, wrong-name, wide-wildcard or name-only", ReadCertificate},
     {"--old-tls", nullptr, "TLS 1.1 at most", [](const char*, StorefrontOptions& o) { return o.oldTls = true; }},
     {"--no-gzip", nullptr, "never compress answers",
@@ -68,9 +71,9 @@ void PrintHelp()
 {
     printf("zv_storefront: the storefront's services on this machine.\n\nOptions:\n");
     for (const Option& option : kOptions) {
-        printf("  %-13s %-5s %s\n", option.name, option.argument ? option.argument : "", option.help);
+        printf("  %-14s %-5s %s\n", option.name, option.argument ? option.argument : "", option.help);
     }
-    printf("  %-13s %-5s %s\n\n", "--help", "", "this text");
+    printf("  %-14s %-5s %s\n\n", "--help", "", "this text");
     printf(
         "Account: user \"%s\", password \"%s\", API key \"%s\", adult PIN %s, activation PIN %s (000000 locks out), "
         "gift\n"

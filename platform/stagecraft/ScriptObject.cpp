@@ -6,6 +6,16 @@
 
 using namespace ae::stagecraft;
 
+namespace {
+
+// For bodies: raises when what was read is nothing that native code can hold.
+void RefuseSymbol(duk_context* pContext)
+{
+    if (duk_is_symbol(pContext, -1)) duk_type_error(pContext, "a symbol cannot be read by native code");
+}
+
+}  // namespace
+
 void ScriptObject::Release()
 {
     if (--m_references > 0) return;
@@ -52,6 +62,7 @@ bool ScriptObject::GetProperty(const char* pName, ASValue& value)
         [&](duk_context* pContext) {
             ScriptEngine::PushText(pContext, pName);
             duk_get_prop(pContext, -2);
+            RefuseSymbol(pContext);
         },
         value);
 }
@@ -78,7 +89,12 @@ uint32_t ScriptObject::GetLength()
 
 bool ScriptObject::GetElement(uint32_t index, ASValue& value)
 {
-    return Evaluate([&](duk_context* pContext) { duk_get_prop_index(pContext, -1, index); }, value);
+    return Evaluate(
+        [&](duk_context* pContext) {
+            duk_get_prop_index(pContext, -1, index);
+            RefuseSymbol(pContext);
+        },
+        value);
 }
 
 bool ScriptObject::Call(const char* pFunctionName, const ASValueArray& arguments, ASValue& result)

@@ -33,7 +33,9 @@ TEST(Dispatch, ArgumentsMustBeOneArrayOfTwoObjects)
 {
     std::istringstream wrong(
         ";{};null;listener('a'), {};[listener('a')];[listener('a'), {}, {}];[listener('a'), 5];[null, {}];['text', {}];"
-        "[listener('a'), {}], 1;{length: 2, 0: listener('a'), 1: {}}");
+        "[listener('a'), {}], 1;{length: 2, 0: listener('a'), 1: {}};"
+        "new Proxy([listener('a'), {}], {get: function () { throw new Error('on purpose') }});"
+        "Object.defineProperty([listener('a'), {}], 1, {get: function () { throw new Error('on purpose') }})");
     for (std::string arguments; std::getline(wrong, arguments, ';');)
         EXPECT_EQ("-3\n", Report("report(ws.init(" + arguments + "));\n")) << arguments;
 }

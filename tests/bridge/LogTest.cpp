@@ -86,10 +86,19 @@ TEST_F(Log, AMovieSetsItUpUnlessTheEnvironmentDoes)
         EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
         std::filesystem::remove(m_Folder + "log.txt");
     }
-    EXPECT_EQ("-3,-3\n", RunMovie("var lib = com.orvex.ZVWSLib;\n"
-                                  "report([lib.setLogAreaIDsAndTargetConfig(),\n"
-                                  "    lib.setLogAreaIDsAndTargetConfig('0x100')]);\n")
-                             .Text());
+    // What is refused changes nothing.
+    EXPECT_EQ(0, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, m_Folder.c_str()));
+    EXPECT_EQ(
+        "-3,-3,-3,-3,-3,-3\n",
+        RunMovie("var lib = com.orvex.ZVWSLib, names = ['LogAreaIDs', 'LogTarget', 'SettingsFile', 'PreferenceFile'];\n"
+                 "report([lib.setLogAreaIDsAndTargetConfig(), lib.setLogAreaIDsAndTargetConfig('0x100')].concat(\n"
+                 "    names.map(function (name) {\n"
+                 "        var settings = {LogAreaIDs: 0x200, LogTarget: 1, SettingsFile: '/no/such/s'};\n"
+                 "        settings[name] = {toString: function () { throw new Error('on purpose'); }};\n"
+                 "        return lib.setLogAreaIDsAndTargetConfig(settings); })));\n"
+                 "new lib().getNavigation();\n")
+            .Text());
+    EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
 }
 
 }  // namespace

@@ -13,6 +13,7 @@ namespace {
 
 MovieRun* s_Run = nullptr;
 const Result* s_Shown = nullptr;
+const Answer* s_Answer = nullptr;
 
 class TestClass : public ASExtensionClass {
 public:
@@ -22,6 +23,7 @@ public:
     {
         methods.Append(MakeMethod("report", Method::kStaticFunction, &TestClass::report));
         methods.Append(MakeMethod("result", Method::kStaticFunction, &TestClass::result));
+        methods.Append(MakeMethod("answer", Method::kStaticFunction, &TestClass::answer));
     }
     static ASExtensionClass* ConstructInstance(StageWindow*, ASObject&, ASValueArray&) { return new TestClass; }
     static void DestructInstance(StageWindow*, ASObject& object) { delete object.GetExtensionInstance(); }
@@ -37,6 +39,10 @@ private:
     {
         ZVWSLib::SetResult(*s_Shown, returnValue, object);
     }
+    void answer(StageWindow*, ASObject&, ASValueArray& arguments, ASValue& returnValue)
+    {
+        returnValue = ASValue::String((*s_Answer)(arguments[0].GetString().c_str()).c_str());
+    }
 };
 
 }  // namespace
@@ -49,15 +55,17 @@ std::string MovieRun::Text() const
     return text;
 }
 
-MovieRun RunMovie(const std::string& script, const Result& shown)
+MovieRun RunMovie(const std::string& script, const Result& shown, const Answer& answer)
 {
     MovieRun run;
     s_Run = &run;
     s_Shown = &shown;
+    s_Answer = &answer;
     const TempFolder folder;
     const std::string movie = folder.Write("movie.js",
                                            "function report(text) { test.Native.report(text); }\n"
-                                           "function result() { return test.Native.result(); }\n" +
+                                           "function result() { return test.Native.result(); }\n"
+                                           "function answer(question) { return test.Native.answer(question); }\n" +
                                                script);
     setenv("STAGECRAFT_FPS", "200", 1);
     unsetenv("STAGECRAFT_MOVIE");

@@ -1,6 +1,7 @@
 // Runs a movie in the desktop runtime with the extension class and a class of the test's own.
 #pragma once
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -14,5 +15,9 @@ struct MovieRun {
     std::string Text() const;
 };
 
-/// The movie sees com.orvex.ZVWSLib, com.orvex.ZVCfgLib, report(text), and result(): the script value of `shown`.
-MovieRun RunMovie(const std::string& script, const Result& shown = Result());
+/// What the test answers to a movie's question. Called while the movie runs, on its thread.
+using Answer = std::function<std::string(const std::string& question)>;
+
+/// The movie sees com.orvex.ZVWSLib, com.orvex.ZVCfgLib, report(text), answer(question), and result(): the script value
+/// of `shown`.
+MovieRun RunMovie(const std::string& script, const Result& shown = Result(), const Answer& answer = nullptr);

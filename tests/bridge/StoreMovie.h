@@ -6,8 +6,16 @@
 
 class StoreMovie : public Store {
 protected:
+    /// What the script asks of the test: how often the store was asked for an operation or a service.
+    virtual std::string AnswerTo(const std::string& name)
+    {
+        const auto log = store->Log();
+        const auto isThat = [&](const LoggedRequest& one) { return one.operation == name || one.service == name; };
+        return std::to_string(std::count_if(log.begin(), log.end(), isThat));
+    }
+
     /// Runs a script that has `setup` for "init", an instance `ws`, and these functions.
-    static MovieRun Run(const std::string& script)
+    MovieRun Run(const std::string& script)
     {
         return RunMovie(R"(
 var setup = {APIKey: 'desktop', UserName: 'customer', Password: 'secret', DestinationUniqueID: 'device',
@@ -23,10 +31,20 @@ function ready(then) {
         then();
     });
 }
-)" + script);
+// Goes on when the store has been asked so often.
+function when(name, count, then) {
+    var patience = 2000, timer = setInterval(function () {
+        if (Number(answer(name)) < count && --patience > 0) return;
+        clearInterval(timer);
+        if (patience === 0) report('asked for ' + name + ' ' + answer(name) + ' times, not ' + count);
+        then();
+    }, 5);
+}
+)" + script,
+                        Result(), [this](const std::string& question) { return AnswerTo(question); });
     }
 
-    static std::string Report(const std::string& script)
+    std::string Report(const std::string& script)
     {
         const MovieRun run = Run(script);
         EXPECT_TRUE(run.succeeded);

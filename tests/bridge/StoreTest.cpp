@@ -1,11 +1,21 @@
 // Methods against a storefront: what a script's parameters become on the wire, sessions, and the end of a busy
 // instance.
+#include <filesystem>
+
 #include "StoreMovie.h"
 
 namespace {
 
 class Movies : public StoreMovie {
 protected:
+    std::string AnswerTo(const std::string& question) override
+    {
+        const std::string verb = question.substr(0, 5);
+        if (verb == "lose ") return std::to_string(std::filesystem::remove_all(question.substr(5)));
+        if (verb == "find ") return std::to_string(std::filesystem::create_directory(question.substr(5)));
+        return StoreMovie::AnswerTo(question);
+    }
+
     // The requests since the log was cleared: "operation(child=value,...)".
     std::vector<std::string> Requests() const
     {
@@ -62,6 +72,102 @@ ready(function next() {
     EXPECT_EQ(requests, Requests());
 }
 
+// ---- Properties that cannot be read
+
+// Every method with properties, in the order in which they are read. What stands before a name tells what it is read
+// as: # a number, $ a text, ? a boolean, @ an array of numbers.
+const char kProperties[] = R"(var methods = {
+    init: '$APIKey $UserName $Password #DestinationTypeID $AuthToken $DestinationUniqueID $ServiceBaseURL #Type ' +
+        '#CacheType #CacheData $CachePath #CacheLimit $ProxyHost $ProxyUserName #ProxyPort $ProxyPassword #AccessType ' +
+        '$ApplicationRevision #EnvNum $firmwareVersion $modelNumber',
+    getTitles: '#genreid #CurrentPageNumber #ItemsPerPage #purchasetype',
+    getTitleListing: '#titleid',
+    searchForTitle: '#CurrentPageNumber #ItemsPerPage #purchasetype #typefilter $query',
+    getRecommendedTitles: '#titleid', translateSkuID: '#skuid', getTvEpisodeListing: '#episodeid',
+    getTvEpisodeListByTitleID: '#titleid', getAllTvEpisodeListings: '#titleid', authorizeDevice: '$pin',
+    getBoxArtImage: '#boxartsize $boxartprefix',
+    getMyVideos: '#CurrentPageNumber #ItemsPerPage #purchasetype #typefilter #watchstatus',
+    getWishlistItems: '#sortorder #CurrentPageNumber #ItemsPerPage #typefilter',
+    addItemToWishlist: '#titleid', removeItemFromWishlist: '#titleid', checkTitleInWishlist: '#titleid',
+    checkTitlesInWishlist: '@titleids #typefilter',
+    doPurchaseSavedBilling: '#skuid $ipaddress ?useprepaidfund',
+    checkForPurchasedTitle: '#titleid', checkForPurchasedSku: '#skuid', checkAdultVerificationPin: '#pin',
+    assignGiftCertificateToUser: '$giftcertificatecode', checkRentalExpiration: '#passid',
+    getStreamingAssetLocation: '#passid #fileprofile', getStreamingBonusAssetLocation: '#bonusassetid',
+    loadLastStreamingAssetLocation: '#passid #fileprofile',
+    manageStreamingInstanceStatus: '$streamid #streamstatus #stoptimeSeconds',
+    getTHXMediaDirector: '#passid #fileprofile #audioprofile',
+    getTHXMediaDirectorBonusAsset: '#bonusassetid #fileprofile #bonusassettype',
+    updateLocalCache: '#operations', calcOrderTax: '#skuid', setAudioDefaultProperty: '#audioprofile'};
+function fail() { throw new Error('on purpose'); }
+function withLength(get) {
+    return new Proxy([1], {get: function (array, name) { return name === 'length' ? get() : array[name]; }}); }
+function withItem(item) { return [1, item, 3]; }
+var toPrimitive = {}; toPrimitive[Symbol.toPrimitive] = fail;
+// Values that are no text, and so no number either; values that are no number; arrays of those.
+var noTexts = [{toString: fail}, toPrimitive, Symbol('s'), Object.create(null), {toString: function () { return {}; }}];
+var noNumbers = noTexts.concat([{valueOf: fail}]);
+var noArrays = noNumbers.map(withItem).concat([withLength(fail), withLength(function () { return {valueOf: fail}; }),
+    Object.defineProperty([1, 2, 3], 1, {get: fail}), 7, undefined, {length: 1, 0: 1}]);
+var bad = {'#': noNumbers, '?': noNumbers, '$': noTexts, '@': noArrays};
+)";
+
+TEST_F(Movies, APropertyThatCannotBeReadRefusesTheCall)
+{
+    EXPECT_EQ("done\n0\n", Report(kProperties + std::string(R"(
+function refuse(object, method, name, property, what) {
+    var code = object[method]([{}, Object.defineProperty({titleids: [1]}, name, property)]);
+    if (code !== -3) report(method + ' took ' + name + ' ' + what + ': ' + code);
+}
+ready(function () {
+    for (var method in methods) {
+        var object = method === 'init' ? new com.orvex.ZVWSLib() : ws;
+        methods[method].split(' ').forEach(function (property) {
+            var name = property.substr(1);
+            refuse(object, method, name, {get: fail}, 'of a getter');
+            bad[property[0]].forEach(function (value, at) { refuse(object, method, name, {value: value}, at); }); });
+    }
+    report('done');
+    call(ws, 'getCountryID', {}, function (status) { report(status); }); });)")));
+    EXPECT_EQ((std::vector<std::string>{"discovery(d=device,dt=48)", "GetCountryID()"}), Requests());
+}
+
+// Nothing is given, which is not the same.
+TEST_F(Movies, PropertiesAreReadInOrderAndOnce)
+{
+    EXPECT_EQ("", Report(kProperties + std::string(R"(
+ready(function () {
+    var names = Object.keys(methods);
+    (function next() {
+        var read = [], method = names.shift();
+        if (!method) return;
+        function watched(target) {
+            return new Proxy(target, {get: function (target, name) { read.push(name); return target[name]; }}); }
+        var ids = watched([7, {valueOf: function () { read.push('valueOf'); return 19; }}]);
+        call(method === 'init' ? new com.orvex.ZVWSLib() : ws, method,
+            watched(method === 'checkTitlesInWishlist' ? {titleids: ids} : {}), next);
+        var expected = methods[method].replace(/[#$?@]/g, '').replace('titleids', 'titleids length 0 1 valueOf');
+        if (read.join(' ') !== expected) report(method + ' read ' + read.join(' '));
+    })(); });)")));
+}
+
+TEST_F(Movies, PrepaidMoneyIsUsedWhenTheScriptSaysSo)
+{
+    EXPECT_EQ("", Report(R"(
+var values = [false, 0, -0, NaN, '', '0', 'false', undefined, null, new Boolean(false), new Number(0), new String('0'), [],
+              true, 1, -0.5, Infinity, '1', 'true', 'no', ' ', 'False', new Boolean(true), new Number(2), {}, new Date(1)];
+ready(function next() {
+    if (values.length === 0) return;
+    call(ws, 'doPurchaseSavedBilling', {skuid: 9001, ipaddress: '', useprepaidfund: values.shift()}, next); });)"));
+    std::string answers;
+    for (const LoggedRequest& request : store->Log()) {
+        for (const auto& child : request.children) {
+            if (child.first == "UsePrePaidFunds") answers += child.second + " ";
+        }
+    }
+    EXPECT_EQ("no no no no no no no no no no no no no yes yes yes yes yes yes yes yes yes yes yes yes yes ", answers);
+}
+
 TEST_F(Movies, TitleIdsMustBeAnArray)
 {
     EXPECT_EQ("-3\n-3\n-3\n-3\n0 []\ntrue,false,true\n",
@@ -89,18 +195,51 @@ TEST_F(Movies, AFailedInitCanBeRepeatedASecondOneDoesNothing)
 TEST_F(Movies, ClonesWorkBesideTheirSource)
 {
     store->SetLatency(50);
-    EXPECT_EQ("0\n-4\n-4\n-5\nclone 0,late 0,source 0\n",
+    EXPECT_EQ("0\n-4\n-4\n0\nclone 0,late 0,source 0\n",
               Report("ready(function () {\n"
                      "  var twin = new com.orvex.ZVWSLib(), late = new com.orvex.ZVWSLib(), done = [];\n"
                      "  function finished(name) { return function (status) { done.push(name + ' ' + status);\n"
                      "    if (done.length === 3) report(done.sort()); }; }\n"
                      "  report(twin.clone(ws)); report(twin.clone(ws)); report(ws.clone(twin));\n"
                      "  call(ws, 'getCountryID', {}, function (status) { ws = null; finished('source')(status); });\n"
-                     "  call(twin, 'getCountryID', {}, function (status) {\n"
-                     "    if (late.clone(twin) !== 0) report('late clone failed');\n"
-                     "    call(late, 'getCountryID', {}, finished('late')); finished('clone')(status); });\n"
-                     "  report(late.clone(ws)); });\n"));
+                     "  call(twin, 'getCountryID', {}, finished('clone'));\n"
+                     "  report(late.clone(twin));\n"
+                     "  call(late, 'getCountryID', {}, finished('late')); });\n"));
     EXPECT_EQ(4u, store->Log().size());  // one discovery
+}
+
+// The source's call gets no answer while the clone works, and fetches ahead.
+TEST_F(Movies, AnInstanceIsClonedWhileItsCallIsUnderWay)
+{
+    Fault("getTitleListing=stall");
+    EXPECT_EQ("0\n0 2 of 5\n", Report(R"(setup.CacheType = 2; setup.CacheData = 1; setup.CachePath = ')" +
+                                      store->DataFolder() + R"(/cache/';
+ready(function () {
+    call(ws, 'getTitleListing', {titleid: 12}, function () { report('the source is answered'); });
+    when('getTitleListing', 1, function () {
+        var twin = new com.orvex.ZVWSLib();
+        var code = twin.clone(ws);
+        report(code);
+        if (code !== 0) return quit();
+        call(twin, 'getTitles', {genreid: 8010, CurrentPageNumber: 2, ItemsPerPage: 1, purchasetype: 2},
+            function (status, page) {
+                report(status + ' ' + page.CurrentPageNumber + ' of ' + page.TotalPages);
+                when('getTitlesByNavigation', 5, quit); }); }); });)"));
+    const std::vector<LoggedRequest> log = store->Log();
+    EXPECT_EQ("stall", log.at(2).fault) << log[2].operation;
+}
+
+TEST_F(Movies, AFailedCloneCanBeRepeated)
+{
+    const std::string folder = store->DataFolder() + "/cache";
+    EXPECT_EQ("-5\n-1\n0\n", Report("setup.CacheType = 2; setup.CacheData = 1; setup.CachePath = '" + folder +
+                                    R"(';
+ready(function () {
+    var twin = new com.orvex.ZVWSLib();
+    answer('lose ' + setup.CachePath);
+    report(twin.clone(ws)); report(twin.getCountryID([{}, {}]));
+    answer('find ' + setup.CachePath);
+    report(twin.clone(ws)); });)"));
 }
 
 TEST_F(Movies, AnInitThatReadsACloneIntoBeingIsRefused)

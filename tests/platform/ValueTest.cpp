@@ -84,9 +84,19 @@ TEST_F(ValueTest, PropertiesConvert)
         {"{v: -1.9}", "-1 4294967295 1 -1.9"},
         {"{v: NaN}", "0 0 0 NaN"},
         {"{v: ''}", "0 0 0 "},
-        {"{v: '0'}", "0 0 1 0"},
+        {"{v: '0'}", "0 0 0 0"},
+        {"{v: 'false'}", "0 0 0 false"},
+        {"{v: 'False'}", "0 0 1 False"},
         {"{v: '12 monkeys'}", "0 0 1 12 monkeys"},
         {"{v: [8]}", "8 8 1 8"},
+        {"{v: []}", "0 0 0 "},
+        {"{v: {}}", "0 0 1 [object Object]"},
+        {"{v: new Boolean(false)}", "0 0 0 false"},
+        {"{v: new Boolean(true)}", "1 1 1 true"},
+        {"{v: new Number(NaN)}", "0 0 0 NaN"},
+        {"{v: new String('0')}", "0 0 0 0"},
+        {"{v: {valueOf: function() { return 'no'; }}}", "0 0 1 [object Object]"},
+        {"{v: {valueOf: function() { return null; }}}", "0 0 0 [object Object]"},
         {"Object.create({v: 5})", "5 5 1 5"},
         {"{get v() { return 6; }}", "6 6 1 6"},
     };
@@ -94,8 +104,72 @@ TEST_F(ValueTest, PropertiesConvert)
         ASObject& object = *call.arguments[0].GetObject();
         Probe::s_lines.push_back(std::to_string(object.GetInt("v")) + " " + std::to_string(object.GetUint("v")) + " " +
                                  std::to_string(object.GetBoolean("v")) + " " + object.GetText("v").c_str());
+        int32_t whole;
+        bool flag;
+        AEString text;
+        EXPECT_TRUE(object.GetInt("v", whole) && object.GetBoolean("v", flag) && object.GetText("v", text));
     };
     RunEach(rows);
+}
+
+// Each row: a property, and of which kinds it can be read all the same: number, boolean, text.
+TEST_F(ValueTest, PropertiesThatCannotBeReadAreTold)
+{
+    const Rows rows = {
+        {"{get v() { throw 1; }}", "---"},
+        {"{v: {valueOf: function() { throw 1; }}}", "--t"},
+        {"{v: {toString: function() { throw 1; }}}", "---"},
+        {"{v: {toString: function() { throw 1; }, valueOf: function() { return 1; }}}", "nb-"},
+        {"{v: {toString: function() { return {}; }}}", "---"},
+        {"{v: Object.create(null)}", "---"},
+        {"{v: [{toString: function() { throw 1; }}]}", "---"},
+        // Where the language has symbols.
+        {"{v: typeof Symbol === 'function' ? Symbol('s') : Object.create(null)}", "---"},
+        {"(function() { var v = {toString: function() { throw 1; }};"
+         "if (typeof Symbol === 'function') v[Symbol.toPrimitive] = v.toString; return {v: v}; })()",
+         "---"},
+    };
+    Probe::s_run = [](const Invocation& call) {
+        ASObject& object = *call.arguments[0].GetObject();
+        double number = 2;
+        int32_t whole = 2;
+        uint32_t natural = 2;
+        bool flag = true;
+        AEString text = "before";
+        const bool asNumber = object.GetNumber("v", number);
+        EXPECT_EQ(asNumber, object.GetInt("v", whole));
+        EXPECT_EQ(asNumber, object.GetUint("v", natural));
+        const bool asBoolean = object.GetBoolean("v", flag), asText = object.GetText("v", text);
+        EXPECT_TRUE(asNumber || (number == 0 && whole == 0 && natural == 0));
+        EXPECT_TRUE(asBoolean || !flag);
+        EXPECT_TRUE(asText || text.empty());
+        Probe::s_lines = {std::string(asNumber ? "n" : "-") + (asBoolean ? "b" : "-") + (asText ? "t" : "-")};
+    };
+    for (const auto& [pExpression, expected] : rows) {
+        EXPECT_EQ(Play(std::string("probe.run(") + pExpression + ");").m_nErrorValue, AEError::OK);
+        EXPECT_EQ(Probe::s_lines, Lines{expected}) << pExpression;
+        EXPECT_NE(m_errors.find("com.example.Probe.run"), std::string::npos) << m_errors;
+    }
+}
+
+// A value that is no number is one; each property is read once, each value converted once.
+TEST_F(ValueTest, PropertiesAndValuesAreAskedOnce)
+{
+    Probe::s_run = [](const Invocation& call) {
+        ASObject& object = *call.arguments[0].GetObject();
+        double number = 2;
+        bool flag = true;
+        AEString text;
+        EXPECT_TRUE(object.GetNumber("v", number) && std::isnan(number));
+        Probe::s_lines.push_back("boolean");
+        EXPECT_TRUE(object.GetBoolean("v", flag) && !flag);
+        Probe::s_lines.push_back("text");
+        EXPECT_TRUE(object.GetText("v", text));
+    };
+    EXPECT_EQ(Logged("probe.run({get v() { probe.log('read'); return {"
+                     "    valueOf: function() { probe.log('valueOf'); return NaN; },"
+                     "    toString: function() { probe.log('toString'); return ''; }}; }});"),
+              (Lines{"read", "valueOf", "boolean", "read", "valueOf", "text", "read", "toString"}));
 }
 
 TEST_F(RuntimeTest, ResultsKeepTypeAndContent)

@@ -212,6 +212,33 @@ TEST_F(ContractTest, EveryAnswerIsOneOfTheContract)
     }
 }
 
+// Whatever was asked for: the answer says what it holds, and the pages join.
+TEST_F(ContractTest, PagesAreNeverLargerThanTheLargest)
+{
+    StorefrontOptions options;
+    options.largestPage = 2;
+    Begin(options);
+    for (const char* title : {"12", "13", "21"})
+        EXPECT_EQ("0",
+                  Ask(kStream, "addItemToWishlist", Request(std::string("TitleID=") + title)).Element("ResponseCode"));
+    const Row lists[] = {{kBrowse, "getTitlesByNavigation", "GenreID=100 " PAGE "PurchaseType=any", ""},
+                         {kBrowse, "searchForTitle", SEARCH, ""},
+                         {kStream, "getMyStreamingVideos", PAGE ALL, ""},
+                         {kAccount, "getMyVideos", PAGE ALL, ""},
+                         {kStream, "getWishlistItems", "sortOrder=0 " PAGE "TitleType=any", ""}};
+    for (const Row& list : lists) {
+        const Reply first = Ask(list.service, list.operation, Request(list.children));
+        const Reply second = Ask(list.service, list.operation, Request(list.children, "CurrentPageNumber=2"));
+        const int total = atoi(first.Element("TotalItems").c_str());
+        EXPECT_GT(total, 2) << list.operation;
+        EXPECT_EQ("2", first.Element("ItemsPerPage")) << list.operation;
+        EXPECT_EQ(std::to_string((total + 1) / 2), first.Element("TotalPages")) << list.operation;
+        EXPECT_NE(std::string::npos, first.body.find("<TitlePosition>2<")) << list.operation;
+        EXPECT_EQ(std::string::npos, first.body.find("<TitlePosition>3<")) << list.operation;
+        EXPECT_EQ("3", second.Element("TitlePosition")) << list.operation;
+    }
+}
+
 TEST_F(ContractTest, SearchesLookAwayFromCase)
 {
     Begin();

@@ -103,6 +103,7 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
                 {{"--latency"}, 2, "--latency needs MS"},
                 {{"--latency", "soon"}, 2, "--latency needs MS"},
                 {{"--https-port", "65536"}, 2, "--https-port needs N"},
+                {{"--largest-page", "-1"}, 2, "--largest-page needs N"},
                 {{"--certificate", "bad"}, 2, "--certificate needs KIND"},
                 {{"--fault", "getConfig=sever"}, 1, "sever"},
                 {{"--http-port", taken}, 1, "port " + taken},

@@ -1,7 +1,10 @@
 // The class as the runtime sees it.
 #include "ZVWSLibAE.h"
 
-#include "ZVWSLibAEDispatch.h"
+#include <utility>
+
+#include "ZVWSLibAECall.h"
+#include "ZVWSLibAEPrefetch.h"
 
 using namespace ae::stagecraft;
 
@@ -35,7 +38,38 @@ void ZVWSLibAE::DestructInstance(StageWindow* /*window*/, ASObject& object)
 }
 
 ZVWSLibAE::ZVWSLibAE(StageWindow* /*window*/, ASObject& /*object*/, ASValueArray& /*arguments*/)
-    : m_State(std::make_unique<State>())
+    : m_Prefetcher(std::make_unique<Prefetcher>(*this)), m_Call(std::make_unique<ForegroundCall>())
 {}
 
-ZVWSLibAE::~ZVWSLibAE() = default;
+ZVWSLibAE::~ZVWSLibAE()
+{
+    m_Prefetcher->Stop();  // so that all workers break off at the same time
+}
+
+void ZVWSLibAE::OnUpdate(StageWindow* /*window*/, ASObject& object)
+{
+    if (!m_Call->HasResult()) {
+        m_Prefetcher->FetchBoxArtWhenIdle();
+        return;
+    }
+    object.StopUpdates();
+    const ASValue callback = m_Call->TakeCallback();
+    ZVThread::Sleep(10);  // movies rest on a result never coming at once
+
+    ASValueArray arguments;
+    if (callback.IsObject()) {
+        const Result& result = m_Call->GetResult();
+        m_Prefetcher->ResultComes(result);
+        ASValue value;
+        ZVWSLib::SetResult(result, value, *callback.GetObject());
+        arguments.Append(ASValue::Number(result.retCode));
+        arguments.Append(std::move(value));
+    }
+    ZVThread* const thread = m_Call->Finish();
+    // From here on a call is accepted; the callback may make one.
+    if (callback.IsObject()) {
+        ASValue ignored;
+        callback.GetObject()->Call("onComplete", arguments, ignored);
+    }
+    ZVThread::SafeDestroyThread(thread);
+}

@@ -1,21 +1,8 @@
 // The customer's account: purchases, wish list, billing.
 #include "ZVWSLibAEDispatch.h"
 
-void ZVWSLib::Remember(ZVWSLibAE::State& state, const Param_getMyVideos& param)
-{
-    state.m_Listing.m_PrefetchPurchaseType = param.purchasetype;
-    state.m_Listing.m_PrefetchTypeFilter = param.typefilter;
-    state.m_Listing.m_PrefetchWatchStatus = param.watchstatus;
-}
-
-void ZVWSLib::Remember(ZVWSLibAE::State& state, const Param_getWishlistItems& param)
-{
-    state.m_Listing.m_PrefetchSortOrder = param.sortorder;
-    state.m_Listing.m_PrefetchTypeFilter = param.typefilter;
-}
-
-ZVWS_ASYNC_LISTING(getMyVideos, Param_getMyVideos())
-ZVWS_ASYNC_LISTING(getWishlistItems, Param_getWishlistItems())
+ZVWS_ASYNC(getMyVideos, Param_getMyVideos())
+ZVWS_ASYNC(getWishlistItems, Param_getWishlistItems())
 ZVWS_ASYNC(addItemToWishlist, Param_OneInteger("titleid"))
 ZVWS_ASYNC(removeItemFromWishlist, Param_OneInteger("titleid"))
 ZVWS_ASYNC(removeAllItemsFromWishlist, Param_base())

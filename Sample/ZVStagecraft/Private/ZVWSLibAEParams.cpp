@@ -2,17 +2,19 @@
 
 using namespace ae::stagecraft;
 
-void PropertyReader::operator()(const char* name, AEArray<int>& field)
+bool PropertyReader::ReadArray(const char* name, AEArray<int>& field)
 {
     const uint32_t kMost = 10000;  // a script array can claim four thousand million elements
-    ASValue array;
-    m_Succeeded = m_Object.GetProperty(name, array) && array.IsObject() && array.GetObject()->IsInstanceOf("Array") &&
-                  array.GetObject()->GetLength() <= kMost;
-    if (!m_Succeeded) return;
-    const uint32_t length = array.GetObject()->GetLength();
-    for (uint32_t i = 0; i < length && i < kMost; ++i) {
+    ASValue property;
+    if (!m_Object.GetProperty(name, property) || !property.IsObject()) return false;
+    ASObject& array = *property.GetObject();
+    uint32_t length;
+    if (!array.IsInstanceOf("Array") || !array.GetUint("length", length) || length > kMost) return false;
+    for (uint32_t i = 0; i < length; ++i) {
         ASValue element;
-        if (!array.GetObject()->GetElement(i, element)) return;
-        field.Append(ASToInt32(m_Object.ToNumber(element)));
+        double number;
+        if (!array.GetElement(i, element) || !array.ToNumber(element, number)) return false;
+        field.Append(ASToInt32(number));
     }
+    return true;
 }

@@ -6,6 +6,7 @@
 #pragma once
 
 #include <tuple>
+#include <type_traits>
 
 #include "ZVWSLib.h"
 #include "ZV_WS_Records.h"
@@ -139,6 +140,10 @@ struct Param_One : Param_base {
 using Param_OneInteger = Param_One<int>;
 using Param_OneText = Param_One<AEString>;
 
+struct Param_getAllTvEpisodeListings : Param_OneInteger {
+    Param_getAllTvEpisodeListings() : Param_OneInteger("titleid") {}
+};
+
 /// Some properties are called otherwise than the fields they set.
 struct Param_init : Param_base {
     AEString APIKey;
@@ -175,7 +180,50 @@ struct Param_init : Param_base {
     }
 };
 
-/// Reads properties of a script object into fields of any type that occurs in a record. Main thread.
+// ---- A record's fields as arguments of a library call. Worker thread.
+
+namespace ZVWSLib {
+
+template <class Field>
+std::tuple<Field> Pass(const Field& field)
+{
+    return std::make_tuple(field);
+}
+inline std::tuple<const char*> Pass(const AEString& text)
+{
+    return std::make_tuple(text.c_str());
+}
+inline std::tuple<const ZV_WS_Pagination*> Pass(const ZV_WS_Pagination& page)
+{
+    return std::make_tuple(&page);
+}
+inline std::tuple<const int*, unsigned int> Pass(const AEArray<int>& numbers)
+{
+    return std::make_tuple(numbers.begin(), static_cast<unsigned int>(numbers.size()));
+}
+
+/// What a library call puts out: its last parameter points to one.
+template <class... Parameters>
+using OutputOf = std::remove_pointer_t<std::tuple_element_t<sizeof...(Parameters) - 1, std::tuple<Parameters...>>>;
+
+/// Calls the library with the record's fields.
+template <class Param, class... Parameters>
+ZV_WS_Status CallLibrary(ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...), ZV_WS_Session& session,
+                         const Param& param, OutputOf<Parameters...>& output)
+{
+    const auto with = [&](const auto&... fields) {
+        return std::apply(call, std::tuple_cat(std::make_tuple(&session), Pass(fields)..., std::make_tuple(&output)));
+    };
+    return std::apply(with, param.Arguments());
+}
+
+}  // namespace ZVWSLib
+
+// ---- Reading them
+
+/// Reads properties of a script object into fields of any type that occurs in a record. Main thread. Properties that
+/// are missing, undefined or null read as 0, "" and false. One that cannot be read (its getter throws, or the
+/// conversion of its value) is a failure; those after it are read all the same.
 class PropertyReader {
 public:
     explicit PropertyReader(ae::stagecraft::ASObject& object) : m_Object(object) {}
@@ -184,11 +232,14 @@ public:
     template <class Number>
     void operator()(const char* name, Number& field)
     {
-        field = static_cast<Number>(m_Object.GetInt(name));
+        int32_t number;
+        Require(m_Object.GetInt(name, number));
+        field = static_cast<Number>(number);
     }
-    void operator()(const char* name, bool& field) { field = m_Object.GetBoolean(name); }
-    void operator()(const char* name, AEString& field) { field = m_Object.GetText(name); }
-    void operator()(const char* name, AEArray<int>& field);
+    void operator()(const char* name, bool& field) { Require(m_Object.GetBoolean(name, field)); }
+    void operator()(const char* name, AEString& field) { Require(m_Object.GetText(name, field)); }
+    /// Must be there, and be an Array of at most 10000 elements, all of which can be read.
+    void operator()(const char* name, AEArray<int>& field) { Require(ReadArray(name, field)); }
 
     /// Two properties, whatever the field is called.
     void operator()(const char* /*name*/, ZV_WS_Pagination& page)
@@ -197,10 +248,13 @@ public:
         (*this)("ItemsPerPage", page.ItemsPerPage);
     }
 
-    /// false when a property cannot be taken at all: an array of integers that is none or endless.
+    /// Whether all properties could be read.
     bool Succeeded() const { return m_Succeeded; }
 
 private:
+    void Require(bool succeeded) { m_Succeeded = m_Succeeded && succeeded; }
+    bool ReadArray(const char* name, AEArray<int>& field);
+
     ae::stagecraft::ASObject& m_Object;
     bool m_Succeeded = true;
 };

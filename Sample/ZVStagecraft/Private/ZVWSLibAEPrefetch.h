@@ -1,81 +1,142 @@
 // Fetching ahead: the pages next to the one shown, on a worker and a library session of their own, and box art while
 // the user interface is idle. Nothing of it is shown: it fills the cache, from which the page that the user turns to
-// then comes.
+// then comes. A page that the user turns to while it is being fetched ahead is asked for a second time: the user's call
+// waits for nobody's.
 #pragma once
 
+#include <stdint.h>
+
+#include <atomic>
+
+#include "CacheInterface.h"
 #include "KernelMutex.h"
+#include "ZVThread.h"
 #include "ZVWSLibAE.h"
-#include "ZVWSLibAEParams.h"
+#include "ZVWSLibAEListings.h"
+#include "ZVWSLibAEPrefetchMgr.h"
 #include "ZVWSLibAEResult.h"
 
-/// Which pages of the listing shown last are in the cache, and which are to be fetched next. The owner's mutex guards
-/// the pages; any thread may mark one, all else is the main thread's.
-class ZVWSLibAE::PrefetchMgr {
-public:
-    /// At most so many pages are asked for at once.
-    static constexpr unsigned int m_kPrefetchPages = 8;
-
-    /// The owner's mutex, before anything else. Null is a usage fault.
-    void SetMutex(KernelMutex* mutex);
-
-    /// Tells which listing is shown. Another one than before starts afresh: its pages and the box art that waits are
-    /// forgotten. The numbers at the end are the listing's own (genre, filters).
-    void Update(AEArray<AEString>& waitingBoxArts, Result_Type type, unsigned int totalPages, unsigned int totalItems,
-                unsigned int itemsPerPage, int userdata1, int userdata2, int userdata3);
-
-    void MarkPagePrefetched(unsigned int page);
-
-    /// The pages around `current` that are not there yet, nearest first: next, previous, the one after next... The
-    /// listing closes to a circle. `pages` has room for `count`; null finds nothing.
-    void GetPagesForPrefetch(unsigned int current, unsigned int count, unsigned int* pages, unsigned int& found);
-
-    unsigned int NextPage(unsigned int page) const { return page + 1 > m_TotalPages ? 1 : page + 1; }
-    unsigned int PrevPage(unsigned int page) const { return page == 1 ? m_TotalPages : page - 1; }
-
-private:
-    typedef AEArray<unsigned int> Pages;
-
-    bool IsPageAlreadyPrefetched(unsigned int page) const ZV_REQUIRES(*m_Mutex);
-    /// The pages `count` steps on from `current` (or back), those that are there left out.
-    Pages Scan(unsigned int current, unsigned int count, bool forward) const ZV_REQUIRES(*m_Mutex);
-
-    KernelMutex* m_Mutex = nullptr;
-    Result_Type m_type = eVoid;
-    unsigned int m_TotalPages = 0;
-    unsigned int m_TotalItems = 0;
-    unsigned int m_ItemsPerPage = 0;
-    int m_userdata1 = 0;
-    int m_userdata2 = 0;
-    int m_userdata3 = 0;
-    unsigned int m_LastPageNumber = 0;
-    Pages m_PrefetchedPages ZV_GUARDED_BY(*m_Mutex);
-};
-
-// ---- What the workers get; theirs to delete.
-
-struct Param_prefetch_getTitles : Param_getTitles {
-    AEArray<unsigned int> prefetchpages;
-};
-struct Param_prefetch_getMyVideos : Param_getMyVideos {
-    AEArray<unsigned int> prefetchpages;
-};
-struct Param_prefetch_getWishlistItems : Param_getWishlistItems {
-    AEArray<unsigned int> prefetchpages;
-};
+/// What the worker of box art gets; its own to delete.
 struct Param_prefetch_getBoxArts : Param_base {
     ZV_WS_BoxArtSize boxartsize = BOX_ART_SIZE_95;
     AEArray<AEString> boxartprefixs;
 };
 
+/// Main thread, unless a member says otherwise.
+class ZVWSLibAE::Prefetcher {
+public:
+    explicit Prefetcher(ZVWSLibAE& owner);
+    /// Breaks off what is being fetched and waits for the workers.
+    ~Prefetcher();
+    Prefetcher(const Prefetcher&) = delete;
+    Prefetcher& operator=(const Prefetcher&) = delete;
+
+    /// Breaks off what is being fetched, for good, and returns at once.
+    void Stop();
+
+    // ---- Set-up
+
+    /// Takes over what another instance's "init" and "getBoxArtImage" set.
+    void CopySettings(const Prefetcher& source) { m_Settings = source.m_Settings; }
+    /// Duplicates the sessions that fetch ahead from the instance's own, as far as there is a file cache for their
+    /// kinds of data. The thread that uses the instance's session.
+    void OpenSessions(const ZV_WS_Session& source);
+
+    // ---- What the script does
+
+    /// A foreground call starts with these parameters: the user interface is not idle.
+    template <class Param>
+    void CallStarts(const Param& param)
+    {
+        m_FlashIdle = false;
+        m_NeedPrefetchTitles = false;
+        Remember(param);
+    }
+    /// Set by the worker of a listing call whose status is 0, before it publishes the result. Foreground worker.
+    void ListingAnswered() { m_NeedPrefetchTitles = true; }
+    /// A foreground call is about to be delivered: starts to fetch the pages around the one that it shows, unless
+    /// others still are.
+    void ResultComes(const Result& shown);
+
+    void SetIdle() { m_FlashIdle = true; }
+    /// On a tick without a result: fetches one image that waits, when the script is idle.
+    void FetchBoxArtWhenIdle();
+
+    // ---- Workers
+
+    /// Fetches each page into the cache. Ends early when the instance does, and at a page that cannot be had: the store
+    /// is not to be bothered for pages that nobody asked for while it fails. Prefetch worker.
+    template <class Request>
+    static void FetchPages(void* argument);
+    /// Prefetch worker.
+    static void FetchBoxArts(void* argument);
+
+private:
+    /// What "clone" takes over.
+    struct Settings {
+        CacheType m_CurrentCacheType = CacheType_None;
+        unsigned int m_CurrentCacheData = 0;
+        ZV_WS_BoxArtSize m_PrefetchBoxArtSize = BOX_ART_SIZE_95;
+    };
+
+    /// The listing that was asked for last.
+    struct LastListing {
+        ListingRequest request;
+        uint64_t drops = 0;  ///< CacheInterface::Drops() when it was.
+    };
+
+    // Most calls are no listings.
+    void Remember(const Param_base&) {}
+    void Remember(const Param_init& param);
+    void Remember(const Param_getBoxArtImage& param);
+    template <class Request>
+    std::enable_if_t<kIsListing<Request>> Remember(const Request& request)
+    {
+        m_LastListing = {request, CacheInterface::Drops()};
+    }
+
+    bool Caches(ZV_WS_CacheParam::CacheData kind) const;
+    ZV_WS_Session& SessionFor(ZV_WS_CacheParam::CacheData kind);
+
+    void FetchAround(const std::monostate&, const Result&) {}
+    /// The image of the first listing is on the screen already.
+    void FetchAround(const Param_getAllTvEpisodeListings& request, const Result& shown);
+    template <class Request>
+    void FetchAround(const Request& request, const Result& shown);
+
+    /// Starts a worker that fetches ahead, in the slot of its kind: "prefetch_getTitles" for pages, else box art. The
+    /// one before in that slot must have ended. The worker owns `param`.
+    void RunPrefetchThread(const char* name, void (*function)(void*), void* param);
+
+    /// What waits already keeps its place. Any thread.
+    void AddWaitingForDownloadBoxArts(const AEArray<AEString>& prefixes);
+    /// Empties the list. Any thread.
+    AEArray<AEString> TakeWaitingForDownloadBoxArts();
+
+    ZVWSLibAE& m_Owner;
+    Settings m_Settings;
+    LastListing m_LastListing;
+    bool m_FlashIdle = false;
+    std::atomic<bool> m_NeedPrefetchTitles{false};
+    // Set for the whole life of the worker, which clears it as its last act on the instance.
+    std::atomic<bool> m_PrefetchTitlesIsRunning{false};
+    std::atomic<bool> m_PrefetchBoxArtsIsRunning{false};
+    std::atomic<bool> m_StopPrefetch{false};
+
+    // A worker's while it runs. Empty where nothing is fetched ahead.
+    ZV_WS_Session m_PrefetchTitlesSession;
+    ZV_WS_Session m_PrefetchBoxArtsSession;
+    ZV_WS_Session m_PrefetchUserDataSession;
+
+    KernelMutex m_Mutex;
+    ZVThread* m_PrefetchTitlesThread ZV_GUARDED_BY(m_Mutex) = nullptr;
+    ZVThread* m_PrefetchBoxArtsThread ZV_GUARDED_BY(m_Mutex) = nullptr;
+    AEArray<AEString> m_WaitingForDownloadBoxArts ZV_GUARDED_BY(m_Mutex);
+    PrefetchMgr m_PrefetchMgr;
+};
+
 namespace ZVWSLib {
 
-/// Gives an instance with a file cache the sessions that fetch ahead, as far as its kinds of data are cached.
-void DuplicatePrefetchSessions(ZVWSLibAE::State& state);
-
-/// After a listing was answered, before it is delivered: starts to fetch the pages around it. Main thread.
-void SchedulePrefetch(ZVWSLibAE& instance);
-
-/// On a tick without a result: fetches one image that waits, when the script is idle. Main thread.
-void FetchBoxArtWhenIdle(ZVWSLibAE& instance);
+void prefetch_getBoxArts(void* param);
 
 }  // namespace ZVWSLib

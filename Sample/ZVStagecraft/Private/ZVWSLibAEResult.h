@@ -1,7 +1,7 @@
 // What a worker found out, and how it becomes a script value.
 //
 // A Result is written by the worker, then read by the main thread; the order is kept by the flag that goes with it
-// (ZVWSLibAE::State::m_NeedFireEvent).
+// (ZVWSLibAE::ForegroundCall).
 #pragma once
 
 #include <stdint.h>

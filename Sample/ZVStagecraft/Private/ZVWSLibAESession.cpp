@@ -8,12 +8,6 @@ ZV_LOG_AREA(ZVWSAELOG_AREA_NAME)
 
 namespace ZVWSLib {
 
-void Remember(ZVWSLibAE::State& state, const Param_init& param)
-{
-    state.m_Listing.m_CurrentCacheType = param.CacheType;
-    state.m_Listing.m_CurrentCacheData = param.CacheData;
-}
-
 namespace {
 
 ZV_WS_SetupParams SetupOf(const Param_init& param)
@@ -50,15 +44,18 @@ void init(void* argument)
     const std::unique_ptr<Param_init> param(static_cast<Param_init*>(argument));
     ZV_ASSERT(param != nullptr);
     ZV_ASSERT(param->pZVWSLibAE != nullptr);
-    ZVWSLibAE::State& state = param->pZVWSLibAE->GetState();
+    ZVWSLibAE::ForegroundCall& call = param->pZVWSLibAE->GetCall();
     const ZV_WS_SetupParams setup = SetupOf(*param);
-    const ZV_WS_Status status = ZV_WS_initialize(&state.m_Session, &setup);
+    const ZV_WS_Status status = ZV_WS_initialize(&call.Session(), &setup);
     LogStatus("init", status);
     const bool succeeded = status == ZV_WS_Status_ok;
-    if (!succeeded) ZV_WS_release(&state.m_Session);  // one failure leaves something behind
-    if (succeeded) DuplicatePrefetchSessions(state);
-    state.m_Init = succeeded;
-    state.Publish(succeeded, status);
+    if (succeeded) {
+        param->pZVWSLibAE->GetPrefetcher().OpenSessions(call.Session());
+    } else {
+        ZV_WS_release(&call.Session());  // one failure leaves something behind
+    }
+    call.SetInitialized(succeeded);
+    call.Publish(succeeded, status);
 }
 
 }  // namespace ZVWSLib
@@ -66,7 +63,7 @@ void init(void* argument)
 void ZVWSLibAE::init(StageWindow* /*window*/, ASObject& object, ASValueArray& arguments, ASValue& returnValue)
 {
     const ZVWSAELog scope("ZVWSLibAE", "init", GetZV_LogAreaID());
-    if (m_State->m_Init) {
+    if (m_Call->IsInitialized()) {
         ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "ZVWSLibAE::init left since Already initialized!\n");
         returnValue = ASValue::Number(kStarted);
         return;
@@ -82,26 +79,26 @@ ZVWSLibAE* SourceOfClone(ZVWSLibAE& self, ASValueArray& arguments)
 {
     if (arguments.size() != 1 || !arguments[0].IsObject()) return nullptr;
     auto* source = dynamic_cast<ZVWSLibAE*>(arguments[0].GetObject()->GetExtensionInstance());
-    return source && source != &self && source->GetState().m_Init ? source : nullptr;
+    return source && source != &self && source->GetCall().IsInitialized() ? source : nullptr;
 }
 
 ZVWSLibAE::ReturnCode Clone(ZVWSLibAE& self, ASValueArray& arguments)
 {
-    ZVWSLibAE::State& state = self.GetState();
-    if (state.m_Init) return ZVWSLibAE::kAlreadyInitialized;
-    if (state.IsBusy()) return ZVWSLibAE::kBusy;  // its "init" uses the session
+    ZVWSLibAE::ForegroundCall& call = self.GetCall();
+    if (call.IsInitialized()) return ZVWSLibAE::kAlreadyInitialized;
+    if (call.IsBusy()) return ZVWSLibAE::kBusy;  // its "init" uses the session
     ZVWSLibAE* source = SourceOfClone(self, arguments);
     if (!source) return ZVWSLibAE::kWrongArguments;
 
-    // A session serves one thread at a time, and the worker of a busy source has it.
-    if (source->GetState().IsBusy()) return ZVWSLibAE::kDuplicateFailed;
-    if (ZV_WS_duplicate(&state.m_Session, &source->GetState().m_Session) != ZV_WS_Status_ok) {
-        ZV_WS_release(&state.m_Session);
+    // The source's worker may be using its session. All else that is read of the source is the main thread's.
+    if (ZV_WS_duplicate(&call.Session(), &source->GetCall().Session()) != ZV_WS_Status_ok) {
+        ZV_WS_release(&call.Session());
         return ZVWSLibAE::kDuplicateFailed;
     }
-    state.m_Listing = source->GetState().m_Listing;
-    ZVWSLib::DuplicatePrefetchSessions(state);
-    state.m_Init = true;
+    ZVWSLibAE::Prefetcher& prefetcher = self.GetPrefetcher();
+    prefetcher.CopySettings(source->GetPrefetcher());
+    prefetcher.OpenSessions(call.Session());
+    call.SetInitialized(true);
     return ZVWSLibAE::kStarted;
 }
 

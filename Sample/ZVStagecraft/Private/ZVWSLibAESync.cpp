@@ -28,7 +28,7 @@ AEString TextOf(ASObject& object, const ASValueArray& arguments, size_t index)
 void ZVWSLibAE::idle(StageWindow* /*window*/, ASObject& object, ASValueArray& /*arguments*/, ASValue& returnValue)
 {
     const ZVWSAELog scope("ZVWSLibAE", "idle", GetZV_LogAreaID());
-    m_State->m_FlashIdle = true;
+    m_Prefetcher->SetIdle();
     object.StartUpdates();
     returnValue = ASValue::Number(0);
 }
@@ -117,7 +117,7 @@ void ZVWSLibAE::getUserAgent(StageWindow* /*window*/, ASObject& /*object*/, ASVa
 {
     const ZVWSAELog scope("ZVWSLibAE", "getUserAgent", GetZV_LogAreaID());
     ZV_WS_String text;
-    if (m_State->m_Init) ZV_WS_getUserAgent(&m_State->m_Session, &text);
+    if (m_Call->IsInitialized()) ZV_WS_getUserAgent(&m_Call->Session(), &text);
     returnValue = ASValue::String(text.data ? text.data : "");
     ZV_WS_release(&text);
 }
@@ -127,7 +127,7 @@ void ZVWSLibAE::getDeviceEnv(StageWindow* /*window*/, ASObject& /*object*/, ASVa
 {
     const ZVWSAELog scope("ZVWSLibAE", "getDeviceEnv", GetZV_LogAreaID());
     ZV_WS_EnvID env = ENVID_APISTG;
-    const bool known = m_State->m_Init && ZV_WS_getDeviceEnv(&m_State->m_Session, &env) == ZV_WS_Status_ok;
+    const bool known = m_Call->IsInitialized() && ZV_WS_getDeviceEnv(&m_Call->Session(), &env) == ZV_WS_Status_ok;
     returnValue = ASValue::Number(known ? static_cast<int>(env) : static_cast<int>(kNotInitialized));
 }
 
@@ -136,11 +136,11 @@ void ZVWSLibAE::getDeviceEnv(StageWindow* /*window*/, ASObject& /*object*/, ASVa
 namespace {
 
 // The environment that the service assigns to the device; -1 when it cannot be asked now.
-int DefaultEnvironment(ZVWSLibAE::State& state)
+int DefaultEnvironment(ZVWSLibAE::ForegroundCall& call)
 {
     ZV_WS_EnvID env = ENVID_APISTG;
     const bool known =
-        state.m_Init && !state.IsBusy() && ZV_WS_getDefaultEnvID(&state.m_Session, &env) == ZV_WS_Status_ok;
+        call.IsInitialized() && !call.IsBusy() && ZV_WS_getDefaultEnvID(&call.Session(), &env) == ZV_WS_Status_ok;
     return known ? env : -1;
 }
 
@@ -161,7 +161,7 @@ void ZVWSLibAE::getAvailableEnvLists(StageWindow* /*window*/, ASObject& object, 
     const ZVWSAELog scope("ZVWSLibAE", "getAvailableEnvLists", GetZV_LogAreaID());
     ZV_WS_EnvironmentLists list;
     ZV_WS_getAvailableEnvLists(&list);
-    const int defaultEnvironment = DefaultEnvironment(*m_State);
+    const int defaultEnvironment = DefaultEnvironment(*m_Call);
 
     if (!object.Construct("Array", ASValueArray(), returnValue) || !returnValue.IsObject()) return;
     ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "<<==========Available EnvLists (%d)===========\n",
@@ -207,12 +207,23 @@ int InitLogsAs(ZVString given)
 }
 
 // What the movie asks for. The log file stands beside the settings.
-int InitLogs(ASObject& settings)
+struct LogSettings {
+    AEString LogAreaIDs;
+    AEString LogTarget;
+    AEString SettingsFile;
+    AEString PreferenceFile;
+    ZVWS_PROPERTIES(LogAreaIDs, LogTarget, SettingsFile, PreferenceFile)
+};
+
+int InitLogs(ASObject& object)
 {
-    const unsigned int areas = NumberOf(settings.GetText("LogAreaIDs").c_str());
-    const auto target = static_cast<unsigned char>(NumberOf(settings.GetText("LogTarget").c_str()));
-    for (const char* property : {"SettingsFile", "PreferenceFile"}) {
-        const AEString path = settings.GetText(property);
+    LogSettings settings;
+    PropertyReader reader(object);
+    settings.ReadWith(reader);
+    if (!reader.Succeeded()) return ZVWSLibAE::kWrongArguments;
+    const unsigned int areas = NumberOf(settings.LogAreaIDs.c_str());
+    const auto target = static_cast<unsigned char>(NumberOf(settings.LogTarget.c_str()));
+    for (const AEString& path : {settings.SettingsFile, settings.PreferenceFile}) {
         if (!strchr(path.c_str(), ZVFile::PATH_SEPERATOR)) continue;
         return ZVWSAELog::InitWSLogs(areas, target, ZVFile::GetFolderName(path.c_str()).c_str());
     }

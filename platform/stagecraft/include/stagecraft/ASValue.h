@@ -66,13 +66,15 @@ public:
     // has not returned, and after DestructInstance.
     virtual ASExtensionClass* GetExtensionInstance() = 0;
 
-    // A property that does not exist reads as undefined, with true.
+    // A property that does not exist reads as undefined, with true. A symbol, which is no value to native code, is a
+    // failure.
     virtual bool GetProperty(const char* pName, ASValue& value) = 0;
     // Properties are enumerated in the order in which they were first set.
     virtual bool SetProperty(const char* pName, const ASValue& value) = 0;
-    // The "length" of an array; 0 when the object has none that is a number.
+    // The "length" of an array; 0 when the object has none that is a number, also when it cannot be read, which
+    // GetUint("length", ...) tells.
     virtual uint32_t GetLength() = 0;
-    // An index past the end reads as undefined, with true.
+    // An index past the end reads as undefined, with true. A symbol is a failure.
     virtual bool GetElement(uint32_t index, ASValue& value) = 0;
 
     // Calls the object's own or inherited function of that name with this object as "this". false also when there is no
@@ -94,16 +96,41 @@ public:
     virtual double ToNumber(const ASValue& value) = 0;
     virtual bool ToText(const ASValue& value, AEString& text) = 0;
 
-    // ---- A property read and converted at once. A property that does not exist, is undefined or is null reads as 0,
-    // false and "".
-    inline double GetNumber(const char* pName);
-    int32_t GetInt(const char* pName) { return ASToInt32(GetNumber(pName)); }
-    uint32_t GetUint(const char* pName) { return ASToUint32(GetNumber(pName)); }
-    inline bool GetBoolean(const char* pName);
-    inline AEString GetText(const char* pName);
+    // ---- What follows rests on the operations above: a runtime adds nothing to it.
+
+    // The same number; false, with NaN, when the conversion failed, which NaN alone does not tell. An object is
+    // converted once, by the movie's own class Number.
+    inline bool ToNumber(const ASValue& value, double& number);
+
+    // ---- A property read and converted at once; the property is read once and its value converted once. A property
+    // that does not exist, is undefined or is null reads as 0, false and "", with true. false, and 0, false or "", when
+    // the property cannot be read: its getter or the conversion of its value fails.
+    inline bool GetNumber(const char* pName, double& number);
+    inline bool GetInt(const char* pName, int32_t& number);
+    inline bool GetUint(const char* pName, uint32_t& number);
+    // Settings arrive as texts as often as not, so this is not the script's own truth: false are false, 0, NaN, and the
+    // texts "", "0" and "false"; every other boolean, number and text is true. An object counts as what its valueOf
+    // returns (new Boolean(false) is false), and when that is an object as its text ({} is true, [] is false).
+    inline bool GetBoolean(const char* pName, bool& flag);
+    inline bool GetText(const char* pName, AEString& text);
+
+    // ---- Likewise for callers to whom a property that cannot be read is as good as none.
+    double GetNumber(const char* pName) { return Read(&ASObject::GetNumber, pName, 0.0); }
+    int32_t GetInt(const char* pName) { return Read(&ASObject::GetInt, pName, 0); }
+    uint32_t GetUint(const char* pName) { return Read(&ASObject::GetUint, pName, 0u); }
+    bool GetBoolean(const char* pName) { return Read(&ASObject::GetBoolean, pName, false); }
+    AEString GetText(const char* pName) { return Read(&ASObject::GetText, pName, AEString()); }
 
 protected:
     virtual ~ASObject() {}
+
+private:
+    template <class Value>
+    Value Read(bool (ASObject::*get)(const char*, Value&), const char* pName, Value value)
+    {
+        (this->*get)(pName, value);
+        return value;
+    }
 };
 
 // A script value.
@@ -168,7 +195,7 @@ public:
     const AEString& GetString() const { return m_text; }
     ASObject* GetObject() const { return m_pObject; }  // borrowed: AddRef to keep it beyond this value
 
-    // The script's truth: false for undefined, null, false, 0, NaN and "".
+    // The script's truth: false for undefined, null, false, 0, NaN and "". ASObject::GetBoolean has a rule of its own.
     bool ToBoolean() const
     {
         switch (m_type) {
@@ -201,24 +228,68 @@ private:
     ASObject* m_pObject = nullptr;
 };
 
-inline double ASObject::GetNumber(const char* pName)
+inline bool ASObject::ToNumber(const ASValue& value, double& number)
 {
-    ASValue value;
-    return GetProperty(pName, value) && !value.IsUndefinedOrNull() ? ToNumber(value) : 0;
+    ASValue converted = value;
+    if (value.IsObject()) {
+        ASValueArray arguments;
+        arguments.Append(value);
+        Construct("Number", arguments, converted);
+    }
+    number = ToNumber(converted);
+    return !value.IsObject() || converted.IsObject();
 }
 
-inline bool ASObject::GetBoolean(const char* pName)
+inline bool ASObject::GetNumber(const char* pName, double& number)
 {
     ASValue value;
-    return GetProperty(pName, value) && value.ToBoolean();
+    number = 0;
+    if (!GetProperty(pName, value)) return false;
+    if (value.IsUndefinedOrNull() || ToNumber(value, number)) return true;
+    number = 0;
+    return false;
 }
 
-inline AEString ASObject::GetText(const char* pName)
+inline bool ASObject::GetInt(const char* pName, int32_t& number)
 {
-    ASValue value;
+    double wide;
+    const bool succeeded = GetNumber(pName, wide);
+    number = ASToInt32(wide);
+    return succeeded;
+}
+
+inline bool ASObject::GetUint(const char* pName, uint32_t& number)
+{
+    double wide;
+    const bool succeeded = GetNumber(pName, wide);
+    number = ASToUint32(wide);
+    return succeeded;
+}
+
+inline bool ASObject::GetBoolean(const char* pName, bool& flag)
+{
+    ASValue property, value;
     AEString text;
-    if (GetProperty(pName, value) && !value.IsUndefinedOrNull()) ToText(value, text);
-    return text;
+    flag = false;
+    if (!GetProperty(pName, property)) return false;
+    if (!property.IsObject()) {
+        value = property;
+    } else if (!property.GetObject()->Call("valueOf", ASValueArray(), value)) {
+        return false;
+    }
+    if (value.IsObject()) {
+        if (!ToText(value, text)) return false;
+        value = ASValue::String(text);
+    }
+    flag = value.ToBoolean() && value.GetString() != "0" && value.GetString() != "false";
+    return true;
+}
+
+inline bool ASObject::GetText(const char* pName, AEString& text)
+{
+    ASValue value;
+    text = AEString();
+    return GetProperty(pName, value) && (value.IsUndefinedOrNull() || ToText(value, text));
 }
 
 }  // namespace stagecraft
