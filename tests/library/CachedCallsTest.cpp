@@ -3,6 +3,7 @@
 #include <fstream>
 #include <functional>
 
+#include "SessionImpl.h"
 #include "Store.h"
 #include "TempFolder.h"
 
