@@ -20,9 +20,9 @@ ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_P
                      purchaseType, typeFilter, watchStatus);
     }
     SetPage(call, *page);
-    SetEnum(call->PurchaseType, purchaseType);
-    SetEnum(call->TitleType, typeFilter);
-    SetEnum(call->WatchStatusFilter, watchStatus);
+    call.SetEnum(call->PurchaseType, purchaseType);
+    call.SetEnum(call->TitleType, typeFilter);
+    call.SetEnum(call->WatchStatusFilter, watchStatus);
     return call.Into(videos);
 }
 
@@ -81,7 +81,7 @@ ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* passw
 {
     ServiceCall<Operation::removeAllMyPurchases> call(__func__, handle, answer);
     if (!call.Accepts(password && *password)) return call.Refusal();
-    call->password = Text(password);
+    call.SetText(call->password, password);
     const ZV_WS_Status status = call.Into(answer);
     DropStale(call, kVideosTable);
     return status;
@@ -90,7 +90,16 @@ ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* passw
 ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
                                                  ZV_WS_CheckAdultVerificationEnabledResponse* answer)
 {
-    return Ask<Operation::checkAdultVerificationEnabled>(__func__, handle, answer);
+    using Op = Operation::checkAdultVerificationEnabled;
+    ServiceCall<Op> call(__func__, handle, answer);
+    if (!call.Accepts()) return call.Refusal();
+    // What cannot be read must not pass for "no check wanted".
+    return call.Into([&](const ServiceCall<Op>::Answer* result) {
+        bool isEnabled = false;
+        const bool isReadable = ZVUtilities::ReadFlag(result->IsAdultVerificationEnabled, isEnabled);
+        if (isReadable) ZVUtilities::Convert(result, *answer);
+        return isReadable;
+    });
 }
 
 ZV_WS_Status ZV_WS_checkAdultVerificationPin(ZV_WS_Session* handle, int pin,
@@ -131,7 +140,7 @@ ZV_WS_Status ZV_WS_assignGiftCertificateToUser(ZV_WS_Session* handle, const char
 {
     ServiceCall<Operation::assignGiftCertificateToUser> call(__func__, handle, answer);
     if (!call.Accepts()) return call.Refusal();
-    call->GiftCertificateCode = Text(code);
+    call.SetText(call->GiftCertificateCode, code);
     return call.Into(answer);
 }
 
@@ -141,8 +150,8 @@ ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, cons
     ServiceCall<Operation::doPurchaseSavedbilling> call(__func__, handle, purchase);
     if (!call.Accepts()) return call.Refusal();
     call->SkuID = skuID;
-    call->IPAddress = Text(ipAddress);
-    call->UsePrePaidFunds = Text(usePrepaidFund ? "yes" : "no");
+    call.SetText(call->IPAddress, ipAddress);
+    call.SetText(call->UsePrePaidFunds, usePrepaidFund ? "yes" : "no");
     const ZV_WS_Status status = call.Into(purchase);
     DropStale(call, kVideosTable);
     return status;

@@ -25,7 +25,7 @@ ZV_WS_Status ZV_WS_shouldUpdateCache(ZV_WS_Session* handle, const char* utcTime,
 {
     ServiceCall<Operation::shouldUpdateCache> call(__func__, handle, should);
     if (!call.Accepts(utcTime && *utcTime)) return call.Refusal();
-    call->UTCTime = Text(utcTime);
+    call.SetText(call->UTCTime, utcTime);
     const ZV_WS_Status status = call.Into([&](const int* answer) { *should = *answer == 1; });
     return LogAnswer(__func__, status, *should);
 }

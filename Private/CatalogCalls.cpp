@@ -21,7 +21,7 @@ ZV_WS_Status ZV_WS_getTitles(ZV_WS_Session* handle, int genreID, const ZV_WS_Pag
     call.CacheAs(kMetadata, "getTitles", genreID, page->CurrentPageNumber, page->ItemsPerPage, purchaseType);
     call->GenreID = genreID;
     SetPage(call, *page);
-    SetEnum(call->PurchaseType, purchaseType);
+    call.SetEnum(call->PurchaseType, purchaseType);
     return call.Into(titles);
 }
 
@@ -34,7 +34,7 @@ ZV_WS_Status ZV_WS_getTitlesByGenreIDs(ZV_WS_Session* handle, const int* genreID
     ZV1__ArrayOfInt ids = BorrowedInts(genreIDs, count);
     call->GenreIDs = &ids;
     SetPage(call, *page);
-    SetEnum(call->PurchaseType, purchaseType);
+    call.SetEnum(call->PurchaseType, purchaseType);
     return call.Into(titles);
 }
 
@@ -75,7 +75,7 @@ ZV_WS_Status ZV_WS_translateTivoExternalID(ZV_WS_Session* handle, const char* ex
     ServiceCall<Operation::translateTivoExternalId> call(__func__, handle, title);
     if (!call.Accepts()) return call.Refusal();
     call.CacheAs(kMetadata, "translateTivoExternalID", externalID);
-    call->TivoExternalId = Text(externalID);
+    call.SetText(call->TivoExternalId, externalID);
     return call.Into(title);
 }
 
@@ -88,10 +88,10 @@ static ZV_WS_Status Search(const char* function, const char* table, ZV_WS_Sessio
     ServiceCall<Op> call(function, handle, titles);
     if (!call.Accepts(IsPage(page))) return call.Refusal();
     call.CacheAs(kMetadata, table, page->CurrentPageNumber, page->ItemsPerPage, purchaseType, typeFilter, query);
-    call->Query = Text(query);
+    call.SetText(call->Query, query);
     SetPage(call, *page);
-    SetEnum(call->PurchaseType, purchaseType);
-    SetEnum(call->TitleType, typeFilter);
+    call.SetEnum(call->PurchaseType, purchaseType);
+    call.SetEnum(call->TitleType, typeFilter);
     return call.Into(titles);
 }
 

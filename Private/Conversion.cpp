@@ -1,5 +1,10 @@
 #include "Conversion.h"
 
+#include <libxml/parser.h>
+#include <string.h>
+
+#include <memory>
+
 #include "Records.h"
 #include "ZVAssert.h"
 #include "ZVUtilities.h"
@@ -15,6 +20,29 @@ void Copy(const From& from, To& to)
     } else {
         to = static_cast<To>(from);
     }
+}
+
+// The text of an element with that content, without white space around it. False for anything but text.
+bool TextOfXml(const char* content, ZVString& text)
+{
+    const ZVString whole = ZVString("<a>") + content + "</a>";
+    const std::unique_ptr<xmlDoc, void (*)(xmlDoc*)> document(
+        xmlReadMemory(whole.c_str(), static_cast<int>(whole.length()), nullptr, "UTF-8",
+                      XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING | XML_PARSE_NOCDATA),
+        xmlFreeDoc);
+    if (!document) return false;
+    ZVString found;
+    for (const xmlNode* node = xmlDocGetRootElement(document.get())->children; node; node = node->next) {
+        if (node->type == XML_TEXT_NODE) found += reinterpret_cast<const char*>(node->content);
+        if (node->type == XML_ELEMENT_NODE || node->type == XML_ENTITY_REF_NODE) return false;
+    }
+    static const char kBlanks[] = " \t\r\n";
+    const char* const begin = found.c_str() + strspn(found.c_str(), kBlanks);
+    const char* end = found.c_str() + found.length();
+    while (end > begin && strchr(kBlanks, end[-1]))
+        --end;
+    text = ZVString(begin, static_cast<size_t>(end - begin));
+    return true;
 }
 
 // The elements of an array, each through its Convert; the service may send an element marked as nil, which stays empty.
@@ -34,6 +62,16 @@ void CopyElements(int count, From* from, unsigned int& size, To*& to)
 }  // namespace
 
 namespace ZVUtilities {
+
+bool ReadFlag(const char* xml, bool& flag)
+{
+    flag = false;
+    ZVString text;
+    if (!xml) return true;
+    if (!TextOfXml(xml, text)) return false;
+    flag = Str2Bool(text.c_str()) || text == "1";
+    return flag || text == "false" || text == "0";
+}
 
 // A conversion's head, and a conversion that copies members of the same name.
 #define ZV_CONVERT(From, To) void ZV1__##From##2ZV_WS_##To(const ZV1__##From* t, ZV_WS_##To& to)
@@ -229,7 +267,7 @@ ZV_CONVERT(CheckAdultVerificationEnabledResponse, CheckAdultVerificationEnabledR
 {
     ZV_ASSERT(t != 0);
     ZV_COPY(ResponseCode, ResponseMessage)
-    to.IsAdultVerificationEnabled = Str2Bool(t->IsAdultVerificationEnabled);
+    ReadFlag(t->IsAdultVerificationEnabled, to.IsAdultVerificationEnabled);
 }
 
 ZV_CONVERT_MEMBERS(CheckAdultVerificationPinResponse, CheckAdultVerificationPinResponse, ResponseCode, ResponseMessage,

@@ -67,6 +67,9 @@ ZV_CONVERSION(THXMediaDirectorResponse, THXMediaDirectorResponse)
 
 #undef ZV_CONVERSION
 
+/// A flag that came as XML of any content (null: none came, which is false). False when it says neither yes nor no.
+bool ReadFlag(const char* xml, bool& flag);
+
 /// Answers that are a bare number, flag or enumeration.
 inline void Convert(const bool* t, bool& to)
 {

@@ -23,7 +23,7 @@ ZV_WS_Status ZV_WS_authorizeDevice(ZV_WS_Session* handle, const char* pin, ZV_WS
 {
     ServiceCall<Operation::authorizeDevice> call(__func__, handle, answer);
     if (!call.Accepts(pin && *pin)) return call.Refusal();
-    call->PIN = Text(pin);
+    call.SetText(call->PIN, pin);
     const ZV_WS_Status status = call.Into(answer);
     if (status != ZV_WS_Status_ok) return status;
     return ChangeAccount(call.session(), answer->AuthToken ? answer->AuthToken : "");
@@ -41,7 +41,7 @@ ZV_WS_Status ZV_WS_checkAuthToken(ZV_WS_Session* handle, bool* isValid)
     if (!call.Accepts()) return call.Refusal();
     ZVString token;
     if (!WithinMemory([&] { token = call.session().m_Params.Customer->Token(); })) return ZV_WS_Status_general_error;
-    call->AuthToken = Text(token.c_str());
+    call.SetText(call->AuthToken, token.c_str());
     return LogAnswer(__func__, call.Into(isValid), *isValid);
 }
 
@@ -66,7 +66,7 @@ ZV_WS_Status ZV_WS_setAudioDefaultProperty(ZV_WS_Session* handle, ZV_WS_AudioPro
 {
     ServiceCall<Operation::setAudioDefaultProperty> call(__func__, handle, answer);
     if (!call.Accepts()) return call.Refusal();
-    SetEnum(call->AudioSetting, profile);
+    call.SetEnum(call->AudioSetting, profile);
     return call.Into(answer);
 }
 

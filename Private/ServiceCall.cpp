@@ -1,5 +1,10 @@
 #include "ServiceCall.h"
 
+#include <stdio.h>
+#include <string.h>
+
+#include <algorithm>
+
 #include "ZV_Log.h"
 
 ZV_LOG_AREA(ZVWS_SoapProxyLOG_AREA_NAME)
@@ -11,6 +16,16 @@ ServiceCallBase::ServiceCallBase(const char* function, const ZV_WS_Session* hand
 void ServiceCallBase::LogProxy(const char* verb, const char* proxy, const char* operation)
 {
     ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "%s %s::%s\n", verb, proxy, operation);
+}
+
+// The toolkit stops behind the element, whose name and text it still has.
+void ServiceCallBase::LogUnreadable(const soap& context, const char* operation, int result)
+{
+    if (result != SOAP_TYPE && result != SOAP_EMPTY) return;
+    char text[100];
+    snprintf(text, sizeof text, "%.99s", context.tmpbuf);
+    std::replace_if(text, text + strlen(text), [](unsigned char c) { return c < 0x20 || c == 0x7f; }, '?');
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR, "%s, cannot read \"%s\" in %s\n", operation, text, context.tag);
 }
 
 ZV_WS_Status ServiceCallBase::Finish(soap& context, const Outcome& outcome)

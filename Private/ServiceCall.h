@@ -7,12 +7,14 @@
 //     return call.Into(listing);
 //
 // The first line empties and tags the output, so that it can be released however the call ends. Then the call's own
-// argument checks, where the cache keeps the answer (if it does), and the request's children. Into looks there, or
+// argument checks, where the cache keeps the answer (if it does), and the request's children; texts and enumerations go
+// through SetText and SetEnum, which notice what no request can carry. Into refuses that, looks into the cache, or
 // sends the request, once more when a connection kept from an earlier call turns out to be dead and the operation
 // allows it, or when the service refuses it for a wrong clock, converts the answer's result (Conversion.h), cleans up, writes the log line and maps the status.
 // Nothing is thrown through it.
 #pragma once
 
+#include <ctype.h>
 #include <limits.h>
 
 #include <utility>
@@ -23,8 +25,25 @@
 #include "Operations.h"
 #include "Records.h"
 #include "ZVUtilities.h"
+#include "soapH.h"
 
 namespace CallDetail {
+
+// Whether the contract has a text for an enumeration's number; for the others the generated function writes digits.
+#define ZV_SENT_ENUM(name)                                      \
+    inline bool IsListed(soap& context, ZV1__##name value)      \
+    {                                                           \
+        const char first = *soap_ZV1__##name##2s(&context, value); \
+        return first != '-' && !isdigit(first);                 \
+    }
+ZV_SENT_ENUM(AudioProfile)
+ZV_SENT_ENUM(BonusAssetType)
+ZV_SENT_ENUM(FileProfile)
+ZV_SENT_ENUM(StreamAPIPurchaseType)
+ZV_SENT_ENUM(StreamStatus)
+ZV_SENT_ENUM(TitleTypeFilter)
+ZV_SENT_ENUM(WatchStatus)
+#undef ZV_SENT_ENUM
 
 // The response code of answers that have one; the other answers are no refusals.
 template <class Answer>
@@ -49,6 +68,25 @@ public:
 
     /// The status of a call that cannot be made.
     ZV_WS_Status Refusal() const { return m_Tagged ? ZV_WS_Status_invalid_param : ZV_WS_Status_general_error; }
+
+    /// Children of the request. One that no request can carry makes Into refuse the call: a text that XML cannot hold, or
+    /// a number that the contract's list of texts does not have. Texts are borrowed.
+    void SetText(char*& to, const char* text)
+    {
+        to = const_cast<char*>(text);
+        m_IsSendable &= !text || ZVUtilities::IsXmlText(text);
+    }
+    template <class Wire, class Value>
+    void SetEnum(Wire& to, Value value)
+    {
+        to = static_cast<Wire>(value);
+        m_IsSendable &= CallDetail::IsListed(m_Session->m_Browse, to);
+    }
+    void SetSortOrder(int& to, ZV_WS_SortOrder order)
+    {
+        to = ZVUtilities::SortOrder2Int(order);
+        m_IsSendable &= order >= SORT_ORDER_DATEADDED && order <= SORT_ORDER_USERRATING;
+    }
 
     /// The status shall tell of the transport only: the service's response code stays in the record.
     void IgnoreResponseCode() { m_UsesResponseCode = false; }
@@ -90,12 +128,15 @@ protected:
     /// Frees the context's temporary data, logs, and maps the status.
     ZV_WS_Status Finish(soap& context, const Outcome& outcome);
 
+    /// When the answer was right but for a value that cannot be read: which.
+    static void LogUnreadable(const soap& context, const char* operation, int result);
     static void LogProxy(const char* verb, const char* proxy, const char* operation);
 
     const char* m_Function;
     SessionImpl* m_Session;
     bool m_Tagged = true;
     Change m_Change = Change::None;
+    bool m_IsSendable = true;
     bool m_UsesResponseCode = true;
     bool m_ClockIsWrong = false;
     AnswerCache::Entry m_Entry;
@@ -128,10 +169,12 @@ public:
         return Into([out](const Answer* answer) { ZVUtilities::Convert(answer, *out); });
     }
 
-    /// Makes the call and hands the answer's result, never null, to `convert(result)`.
+    /// Makes the call and hands the answer's result, never null, to `convert(result)`, which may say with false that the
+    /// result cannot be read.
     template <class Convert, class = std::enable_if_t<!std::is_pointer_v<Convert>>>
     ZV_WS_Status Into(Convert convert)
     {
+        if (!m_IsSendable) return ZV_WS_Status_invalid_param;
         auto& service = Op::Service(*m_Session);
         Outcome outcome;
         if (!WithinMemory([&] { Make(service, convert, outcome); }))
@@ -158,8 +201,13 @@ private:
         }
         if (!answer) return;
         outcome.responseCode = CallDetail::ResponseCodeOf(*answer, 0);
-        convert(answer);
-        outcome.answered = true;
+        if constexpr (std::is_same_v<decltype(convert(answer)), bool>) {
+            outcome.answered = convert(answer);
+        } else {
+            convert(answer);
+            outcome.answered = true;
+        }
+        if (!outcome.answered) return;
         if (!isCached && outcome.responseCode == 0) cache.Store(m_Response);
     }
 
@@ -197,19 +245,6 @@ void SetPage(Call& call, const ZV_WS_Pagination& page)
 {
     call->CurrentPageNumber = static_cast<int>(page.CurrentPageNumber);
     call->ItemsPerPage = static_cast<int>(page.ItemsPerPage);
-}
-
-/// A wire enumeration of the same number as the library's (or as a plain int).
-template <class Wire, class Value>
-void SetEnum(Wire& to, Value value)
-{
-    to = static_cast<Wire>(value);
-}
-
-/// Borrows a text for a request, which never writes to it.
-inline char* Text(const char* text)
-{
-    return const_cast<char*>(text);
 }
 
 /// Whether that is an array which a request can carry: its size is a number of the contract.
@@ -268,5 +303,6 @@ int ServiceCallBase::Exchange(Service& service, const char* operation, bool once
     } while (isToRepeat());
     m_ClockIsWrong = transport.ClockVerdict() == Clock::Verdict::Wrong;
     LogProxy("Exiting", service.ProxyName(), operation);
+    LogUnreadable(service, operation, result);
     return result;
 }

@@ -41,6 +41,9 @@ bool AreValid(const ZV_WS_SetupParams& params)
     if (cache.Type == CacheType_File && !cache.Path) return false;
     if (strlen(params.DestinationUniqueID) > kLongestUniqueID) return false;
     if (cache.Type != CacheType_None && cache.Limit != 0 && cache.Limit < kSmallestCacheLimit) return false;
+    for (const char* sent : {params.APIKey, params.DestinationUniqueID, params.UserName, params.AuthToken}) {
+        if (sent && !ZVUtilities::IsXmlText(sent)) return false;
+    }
     for (const char* sent : {params.ApplicationRevision, params.FirmwareRevision, params.ModelCode}) {
         if (sent && !IsHeaderText(sent)) return false;
     }

@@ -10,7 +10,7 @@ ZV_WS_Status LocatePass(const char* function, ZV_WS_Session* handle, int passID,
     ServiceCall<Op> call(function, handle, location);
     if (!call.Accepts()) return call.Refusal();
     call->PassID = passID;
-    SetEnum(call->FileProfile, fileProfile);
+    call.SetEnum(call->FileProfile, fileProfile);
     return call.Into(location);
 }
 
@@ -41,8 +41,8 @@ ZV_WS_Status ZV_WS_manageStreamingInstanceStatus(ZV_WS_Session* handle, const ch
 {
     ServiceCall<Operation::manageStreamInstanceStatus> call(__func__, handle, answer);
     if (!call.Accepts(streamID && *streamID)) return call.Refusal();
-    call->StreamID = Text(streamID);
-    SetEnum(call->Status, status);
+    call.SetText(call->StreamID, streamID);
+    call.SetEnum(call->Status, status);
     call->StopTimeSeconds = stopTime;
     return call.Into(answer);
 }
@@ -54,8 +54,8 @@ ZV_WS_Status ZV_WS_getTHXMediaDirector(ZV_WS_Session* handle, int passID, ZV_WS_
     if (!call.Accepts()) return call.Refusal();
     call.IgnoreResponseCode();
     call->PassID = passID;
-    SetEnum(call->FileProfile, fileProfile);
-    SetEnum(call->AudioSetting, audioProfile);
+    call.SetEnum(call->FileProfile, fileProfile);
+    call.SetEnum(call->AudioSetting, audioProfile);
     return call.Into(data);
 }
 
@@ -67,8 +67,8 @@ ZV_WS_Status ZV_WS_getTHXMediaDirectorBonusAsset(ZV_WS_Session* handle, int bonu
     if (!call.Accepts()) return call.Refusal();
     call.IgnoreResponseCode();
     call->BonusAssetID = bonusAssetID;
-    SetEnum(call->FileProfile, fileProfile);
-    SetEnum(call->BonusAssetType, bonusAssetType);
+    call.SetEnum(call->FileProfile, fileProfile);
+    call.SetEnum(call->BonusAssetType, bonusAssetType);
     return call.Into(data);
 }
 

@@ -69,9 +69,9 @@ ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortO
     if (!call.Accepts(IsPage(page))) return call.Refusal();
     call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, kListTable, sortOrder, page->CurrentPageNumber,
                  page->ItemsPerPage, typeFilter);
-    call->sortOrder = ZVUtilities::SortOrder2Int(sortOrder);
+    call.SetSortOrder(call->sortOrder, sortOrder);
     SetPage(call, *page);
-    SetEnum(call->TitleType, typeFilter);
+    call.SetEnum(call->TitleType, typeFilter);
     return call.Into(items);
 }
 

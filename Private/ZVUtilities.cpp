@@ -27,6 +27,28 @@ bool Str2Bool(const char* text)
     return text && strcmp(text, "true") == 0;
 }
 
+bool IsXmlText(const char* text)
+{
+    const auto* at = reinterpret_cast<const unsigned char*>(text);
+    while (*at) {
+        // The shortest form is the only one.
+        static const unsigned int kLeast[] = {0, 0x80, 0x800, 0x10000};
+        const int more = *at < 0x80 ? 0 : *at < 0xc0 ? -1 : *at < 0xe0 ? 1 : *at < 0xf0 ? 2 : *at < 0xf8 ? 3 : -1;
+        if (more < 0) return false;
+        unsigned int character = more == 0 ? *at : *at & (0x3fu >> more);
+        ++at;
+        for (int i = 0; i < more; ++i, ++at) {
+            if ((*at & 0xc0) != 0x80) return false;
+            character = character << 6 | (*at & 0x3fu);
+        }
+        const bool isIn = character >= 0x20 ? character < 0xd800 || (character > 0xdfff && character < 0xfffe) ||
+                                                  (character > 0xffff && character < 0x110000)
+                                            : character == '\t' || character == '\n' || character == '\r';
+        if (character < kLeast[more] || !isIn) return false;
+    }
+    return true;
+}
+
 int SortOrder2Int(ZV_WS_SortOrder order)
 {
     return order;

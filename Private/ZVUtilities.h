@@ -22,6 +22,9 @@ void SetText(ZV_WS_String& to, const ZVString& text);
 /// True only for the text "true".
 bool Str2Bool(const char* text);
 
+/// Whether the text is UTF-8 and holds only characters that XML 1.0 has.
+bool IsXmlText(const char* text);
+
 /// The number the service takes for a sort order.
 int SortOrder2Int(ZV_WS_SortOrder order);
 

@@ -190,13 +190,72 @@ TEST_F(Calls, WrongArgumentsSendNothing)
         Asking(ZV_WS_authorizeDevice, nullptr),
         Asking(ZV_WS_checkTitlesInWishlist, nullptr, 1, TITLE_TYPE_FILTER_ANY),
         Asking(ZV_WS_manageStreamingInstanceStatus, "", STREAM_STATUS_PLAY, 0),
+        // Numbers that the contract has no text for.
+        Asking(ZV_WS_getTitles, 1, &page, 3),
+        Asking(ZV_WS_getTitles, 1, &page, -1),
+        Asking(ZV_WS_getMyVideos, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, 4),
+        Asking(ZV_WS_getMyVideos, &page, PURCHASE_TYPE_ANY, static_cast<ZV_WS_TitleTypeFilter>(3), 0),
+        Asking(ZV_WS_getWishlistItems, static_cast<ZV_WS_SortOrder>(4), &page, TITLE_TYPE_FILTER_ANY),
+        Asking(ZV_WS_setAudioDefaultProperty, static_cast<ZV_WS_AudioProfile>(6)),
+        Asking(ZV_WS_getStreamingAssetLocation, 1, static_cast<ZV_WS_FileProfile>(11)),
+        Asking(ZV_WS_manageStreamingInstanceStatus, "1", static_cast<ZV_WS_StreamStatus>(5), 0),
+        Asking(ZV_WS_getTHXMediaDirectorBonusAsset, 1, FILE_PROFILE_STANDARD, static_cast<ZV_WS_BonusAssetType>(1)),
     };
     for (size_t i = 0; i < std::size(calls); ++i)
         EXPECT_EQ(ZV_WS_Status_invalid_param, calls[i](&session)) << i;
     EXPECT_TRUE(store->Log().empty());
-    // Enumerations outside of their lists go to the service as numbers, which refuses them.
-    EXPECT_NE(ZV_WS_Status_ok, Asking(ZV_WS_getTitles, 1, &page, 9)(&session));
-    EXPECT_EQ(std::vector<std::string>{"getTitlesByNavigation!"}, Asked());
+}
+
+TEST_F(Calls, TextsThatXmlCannotCarryAreNotSent)
+{
+    const ZV_WS_Pagination page = Page(1, 1);
+    const struct {
+        const char* text;
+        bool isText;
+    } rows[] = {
+        {"a\tb\nc\rd", true},
+        {"\x7f", true},
+        {"\xC2\x80 \xE0\xA0\x80 \xED\x9F\xBF \xEE\x80\x80 \xEF\xBF\xBD \xF0\x90\x80\x80 \xF4\x8F\xBF\xBF", true},
+        {"\x01", false},
+        {"a\x1f", false},
+        {"\x80", false},              // no first byte
+        {"\xC3", false},              // cut short
+        {"\xC3(", false},
+        {"\xE2\x82", false},
+        {"\xC0\xAF", false},          // longer than it has to be
+        {"\xE0\x9F\xBF", false},
+        {"\xF0\x8F\xBF\xBF", false},
+        {"\xED\xA0\x80", false},      // half a pair
+        {"\xEF\xBF\xBE", false},      // U+FFFE
+        {"\xEF\xBF\xBF", false},
+        {"\xF4\x90\x80\x80", false},  // beyond the last
+        {"\xF8\x88\x80\x80\x80", false},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(testing::PrintToString(row.text));
+        store->ClearLog();
+        const AnyCall search = Asking(ZV_WS_searchForTitle, &page, PURCHASE_TYPE_ANY, TITLE_TYPE_FILTER_ANY, row.text);
+        EXPECT_EQ(row.isText ? ZV_WS_Status_ok : ZV_WS_Status_invalid_param, search(&session));
+        EXPECT_EQ(row.isText ? 1u : 0u, store->Log().size());
+        store->ClearLog();
+        ZV_WS_SetupParams setup = Setup(ACCESS_TYPE_STREAM);
+        setup.DestinationUniqueID = row.text;
+        ZV_WS_Session other;
+        EXPECT_EQ(row.isText, ZV_WS_initialize(&other, &setup) != ZV_WS_Status_invalid_param);
+        ZV_WS_release(&other);
+    }
+    for (const AnyCall& call : {
+             Asking(ZV_WS_authorizeDevice, "\x01"),
+             Asking(ZV_WS_translateTivoExternalID, "\x01"),
+             Asking(ZV_WS_assignGiftCertificateToUser, "\x01"),
+             Asking(ZV_WS_doPurchaseSavedBilling, 1, "\x01", false),
+             Asking(ZV_WS_removeAllMyPurchases, "\x01"),
+             Asking(ZV_WS_manageStreamingInstanceStatus, "\x01", STREAM_STATUS_PLAY, 0),
+         }) {
+        store->ClearLog();
+        EXPECT_EQ(ZV_WS_Status_invalid_param, call(&session));
+        EXPECT_TRUE(store->Log().empty());
+    }
 }
 
 // ---- Clock, bandwidth, address

@@ -1,4 +1,6 @@
 // Answers written by hand, in both versions of SOAP, as far as the library's records.
+#include <string.h>
+
 #include "Conversion.h"
 #include "Exchange.h"
 #include "Records.h"
@@ -85,16 +87,95 @@ TEST(Answer, AnswersToSomethingElseFail)
     EXPECT_FALSE(empty.answered);
 }
 
-// The service's yes or no is a text, of which one spelling means yes.
-TEST(Answer, OddlyTypedResults)
+std::string Replaced(std::string text, const std::string& from, const std::string& to)
+{
+    for (size_t at = 0; (at = text.find(from, at)) != std::string::npos; at += to.size())
+        text.replace(at, from.size(), to);
+    return text;
+}
+
+// It is well-formed, and says nothing; without it the rest of each record would not be read.
+TEST(Answer, TextBetweenElementsIsReadOver)
+{
+    for (const char* text : {" x ", "&amp;", "<![CDATA[<y>]]>", "<!-- c -->z<!-- d -->", "\xE2\x82\xAC>'\"", "<?p q?>"}) {
+        SCOPED_TRACE(text);
+        std::string body = kListing;
+        for (const char* tag : {"<getTitleListingResult>", "<TitleID>", "</TitleID>", "<BonusAsset ", "<ProductListing>",
+                                "</SkuID>", "<FileProfile>", "</AvailableAssets>", "</IsAvailInUserWishList>"}) {
+            const bool isBefore = tag[1] != '/' && strstr(tag, "Result>") == nullptr;
+            body = Replaced(body, tag, isBefore ? text + std::string(tag) : tag + std::string(text));
+        }
+        const Listing listing(HttpAnswer(Envelope(body)));
+        ASSERT_EQ(SOAP_OK, listing.result);
+        const ZV_WS_TitleListingResponse& r = listing.record;
+        EXPECT_EQ(42, r.TitleID);
+        ASSERT_EQ(1u, r.BonusAssets.size);
+        ASSERT_EQ(2u, r.AvailableProducts.size);
+        EXPECT_EQ(2u, r.AvailableProducts.ProductListing[0].AvailableAssets.size);
+        EXPECT_STREQ("2026/12/31 23:59:59", r.AvailableProducts.ProductListing[0].ExpireDate);
+        EXPECT_STREQ("Two <lines>", r.Synopsis);
+    }
+    const Listing cut(HttpAnswer(Envelope(Replaced(kListing, "</TitleID>", "</TitleID> x")).substr(0, 500)));
+    EXPECT_NE(SOAP_OK, cut.result);
+}
+
+TEST(Answer, ValuesOutsideTheContractFailTheWhole)
 {
     const struct {
+        const char* from;
+        const char* to;
+        int result;
+    } rows[] = {
+        {"<PurchaseType>buy", "<PurchaseType>\n buy ", SOAP_OK},
+        {"<PurchaseType>buy", "<PurchaseType>1", SOAP_TYPE},  // a number is no text of the list
+        {"<PurchaseType>buy", "<PurchaseType>Buy", SOAP_TYPE},
+        {"<PurchaseType>buy", "<PurchaseType>lease", SOAP_TYPE},
+        {"\"HIGH_DEFINITION\"", "\"2\"", SOAP_TYPE},
+        {"<TitlePosition>3", "<TitlePosition> 32767 ", SOAP_OK},
+        {"<TitlePosition>3", "<TitlePosition>32768", SOAP_TYPE},
+        {"<TitleID>42", "<TitleID>2147483648", SOAP_TYPE},
+        {"<IsTvListing>1", "<IsTvListing>2", SOAP_TYPE},
+    };
+    for (const auto& row : rows) {
+        const Listing listing(HttpAnswer(Envelope(Replaced(kListing, row.from, row.to))));
+        EXPECT_EQ(row.result, listing.result) << row.to;
+    }
+}
+
+// The service's yes or no is XML of any kind. What is neither must not pass for a no: it is about what children see.
+TEST(Answer, TheAdultFlagIsYesOrNo)
+{
+    enum Reads { No, Yes, Not };
+    const struct {
         const char* content;
-        bool enabled;
-    } rows[] = {{"true", true}, {"True", false}, {"<flag>true</flag>", false}, {"", false}, {nullptr, false}};
+        Reads reads;
+    } rows[] = {
+        {"true", Yes},
+        {"1", Yes},
+        {" \t\n true \r\n", Yes},
+        {"<![CDATA[true]]>", Yes},
+        {"<![CDATA[ tr]]>ue", Yes},
+        {"&#116;rue", Yes},
+        {"t<!-- r -->rue", Yes},
+        {"false", No},
+        {" 0", No},
+        {"<![CDATA[0]]>", No},
+        {nullptr, No},
+        {"", Not},
+        {" ", Not},
+        {"True", Not},
+        {"yes", Not},
+        {"01", Not},
+        {"tru e", Not},
+        {"true false", Not},
+        {"&amp;", Not},
+        {"<flag>true</flag>", Not},
+        {"true<flag/>", Not},
+    };
     for (const auto& row : rows) {
         const std::string name = "IsAdultVerificationEnabled";
         const std::string element = row.content ? "<" + name + ">" + row.content + "</" + name + ">" : "";
+        SCOPED_TRACE(element);
         Exchange<DownloadAPI> exchange;
         _ZV1__checkAdultVerificationEnabled request;
         _ZV1__checkAdultVerificationEnabledResponse response;
@@ -106,10 +187,14 @@ TEST(Answer, OddlyTypedResults)
                   exchange.Run("checkAdultVerificationEnabled", HttpAnswer(Envelope(body)), [&](DownloadAPI& service) {
                       return service.checkAdultVerificationEnabled(&request, &response);
                   }));
+        const char* const xml = response.checkAdultVerificationEnabledResult->IsAdultVerificationEnabled;
+        bool flag = true;
+        EXPECT_EQ(row.reads != Not, ZVUtilities::ReadFlag(xml, flag));
+        EXPECT_EQ(row.reads == Yes, flag);
         ZV_WS_CheckAdultVerificationEnabledResponse record;
         Records::Tag(record);
         ZVUtilities::Convert(response.checkAdultVerificationEnabledResult, record);
-        EXPECT_EQ(row.enabled, record.IsAdultVerificationEnabled) << element;
+        EXPECT_EQ(row.reads == Yes, record.IsAdultVerificationEnabled);
         ZV_WS_release(&record);
     }
 }
