@@ -181,7 +181,7 @@ public:
     ZV1__AuthorizeDeviceResponse* authorizeDeviceResult 0;
 };
 
-// Ends that tie.
+// Unties the device from its customer.
 class _ZV1__deactivateDevice {
 };
 class _ZV1__deactivateDeviceResponse {
@@ -189,7 +189,7 @@ public:
     ZV1__StandardResponse* deactivateDeviceResult 0;
 };
 
-// Whether that token is still good.
+// Whether a token that authorizeDevice gave is still good.
 class _ZV1__checkAuthToken {
 public:
     char* AuthToken 0;

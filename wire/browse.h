@@ -9,8 +9,8 @@ public:
     ZV1__FileType* getFileTypeResult 0;
 };
 
-// Whether the catalogue has changed since that time, given as getLastCacheLoadTimeUTC told it: 0 when it has not, 1
-// when what a player keeps of it is stale.
+// Whether the catalogue has changed since the time that getLastCacheLoadTimeUTC told: 0 when it has not, 1 when what a
+// player keeps of it is stale.
 class _ZV1__shouldUpdateCache {
 public:
     char* UTCTime 0;
@@ -20,7 +20,7 @@ public:
     int* shouldUpdateCacheResult 0;
 };
 
-// Titles like that one.
+// Titles like the one given.
 class _ZV1__getRecommendedTitles {
 public:
     int TitleId 1;

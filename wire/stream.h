@@ -78,7 +78,7 @@ public:
     ZV1__StandardResponse* removeAllMyPurchasesResult 0;
 };
 
-// Where to go on playing what a pass stands for: the stream that was played last and its position.
+// Where to go on playing what a pass stands for: the stream that was played last, and the second at which it stopped.
 class _ZV1__loadLastStreamingAssetLocationForPass {
 public:
     int PassID 1;
