@@ -64,7 +64,7 @@ function(write_input service folder)
     endforeach()
 endfunction()
 
-# What is left of a start tag's namespaces.
+# The text without namespaces that nothing in it names.
 function(drop_unused_prefixes text result)
     string(REGEX REPLACE "\n *xmlns:(SOAP-ENC|xsi|c14n|wsu|xenc|wsc|ds|HTTP|MIME|DIME|WSDL|ZV[2-5])=\"[^\"]*\"" ""
            text "${text}")
@@ -82,11 +82,10 @@ function(write_wsdl service folder)
     # The header message lists every block that any service knows.
     string(REGEX MATCHALL "  <part name=\"[A-Za-z]+\" element=\"(wsse|wsa|ZV1):[A-Za-z]+\"/>\n" parts "${rest}")
     foreach(part ${parts})
-        string(REGEX MATCH "\"([A-Za-z]+)\"" name "${part}")
-        if(part MATCHES "name=\"Body\"" OR rest MATCHES "<SOAP:header [^\n]*part=\"${CMAKE_MATCH_1}\"")
-            continue()
+        string(REGEX REPLACE "  <part name=\"([A-Za-z]+)\".*" "\\1" name "${part}")
+        if(NOT name STREQUAL Body AND NOT rest MATCHES "<SOAP:header [^\n]*part=\"${name}\"")
+            string(REPLACE "${part}" "" rest "${rest}")
         endif()
-        string(REPLACE "${part}" "" rest "${rest}")
     endforeach()
     file(WRITE ${OUTPUT}/${service}.wsdl "${head}<types>
   <xsd:schema targetNamespace=\"${api}${service}Soap12\">

@@ -18,7 +18,7 @@ std::string FileOf(const HttpRequest& request)
     const std::string path = request.Path();
     const std::string folder = path.substr(0, path.rfind('/') + 1);
     if (request.method != "GET" || (folder != "/api/" && folder != "/kac/api/")) return "";
-    const std::string name = path.substr(folder.size());
+    std::string name = path.substr(folder.size());
     if (EndsWith(name, ".xsd")) return name;
     const bool asksForWsdl = strcasecmp(request.target.substr(path.size()).c_str(), "?wsdl") == 0;
     return SoapService::Find(path) && asksForWsdl ? name.substr(0, name.rfind('.')) + ".wsdl" : "";

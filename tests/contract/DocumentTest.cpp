@@ -36,6 +36,19 @@ std::string Named(int status)
     return name == kNames.end() ? std::to_string(status) : name->second + " (" + std::to_string(status) + ")";
 }
 
+std::string Row(std::initializer_list<std::string> cells)
+{
+    std::string row = "|";
+    for (const std::string& cell : cells)
+        row.append(" ").append(cell).append(" |");
+    return row + "\n";
+}
+
+std::string Code(const std::string& text)
+{
+    return "`" + text + "`";
+}
+
 class Document : public Exchanges {
 protected:
     // The part of the document between the comments that name it.
@@ -128,11 +141,9 @@ TEST_F(Operations, AndTheirRefusals)
         if (!written.insert(operation.name).second) continue;
         ASSERT_EQ(1u, m_Refusals.count(operation.name)) << operation.name;
         const Refusals& refusals = m_Refusals[operation.name];
-        operations += "| `" + operation.name + "` | " + services[operation.name] + " | " + refusals.meaning + " | " +
-                      operation.documentation + " |\n";
-        for (const auto& [code, status] : refusals.statuses) {
-            codes += "| `" + operation.name + "` | " + std::to_string(code) + " | " + Named(status) + " |\n";
-        }
+        operations += Row({Code(operation.name), services[operation.name], refusals.meaning, operation.documentation});
+        for (const auto& [code, status] : refusals.statuses)
+            codes += Row({Code(operation.name), std::to_string(code), Named(status)});
     }
     ExpectBlock("operations", operations);
     ExpectBlock("codes", codes);
@@ -161,7 +172,7 @@ TEST_F(Document, Failures)
         MakeCall("getConfig", &session, result);
         EXPECT_EQ(row.fault, store->Log().back().fault);
         store->ClearFaults();
-        table += std::string("| ") + row.answer + " | " + Named(result.status) + " |\n";
+        table += Row({row.answer, Named(result.status)});
     }
     ExpectBlock("failures", table);
 }
@@ -173,8 +184,7 @@ TEST_F(Document, Addresses)
         const std::string path = service.path;
         const std::string wsdl = path.substr(0, path.find('.')) + ".wsdl";
         EXPECT_TRUE(std::filesystem::exists(ZV_CONTRACT + wsdl));
-        table += std::string("| ") + service.name + " | `" + path + "` | `" + wsdl + "` | `" +
-                 service.settingsBlock + "` |\n";
+        table += Row({service.name, Code(path), Code(wsdl), Code(service.settingsBlock)});
     }
     ExpectBlock("addresses", table);
 }
@@ -185,8 +195,8 @@ TEST_F(Document, Environments)
     const Deployment& deployment = *Deployment::Load();  // as compiled in
     std::string table = "| digit | addresses begin with | for adult titles |\n|---|---|---|\n";
     for (int digit = 0; digit < 3; ++digit) {
-        table += "| " + std::to_string(digit) + " | `" + deployment.BaseUrl(ContentType_ZV, digit) + "` | `" +
-                 deployment.BaseUrl(ContentType_KAC, digit) + "` |\n";
+        table += Row({std::to_string(digit), Code(deployment.BaseUrl(ContentType_ZV, digit)),
+                      Code(deployment.BaseUrl(ContentType_KAC, digit))});
     }
     ExpectBlock("environments", table);
 }
@@ -195,21 +205,18 @@ TEST_F(Document, Limits)
 {
     const auto context = std::make_unique<soap>();
     LimitReading(*context);
-    const auto row = [](const char* what, size_t limit) {
-        return std::string("| ") + what + " | " + std::to_string(limit) + " |\n";
-    };
-    ExpectBlock("limits",
-                "| what | most |\n|---|---|\n" + row("bytes of an answer, uncompressed", context->recv_maxlength) +
-                    row("bytes of a text", context->maxlength) + row("elements of an array", context->maxoccurs) +
-                    row("elements inside of each other", context->maxlevel));
+    ExpectBlock("limits", "| what | most |\n|---|---|\n" +
+                              Row({"bytes of an answer, uncompressed", std::to_string(context->recv_maxlength)}) +
+                              Row({"bytes of a text", std::to_string(context->maxlength)}) +
+                              Row({"elements of an array", std::to_string(context->maxoccurs)}) +
+                              Row({"elements inside of each other", std::to_string(context->maxlevel)}));
 }
 
 TEST_F(Document, Additions)
 {
     std::string table = "| change | a player in the field |\n|---|---|\n";
     for (const Addition& row : ::Additions()) {
-        const std::string effect = *row.effect ? row.effect : "**fails**: " + Named(row.status);
-        table += std::string("| ") + row.change + " | " + effect + " |\n";
+        table += Row({row.change, *row.effect ? row.effect : "**fails**: " + Named(row.status)});
     }
     ExpectBlock("additions", table);
 }
