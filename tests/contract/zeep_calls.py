@@ -1,7 +1,6 @@
 """Calls every operation of a storefront simulator through its own WSDLs with another SOAP toolkit (zeep), over TLS, and
 compares what that toolkit read with the simulator's database: zeep_calls.py PROGRAM
 """
-import base64
 import decimal
 import hashlib
 import json
@@ -282,5 +281,6 @@ def main(program):
 
 if __name__ == '__main__':
     found = main(sys.argv[1])
-    print('\n'.join(found))
+    for failure in found:
+        print(failure)
     sys.exit(1 if found else 0)
