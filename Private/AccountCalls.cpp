@@ -96,9 +96,10 @@ ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
     // What cannot be read must not pass for "no check wanted".
     return call.Into([&](const ServiceCall<Op>::Answer* result) {
         bool isEnabled = false;
-        const bool isReadable = ZVUtilities::ReadFlag(result->IsAdultVerificationEnabled, isEnabled);
-        if (isReadable) ZVUtilities::Convert(result, *answer);
-        return isReadable;
+        if (!ZVUtilities::ReadFlag(result->IsAdultVerificationEnabled, isEnabled)) return false;
+        ZVUtilities::Convert(result, *answer);
+        answer->IsAdultVerificationEnabled = isEnabled;
+        return true;
     });
 }
 

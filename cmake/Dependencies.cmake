@@ -14,6 +14,10 @@ if(BUILD_TESTING OR NOT DEFINED BUILD_TESTING)
     find_package(benchmark REQUIRED)
     find_package(CURL REQUIRED)
     pkg_check_modules(PUGIXML REQUIRED IMPORTED_TARGET pugixml)
+    find_program(ZV_XMLLINT xmllint REQUIRED)
+    find_program(ZV_WSDL2H wsdl2h REQUIRED)
+    # The distribution's python3, which has the distribution's modules: another one may come first in PATH.
+    find_program(ZV_PYTHON3 python3 PATHS /usr/bin NO_DEFAULT_PATH REQUIRED)
 endif()
 
 # The flags decide the layout of struct soap: every file that sees stdsoap2.h must take them from here.

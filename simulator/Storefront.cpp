@@ -23,6 +23,7 @@
 #include "Catalogue.h"
 #include "Certificates.h"
 #include "Channel.h"
+#include "ContractPages.h"
 #include "Faults.h"
 #include "PlainService.h"
 #include "RequestLog.h"
@@ -397,17 +398,23 @@ HttpResponse Simulator::Answer(const HttpRequest& request, Connection& connectio
 {
     const auto take = [&](const std::string& operation) { return fault = m_Faults.Take(operation); };
     const std::string path = request.Path();
+    const std::string endpoint = "https://localhost:" + std::to_string(m_HttpsPort) + path;
+    HttpResponse response;
+    if (connection.tls && AnswerContract(request, endpoint, response)) {
+        log.service = log.operation = "contract";
+        return response;
+    }
     const ServiceRow* service = connection.tls ? SoapService::Find(path) : nullptr;
     if (service) {
-        const std::string endpoint = "https://localhost:" + std::to_string(m_HttpsPort) + path;
-        return m_Soap->Answer(request, *service, endpoint, log, take);
+        response = m_Soap->Answer(request, *service, endpoint, log, take);
+        if (m_Options.onExchange) m_Options.onExchange({log.service, log.operation, request.body, response.body});
+        return response;
     }
     const std::string plain = PlainServiceName(path);
     if (!plain.empty() && (plain == "bandwidth" || connection.tls == (plain == "discovery"))) {
         return AnswerPlain(plain, request, m_Options.environment, take(plain), log);
     }
     log.violation = "nothing is at " + path;
-    HttpResponse response;
     response.status = 404;
     return response;
 }

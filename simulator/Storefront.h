@@ -4,6 +4,7 @@
 // It runs on threads of its own from Start to destruction. Every member may be called from any thread.
 #pragma once
 
+#include <functional>
 #include <map>
 #include <memory>
 #include <string>
@@ -22,6 +23,14 @@ struct StorefrontAccount {
     static constexpr char kSecondActivationPin[] = "654321";  ///< Signs in the second customer, on the same player.
 };
 
+/// A request to a SOAP service and its answer, both whole: secrets and all.
+struct SoapExchange {
+    std::string service;    ///< As in the log.
+    std::string operation;  ///< Likewise.
+    std::string request;    ///< The envelopes, uncompressed.
+    std::string answer;
+};
+
 struct StorefrontOptions {
     std::string dataFolder;  ///< Database, certificates and deployment file; made when absent. Empty: a temporary one.
     int httpsPort = 0;       ///< 0: a free one.
@@ -33,11 +42,15 @@ struct StorefrontOptions {
     int environment = 2;  ///< What discovery answers.
     int largestPage = 0;  ///< Items that a page holds at most, whatever is asked for; 0: only the catalogue has one.
     std::vector<std::string> faults;
+    /// Called with every exchange before its answer is sent, on the thread of its connection: for tests in the same
+    /// process.
+    std::function<void(const SoapExchange&)> onExchange;
 };
 
 struct LoggedRequest {
     unsigned long number = 0;
-    std::string service;  ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart" or "connect".
+    std::string service;  ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart", "contract" or
+                          ///< "connect".
     std::string operation;  ///< SOAP operation; the service's name for the others; the prefix for box art.
     std::vector<std::pair<std::string, std::string>> headers;  ///< HTTP headers, names in lower case.
     std::vector<std::pair<std::string, std::string>>

@@ -88,6 +88,9 @@ void PrintHelp()
         StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin, StorefrontAccount::kSecondActivationPin);
     printf("%s\n", Storefront::HelpOnFaults().c_str());
     printf(
+        "Contract, on the HTTPS port: GET /api/NAME.asmx?wsdl (RealTimeBrowse, DownloadAPI, StreamAPI), and the "
+        "schemas it\n"
+        "imports beside it. docs/contract.md tells the rest.\n\n"
         "Control, on the plain HTTP port: POST /control/faults (a fault a line), GET and DELETE /control/faults,\n"
         "GET /control/log (a JSON object a line), DELETE /control/log.\n\n"
         "Not checked: which device asks (any DestinationUniqueID and type will do), whether it is activated before it "

@@ -1,10 +1,6 @@
-# Runs soapcpp2, which writes its files and ends with 0 even after some errors: its output decides as well.
-execute_process(
-    COMMAND ${SOAPCPP2} -1 -i -C -L -x -w -I${IMPORT} -d${OUTPUT} ${CONTRACT}
-    RESULT_VARIABLE result OUTPUT_VARIABLE output ERROR_VARIABLE output)
-if(result OR NOT output MATCHES "Compilation successful" OR output MATCHES "\\*(WARNING|ERROR)\\*|[Ee]rror:")
-    message(FATAL_ERROR "soapcpp2 does not accept the contract:\n${output}")
-endif()
+# Makes the serializers and proxies.
+include(${CMAKE_CURRENT_LIST_DIR}/../cmake/Soapcpp2.cmake)
+zv_soapcpp2(${CONTRACT} ${OUTPUT} ${IMPORT} -w)
 
 # What soapcpp2 has no way to say is changed in its files. Code of another shape than is known here is an error.
 function(change file)

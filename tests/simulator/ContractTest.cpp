@@ -1,87 +1,25 @@
-// Every operation's answer against the client's records: children, their order, those that are never left out.
+// Every operation's answer against the published contract: children, their order and types, those that are never left
+// out; and the pages that publish it.
 #include <gtest/gtest.h>
-#include <libxml/parser.h>
 
-#include <fstream>
 #include <map>
-#include <regex>
 #include <sstream>
 
+#include "ContractFiles.h"
+#include "ContractSchema.h"
 #include "RawClient.h"
 
 namespace {
 
-struct Child {
-    std::string name, type;
-    char occurs;  // '1' always, '0' once at most, '*' any number of times
-};
-
-// The records that the client's contract names, by name; a message of an operation begins with "_".
-const std::map<std::string, std::vector<Child>>& Contract()
-{
-    static const auto kContract = [] {
-        const std::regex record("class (_?)ZV1__(\\w+)( : public ZV1__(\\w+))? \\{");
-        const std::regex child(" +(enum )?(ZV1__)?(\\w+)\\** (\\w+)( [01])?;");
-        std::map<std::string, std::vector<Child>> records;
-        for (const char* file : {"records.h", "browse.h", "account.h", "stream.h"}) {
-            std::ifstream lines(std::string(WIRE_FOLDER) + file);
-            std::string name;
-            std::smatch parts;
-            for (std::string line; std::getline(lines, line);) {
-                line = std::regex_replace(line, std::regex("_USCORE"), "_");
-                if (std::regex_match(line, parts, record)) {
-                    name = parts.str(1) + parts.str(2);
-                    records[name] = records[parts.str(4)];
-                } else if (std::regex_match(line, parts, child) && parts.str(4).rfind("__size", 0) != 0) {
-                    records[name].push_back(
-                        {parts.str(4), parts.str(3), parts[5].matched ? *(parts[5].first + 1) : '*'});
-                }
-            }
-        }
-        return records;
-    }();
-    return kContract;
-}
-
-std::string NameOf(const xmlNode* node)
-{
-    return reinterpret_cast<const char*>(node->name);
-}
-
-// What is wrong with the element as a value of the type; empty when nothing is.
-std::string Check(const xmlNode* element, const std::string& type)
-{
-    const std::string here = NameOf(element) + ": ";
-    const auto record = Contract().find(type);
-    const xmlNode* child = xmlFirstElementChild(const_cast<xmlNode*>(element));
-    if (record == Contract().end()) return child ? here + "no plain text" : "";
-    for (const Child& rule : record->second) {
-        int count = 0;
-        for (; child && NameOf(child) == rule.name && (count == 0 || rule.occurs == '*'); ++count) {
-            if (strcmp("http://api.zorvane.example/api/", reinterpret_cast<const char*>(child->ns->href)) != 0)
-                return here + rule.name + " is of another namespace";
-            const std::string wrong = Check(child, rule.type);
-            if (!wrong.empty()) return here + wrong;
-            child = xmlNextElementSibling(const_cast<xmlNode*>(child));
-        }
-        if (count == 0 && rule.occurs == '1') return here + "no " + rule.name;
-    }
-    return child ? here + NameOf(child) + " is unknown or out of order" : "";
-}
-
-// What is wrong with an answer, which has a result.
+// What is wrong with an answer that has a result; empty when nothing is.
 std::string CheckAnswer(const Reply& reply, const std::string& operation)
 {
+    static const ContractSchema kAnswers("answer.xsd");
     if (reply.status != 200) return "HTTP status " + std::to_string(reply.status) + ": " + reply.body;
-    const std::unique_ptr<xmlDoc, void (*)(xmlDoc*)> document(
-        xmlReadMemory(reply.body.data(), static_cast<int>(reply.body.size()), nullptr, nullptr, XML_PARSE_NONET),
-        xmlFreeDoc);
-    if (!document) return "no XML";
-    const xmlNode* body = xmlLastElementChild(xmlDocGetRootElement(document.get()));
-    const xmlNode* response = xmlFirstElementChild(const_cast<xmlNode*>(body));
-    if (!response || NameOf(response) != operation + "Response") return "no " + operation + "Response";
-    if (!xmlFirstElementChild(const_cast<xmlNode*>(response))) return "no result";
-    return Check(response, "_" + operation + "Response");
+    for (const std::string& element : {operation + "Response ", operation + "Result>"}) {
+        if (reply.body.find("<" + element) == std::string::npos) return "no " + element;
+    }
+    return kAnswers.Check(reply.body);
 }
 
 const char kBrowse[] = "RealTimeBrowse";
@@ -210,6 +148,61 @@ TEST_F(ContractTest, EveryAnswerIsOneOfTheContract)
             if (row.service == kBoth ? service != kBrowse : row.service == service) CheckRow(service, row);
         }
     }
+}
+
+TEST_F(ContractTest, FaultsAreOnesOfTheContract)
+{
+    Begin();
+    const struct {
+        const char* fault;
+        const char* schema;
+        int status;
+    } rows[] = {{"fault11", "answer.xsd", 500},
+                {"fault12", "answer12.xsd", 500},
+                {"soap12", "answer12.xsd", 200},
+                {"extra-header", "answer.xsd", 200},
+                {"missing-result", "answer.xsd", 200}};
+    for (const auto& row : rows) {
+        Order(std::string("getConfig=") + row.fault);
+        const Reply reply = Ask(kStream, "getConfig");
+        EXPECT_EQ(row.status, reply.status) << row.fault;
+        EXPECT_EQ("", ContractSchema(row.schema).Check(reply.body)) << row.fault;
+    }
+    const Reply refusal = Ask(kStream, "getNavigation");
+    EXPECT_EQ(500, refusal.status);
+    EXPECT_EQ("", ContractSchema("answer.xsd").Check(refusal.body));
+}
+
+TEST_F(ContractTest, TheContractIsServedWithTheAddressInUse)
+{
+    Begin();
+    const auto get = [this](const std::string& target, const char* method = "GET") {
+        return SendBytes(store->HttpsPort(), true,
+                         method + (" " + target) + " HTTP/1.1\r\nHost: localhost\r\nConnection: close\r\n\r\n");
+    };
+    const std::string host = "https://localhost:" + std::to_string(store->HttpsPort());
+    for (const std::string base : {"/api/", "/kac/api/"}) {
+        for (const std::string service : {kBrowse, kAccount, kStream}) {
+            for (const char* query : {"?wsdl", "?WSDL"}) {
+                const Reply reply = get(base + service + ".asmx" + query);
+                EXPECT_EQ("text/xml; charset=utf-8", reply.Header("Content-Type"));
+                EXPECT_NE(std::string::npos,
+                          reply.body.find("<SOAP:address location=\"" + host + base + service + ".asmx\"/>"));
+            }
+        }
+        for (const auto& [name, content] : ContractFiles()) {
+            const bool isServed = name.find(".xsd") != std::string::npos;
+            EXPECT_EQ(isServed ? content : "", get(base + name).body) << name;
+        }
+    }
+    EXPECT_EQ("contract", LastLogged().service);
+    EXPECT_EQ("", LastLogged().violation);
+    for (const char* target : {"/api/none.xsd", "/api/x/api.xsd", "/api/Other.asmx?wsdl"}) {
+        EXPECT_EQ(404, get(target).status) << target;
+    }
+    EXPECT_EQ(404, get("/api/api.xsd", "POST").status);
+    EXPECT_EQ(500, get("/api/StreamAPI.asmx?what").status);
+    EXPECT_EQ(404, Plain("/api/api.xsd").status) << "not without TLS";
 }
 
 // Whatever was asked for: the answer says what it holds, and the pages join.

@@ -51,6 +51,8 @@ T Argument()
         return &page;
     } else if constexpr (std::is_same_v<T, const int*>) {
         return &kNumber;
+    } else if constexpr (std::is_same_v<T, ZV_WS_BonusAssetType>) {
+        return BONUS_ASSET_TYPE_TRAILER;  // there is no other
     } else {
         return static_cast<T>(1);
     }
