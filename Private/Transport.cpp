@@ -23,12 +23,14 @@ constexpr int kReceiveSeconds = 88;
 // The toolkit's own text, sent by a session without a user agent.
 const char kToolkitAgent[] = "gSOAP/2.7";
 
-// Whether the service has refused a request for what it is, or for what its header says, and so has not acted on it.
+// Whether the service has refused a request for what its header says, and so has not acted on it.
 bool IsRefused(soap& context, int result)
 {
-    if (result == 401 || result == 403 || result == SOAP_CLI_FAULT) return true;
-    const char* code = result == SOAP_FAULT && context.fault ? *soap_faultcode(&context) : nullptr;
-    return code && (strncmp(code, "wsse:", 5) == 0 || strncmp(code, "wsu:", 4) == 0);
+    if (result == 401 || result == 403) return true;
+    const char* const code = result == SOAP_FAULT && context.fault ? *soap_faultcode(&context) : nullptr;
+    if (!code) return false;
+    const auto begins = [&](const char* start) { return strncmp(code, start, strlen(start)) == 0; };
+    return begins("SOAP-ENV:Client") || begins("SOAP-ENV:Sender") || begins("wsse:") || begins("wsu:");
 }
 
 }  // namespace
