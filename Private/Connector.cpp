@@ -24,11 +24,11 @@
 
 namespace {
 
-constexpr uint64_t kSlice = 100;            // milliseconds
-constexpr uint64_t kNextAttempt = 250;      // milliseconds after the one before
-constexpr uint64_t kOtherFamily = 50;       // milliseconds that the answer for IPv6 is waited for
+constexpr uint64_t kSlice = 100;             // milliseconds
+constexpr uint64_t kNextAttempt = 250;       // milliseconds after the one before
+constexpr uint64_t kOtherFamily = 50;        // milliseconds that the answer for IPv6 is waited for
 constexpr unsigned int kSilentPeer = 10000;  // milliseconds
-constexpr size_t kMostHead = 16 * 1024;     // bytes of a proxy's answer
+constexpr size_t kMostHead = 16 * 1024;      // bytes of a proxy's answer
 
 class Socket {
 public:
@@ -106,10 +106,8 @@ private:
     {
         const uint64_t now = ZVUtilities::MillisecondTime();
         // IPv6 goes first when its addresses come at nearly the same time.
-        const bool waitsForSix = m_Started == 0 && m_Six.empty() && !m_Names.IsDone(AF_INET6);
-        const uint64_t start = waitsForSix                             ? m_FourCame + kOtherFamily
-                               : m_Started == 0 || m_Attempts.empty() ? now
-                                                                       : m_Started + kNextAttempt;
+        const bool waitsForSix = m_Next == 0 && m_Six.empty() && !m_Names.IsDone(AF_INET6);
+        const uint64_t start = waitsForSix ? m_FourCame + kOtherFamily : m_Next;
         return static_cast<int>(start - std::min(start, now));
     }
 
@@ -123,8 +121,9 @@ private:
             Socket attempt = Start(family.front());
             family.pop_front();
             m_LastWasSix = takesSix;
-            m_Started = std::max<uint64_t>(1, ZVUtilities::MillisecondTime());
-            if (attempt.Get() >= 0) m_Attempts.push_back(std::move(attempt));
+            if (attempt.Get() < 0) continue;
+            m_Attempts.push_back(std::move(attempt));
+            m_Next = ZVUtilities::MillisecondTime() + kNextAttempt;
         }
     }
 
@@ -145,6 +144,7 @@ private:
             Socket attempt = std::move(m_Attempts[i]);
             m_Attempts.erase(m_Attempts.begin() + static_cast<long>(i));
             if (connected) return attempt;
+            m_Next = ZVUtilities::MillisecondTime();  // nothing to wait for any more
         }
         return Socket(-1);
     }
@@ -154,7 +154,7 @@ private:
     const Patience& m_Patience;
     std::deque<Address> m_Six, m_Four;  // not tried yet
     uint64_t m_FourCame = 0;            // by ZVUtilities::MillisecondTime, 0: not yet
-    uint64_t m_Started = 0;             // the last attempt; 0: none yet
+    uint64_t m_Next = 0;                // when another attempt may begin; 0: none has yet
     bool m_LastWasSix = false;
     std::vector<Socket> m_Attempts;  // under way
 };
@@ -291,8 +291,8 @@ int OpenTunnel(int socket, const ZVString& host, int port, const Proxy& proxy, c
 {
     const bool isSix = host.find(':') != ZVString::npos;
     const ZVString target = (isSix ? ZVString("[") + host + "]" : host) + ":" + std::to_string(port).c_str();
-    const ZVString request = ZVString("CONNECT ") + target + " HTTP/1.1\r\nHost: " + target + "\r\n" +
-                             proxy.AuthorizationLine() + "\r\n";
+    const ZVString request =
+        ZVString("CONNECT ") + target + " HTTP/1.1\r\nHost: " + target + "\r\n" + proxy.AuthorizationLine() + "\r\n";
     std::string head;
     const bool asked = Connection{socket}.Send(request.c_str(), request.length(), patience);
     if (!asked || !ReceiveHead(socket, head, patience)) return -1;

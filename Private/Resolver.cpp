@@ -83,7 +83,7 @@ struct NameLookup::Question {
             Cache& cache = TheCache();
             ZVMutexLock lock(cache.mutex);
             configuration = cache.configuration;
-            options.udp_port = options.tcp_port = htons(cache.port);
+            options.udp_port = options.tcp_port = cache.port;
         }
         if (!configuration.empty()) {
             options.resolvconf_path = &configuration[0];
