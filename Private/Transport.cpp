@@ -122,6 +122,7 @@ void Transport::BeginExchange()
     m_HasSent = false;
     m_Received = 0;
     m_Soap.start = static_cast<ULONG64>(time(nullptr));  // of transfer_timeout; the runtime sets it for SOAP alone
+    m_RetryAfter.Begin();
     m_SentSecrets.Restart();
     m_ReceivedSecrets.Restart();
 }

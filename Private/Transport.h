@@ -12,6 +12,7 @@
 #include <atomic>
 
 #include "Deployment.h"
+#include "RetryAfter.h"
 #include "TrafficLog.h"
 #include "ZVMutex.h"
 #include "ZVString.h"
@@ -78,6 +79,7 @@ public:
     /// The one whose authorities were loaded; the current one before.
     const Deployment& deployment() const { return m_Deployment ? *m_Deployment : Deployment::Current(); }
     soap& context() { return m_Soap; }
+    RetryAfter& retryAfter() { return m_RetryAfter; }
 
 private:
     SOAP_SOCKET Open(const char* endpoint, const char* host, int port);
@@ -95,6 +97,7 @@ private:
     void ForgetTls();
 
     soap& m_Soap;
+    RetryAfter m_RetryAfter{m_Soap};
     const Deployment* m_Deployment = nullptr;
     ZVString m_TlsHost;
     ZVString m_UserAgent;
