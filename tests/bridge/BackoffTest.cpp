@@ -74,8 +74,10 @@ TEST(Backoff, ARetryAfterComesFirst)
     uint64_t now = 120 * kSecond;
     backoff.Failed(now, kMost, 7);
     EXPECT_EQ(67 * kSecond, backoff.Remaining(now));
-    backoff.Failed(now += 67 * kSecond, 0, 4000000000u);
-    EXPECT_EQ(24 * 60 * kMinute, backoff.Remaining(now));
+    backoff.Failed(now += 67 * kSecond, kMost, 300);
+    EXPECT_EQ(10 * kMinute, backoff.Remaining(now)) << "what all are told is spread over as long";
+    backoff.Failed(now += 10 * kMinute, kMost, 4000000000u);
+    EXPECT_EQ(24 * 60 * kMinute + Backoff::kCap, backoff.Remaining(now));
 }
 
 TEST(Backoff, AFailureInAPauseOnlyLengthensItToItsRetryAfter)

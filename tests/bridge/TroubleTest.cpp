@@ -69,7 +69,7 @@ TEST_F(Trouble, TheFirstFailureStopsAllUntilThePauseIsOver)
         int milliseconds;
     } rows[] = {
         {"getTitlesByNavigation=ok", "getTitlesByNavigation=http:503", 30000},
-        {"getTitlesByNavigation=ok", "getTitlesByNavigation=http:503,retry=120", 150000},
+        {"getTitlesByNavigation=ok", "getTitlesByNavigation=http:503,retry=120", 240000},
         {"getTitlesByNavigation=ok", "getTitlesByNavigation=http:404", 30000},
         {"getTitlesByNavigation=ok", "getTitlesByNavigation=cut", 30000},
         {"getTitlesByNavigation=ok", "getTitlesByNavigation=fault11", 30000},
@@ -138,7 +138,7 @@ TEST_F(Trouble, ImagesThatFailWaitBehindTheOthers)
     const struct {
         const char* fault;
         int milliseconds;
-    } rows[] = {{"boxart=http:503", 30000}, {"boxart=http:503,retry=60", 90000}, {"boxart=cut", 30000}};
+    } rows[] = {{"boxart=http:503", 30000}, {"boxart=http:503,retry=60", 120000}, {"boxart=cut", 30000}};
     const size_t images = static_cast<size_t>(Number("SELECT COUNT(*) FROM title WHERE season = " + season)) - 1;
     for (const auto& row : rows) {
         Calm();

@@ -9,18 +9,21 @@
 /// Of one player. Has neither a clock nor a source of random numbers: a caller gives the time in milliseconds, by a
 /// clock that only goes forward, and a number drawn evenly from all that the type holds. One thread at a time.
 ///
-/// What begins a pause: a failure. The n-th in a row draws it evenly between nothing and kBase * 2^(n-1), at most kCap
-/// ("full jitter": an even spread returns with the lowest peak, and a part that is the same for all would spread
-/// nothing). A Retry-After is waited for first, and the draw added. A failure while a pause is on tells nothing new:
-/// others asked at the same time. It only lengthens the pause to its own Retry-After.
+/// What begins a pause: a failure. Its length is drawn evenly between nothing and a limit, kBase for the first in a
+/// row, twice as much for each further one up to kCap ("full jitter": what is the same for all players spreads
+/// nothing). A Retry-After is waited for first. It is the same for all, so that the limit of what is drawn on top is at
+/// least as long.
 ///
-/// What ends it: its time. An answer in between, of a call that the customer made, tells that the service is back, but
-/// it tells all players so in the same minute: it brings the end forward no further than to a new draw, between now (or
-/// the end of the Retry-After) and kReturn later, once in a pause. So a player whose own network was gone for an hour
-/// does not wait for its long pause.
+/// A failure while a pause is on tells nothing new: others were asking at the same time. It only lengthens the pause to
+/// its own Retry-After.
 ///
-/// What makes pauses short again: kAnswersToRecover answers in a row. One alone does not, as a service that is
-/// overloaded answers some.
+/// What ends it: its time. An answer of the service in between, to the customer's own call, tells that the service is
+/// back, but tells so to all players within the same minute. It brings the end forward to a moment that is drawn
+/// between now (or the end of the Retry-After) and kReturn later, once in a pause. So a player whose own network was
+/// gone for an hour does not wait for its long pause, and the others do not return together.
+///
+/// What makes pauses short again: kAnswersToRecover answers in a row. One alone does not: a service that is overloaded
+/// answers some.
 class Backoff {
 public:
     static constexpr uint64_t kBase = 30 * 1000;                      ///< Milliseconds: the longest first pause.
@@ -44,9 +47,9 @@ public:
         } else if (retryAfter == 0) {
             return;
         }
-        const uint64_t earliest = now + 1000ull * std::min(retryAfter, kLongestRetryAfter);
-        m_Earliest = isFirst ? earliest : std::max(m_Earliest, earliest);
-        m_End = std::max(m_End, earliest + Draw(random, Window()));
+        const uint64_t asked = 1000ull * std::min(retryAfter, kLongestRetryAfter);
+        m_Earliest = isFirst ? now + asked : std::max(m_Earliest, now + asked);
+        m_End = std::max(m_End, now + asked + Draw(random, std::max(Limit(), std::min(asked, kCap))));
     }
 
     /// The service itself answered.
@@ -61,12 +64,12 @@ public:
 private:
     static uint64_t Draw(uint32_t random, uint64_t most) { return (random * (most + 1)) >> 32; }
 
-    uint64_t Window() const
+    uint64_t Limit() const
     {
-        uint64_t window = kBase;
-        for (unsigned int i = 1; i < m_Failures && window < kCap; ++i)
-            window *= 2;
-        return std::min(window, kCap);
+        uint64_t limit = kBase;
+        for (unsigned int i = 1; i < m_Failures && limit < kCap; ++i)
+            limit *= 2;
+        return std::min(limit, kCap);
     }
 
     uint64_t m_End = 0;       // of the last pause
