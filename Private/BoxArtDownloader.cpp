@@ -66,8 +66,8 @@ ZV_WS_Status BoxArtDownloader::Fetch(const ZVString& path, const ZVString& ifMod
     const ZVString& host = m_Transport.deployment().image_host;
     RawHttp http(m_Transport);
     if (!http.Connect(ZVString("http://") + host + path)) return ZV_WS_Status_connection_error;
-    ZVString condition;
-    if (!ifModifiedSince.empty()) condition = ZVString("If-Modified-Since: ") + ifModifiedSince + "\r\n";
+    // What is kept of an older answer may be anything.
+    const ZVString condition = IsHeaderText(ifModifiedSince.c_str()) ? ifModifiedSince : ZVString();
     if (!http.SendGet(path, host, RawHttp::Order::AgentFirst, condition) || !http.ReceiveHead()) {
         return ZV_WS_Status_net_error;
     }

@@ -211,13 +211,18 @@ void CacheWriter::Batch::Settle()
     if (m_HasEvicted) CacheSweep(m_Writer->m_Path).AfterEviction();
 }
 
+static void WriteAlone(CacheWriter::Batch& batch, CacheInterface& cache)
+{
+    cache.Together([&] { return batch.Write(cache); });
+}
+
 void CacheWriter::Flush()
 {
     WithinMemory([&] {
         ZVMutexLock lock(m_CacheMutex);
         Batch batch(this);
         if (batch.empty()) return;
-        m_Cache.Together([&] { return batch.Write(m_Cache); });
+        WriteAlone(batch, m_Cache);
         batch.Settle();  // also what could not be written: the database will not want it later either
     });
 }
@@ -244,8 +249,14 @@ bool CacheWriter::EnsureThread()
     if (m_IsRunning) return true;
     ZVThread::SafeDestroyThread(std::exchange(m_Thread, nullptr));  // it has ended
     const auto run = [](void* self) { static_cast<CacheWriter*>(self)->WriteWhenDue(); };
-    return WithinMemory([&] { m_Thread = ZVThread::CreateThread(); }) &&
-           WithinMemory([&] { m_IsRunning = m_Thread->Run("cache writer", run, this); }) && m_IsRunning;
+    ZVThread* thread = nullptr;
+    bool isRunning = false;
+    WithinMemory([&] {
+        thread = ZVThread::CreateThread();
+        isRunning = thread->Run("cache writer", run, this);
+    });
+    m_Thread = thread;
+    return m_IsRunning = isRunning;
 }
 
 void CacheWriter::WriteWhenDue()

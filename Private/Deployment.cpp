@@ -14,7 +14,7 @@
 
 namespace {
 
-enum class Kind { Host, File };
+enum class Kind { Host, File, Seconds };
 
 struct Key {
     const char* name;
@@ -33,6 +33,8 @@ const Key kKeys[] = {
     {"web_host", &Deployment::web_host, Kind::Host, "www.zorvane.example"},
     {"ca_file", &Deployment::ca_file, Kind::File, ""},
     {"device_key_file", &Deployment::device_key_file, Kind::File, ""},
+    {"clock_file", &Deployment::clock_file, Kind::File, ""},
+    {"connection_idle_limit", &Deployment::connection_idle_limit, Kind::Seconds, "30"},
 };
 
 Deployment Defaults()
@@ -49,6 +51,13 @@ ZVString Trimmed(ZVString text)
     return text;
 }
 
+bool IsSeconds(const ZVString& value)
+{
+    const std::string text = value.c_str();
+    return !text.empty() && text.size() <= 5 && text.find_first_not_of("0123456789") == std::string::npos &&
+           atoi(text.c_str()) <= 86400;
+}
+
 // What is wrong with the line (trimmed), or null.
 const char* ReadLine(const ZVString& line, Deployment& values)
 {
@@ -62,6 +71,7 @@ const char* ReadLine(const ZVString& line, Deployment& values)
         ZVString host;
         int port = 0;
         if (key.kind == Kind::Host && !SplitHostPort(value, 1, host, port)) return "not a host or host:port";
+        if (key.kind == Kind::Seconds && !IsSeconds(value)) return "not a number of seconds up to 86400";
         values.*key.value = value;
         return nullptr;
     }
@@ -143,6 +153,11 @@ void Deployment::MakeBaseUrls()
     };
     for (int i = 0; i < 2 * kEnvironments; ++i)
         m_BaseUrls[i] = ZVString("https://") + this->*table[i].host + table[i].path;
+}
+
+uint64_t Deployment::ConnectionIdleLimit() const
+{
+    return 1000 * strtoull(connection_idle_limit.c_str(), nullptr, 10);
 }
 
 const char* Deployment::BaseUrl(ContentType type, int environment) const

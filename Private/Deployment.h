@@ -1,6 +1,8 @@
 // Where the services are and whom to trust: the values that differ between a store in production and one on a desk.
 #pragma once
 
+#include <stdint.h>
+
 #include "ZVString.h"
 #include "ZVWSLib.h"
 
@@ -16,6 +18,11 @@ struct Deployment {
     ZVString web_host;
     ZVString ca_file;
     ZVString device_key_file;
+    ZVString clock_file;
+    ZVString connection_idle_limit;
+
+    /// How long a connection may have rested to be used again, in milliseconds.
+    uint64_t ConnectionIdleLimit() const;
 
     /// The services' base URL for a content type and an environment; production for any other environment.
     const char* BaseUrl(ContentType type, int environment) const;

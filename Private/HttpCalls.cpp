@@ -9,6 +9,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <set>
 
 #include "CallGuard.h"
 #include "RawHttp.h"
@@ -33,6 +34,43 @@ struct SoapDeleter {
         soap_end(context);
         soap_free(context);
     }
+};
+
+// The connections that belong to no session.
+struct ClockQueries {
+    ZVMutex mutex;
+    std::set<Transport*> underWay ZV_GUARDED_BY(mutex);
+
+    static ClockQueries& Get()
+    {
+        static auto* queries = new ClockQueries;  // outlives threads that still ask at exit
+        return *queries;
+    }
+};
+
+class ClockQuery {
+public:
+    explicit ClockQuery(soap& context) : m_Transport(context)
+    {
+        m_Transport.SetTimeouts(kClockTimeout, kClockTimeout);
+        m_Transport.SetProxy(Proxy::Current());
+        ClockQueries& queries = ClockQueries::Get();
+        ZVMutexLock lock(queries.mutex);
+        queries.underWay.insert(&m_Transport);
+    }
+    ~ClockQuery()
+    {
+        ClockQueries& queries = ClockQueries::Get();
+        ZVMutexLock lock(queries.mutex);
+        queries.underWay.erase(&m_Transport);
+    }
+    ClockQuery(const ClockQuery&) = delete;
+    ClockQuery& operator=(const ClockQuery&) = delete;
+
+    Transport& transport() { return m_Transport; }
+
+private:
+    Transport m_Transport;
 };
 
 // "3/7/2011 1:30:00 PM", as UTC. An hour of 12 gets its twelve more like the others.
@@ -126,7 +164,7 @@ ZV_WS_Status CheckBandwidth(ZV_WS_Session* handle, unsigned int& bitsPerSecond)
     SessionImpl& session = *handle->_pSessionImpl;
     ZVString host, path;
     SplitUrl(url, host, path);
-    if (host.empty() || path.empty()) return ZV_WS_Status_invalid_bandwidth_check_url;
+    if (host.empty() || path.empty() || !IsRequestText(url.c_str())) return ZV_WS_Status_invalid_bandwidth_check_url;
     RawHttp http(session.m_Stream.transport());
     if (!http.Connect(url)) return ZV_WS_Status_connection_error;
     if (!http.SendGet(ZVString("/") + path, host, RawHttp::Order::HostFirst) || !http.ReceiveHead()) {
@@ -165,6 +203,14 @@ ZV_WS_Status AddressTowardsService(SessionImpl& session, ZVString& address)
 
 }  // namespace
 
+void ZVUtilities::AbortClockQueries()
+{
+    ClockQueries& queries = ClockQueries::Get();
+    ZVMutexLock lock(queries.mutex);
+    for (Transport* transport : queries.underWay)
+        transport->Abort();
+}
+
 ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime)
 {
     ZV_ASSERT(serverTime != 0);
@@ -172,9 +218,8 @@ ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime)
     return LogStatus(__func__, GuardCall([&] {
                          const std::unique_ptr<soap, SoapDeleter> context(soap_new());
                          if (!context) return ZV_WS_Status_general_error;
-                         Transport transport(*context);
-                         transport.SetTimeouts(kClockTimeout, kClockTimeout);
-                         RawHttp http(transport);
+                         ClockQuery query(*context);
+                         RawHttp http(query.transport());
                          return ReadClock(http, Deployment::Current().web_host, *serverTime);
                      }));
 }

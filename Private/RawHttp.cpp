@@ -16,6 +16,19 @@ const char kHeadEnd[] = "\r\n\r\n";
 
 }  // namespace
 
+bool IsHeaderText(const char* text)
+{
+    for (; *text; ++text) {
+        if (static_cast<unsigned char>(*text) < 0x20 || *text == 0x7f) return false;
+    }
+    return true;
+}
+
+bool IsRequestText(const char* text)
+{
+    return IsHeaderText(text) && !strchr(text, ' ');
+}
+
 void SplitUrl(const ZVString& url, ZVString& host, ZVString& path)
 {
     const char* start = strstr(url.c_str(), "//");
@@ -28,8 +41,6 @@ void SplitUrl(const ZVString& url, ZVString& host, ZVString& path)
 
 RawHttp::RawHttp(Transport& transport) : m_Transport(transport)
 {
-    const soap& context = transport.context();
-    m_Deadline = ZVUtilities::MillisecondTime() + 1000ull * (context.connect_timeout + context.recv_timeout);
     m_Head[0] = '\0';
     m_Transport.Close();
 }
@@ -39,7 +50,8 @@ bool RawHttp::Connect(const ZVString& url)
     ZVString hostPort, path, host;
     int port = 0;
     SplitUrl(url, hostPort, path);
-    const int standardPort = Transport::IsTls(url.c_str()) ? 443 : 80;
+    m_IsTls = Transport::IsTls(url.c_str());
+    const int standardPort = m_IsTls ? 443 : 80;
     if (!SplitHostPort(hostPort, standardPort, host, port) || !m_Transport.UseHost(url.c_str())) return false;
     soap& context = m_Transport.context();
     context.error = SOAP_OK;
@@ -48,20 +60,26 @@ bool RawHttp::Connect(const ZVString& url)
     return context.error == SOAP_OK && soap_valid_socket(context.socket);
 }
 
-bool RawHttp::SendGet(const ZVString& path, const ZVString& host, Order order, const ZVString& more)
+bool RawHttp::SendGet(const ZVString& path, const ZVString& host, Order order, const ZVString& condition)
 {
+    if (!IsRequestText(path.c_str()) || !IsRequestText(host.c_str()) || !IsHeaderText(condition.c_str())) return false;
+    const Proxy& proxy = m_Transport.proxy();
+    // Inside a tunnel the proxy is not there.
+    const bool asksProxy = proxy.IsUsed() && !m_IsTls;
     const ZVString agentLine = "User-Agent: ZVWSLib\r\n";
     const ZVString hostLine = ZVString("Host: ") + host + kLineEnd;
     const bool agentFirst = order == Order::AgentFirst;
-    const ZVString text = ZVString("GET ") + path + " HTTP/1.1\r\n" + more + (agentFirst ? agentLine : hostLine) +
-                          (agentFirst ? hostLine : agentLine) + kLineEnd;
+    ZVString text = ZVString("GET ") + (asksProxy ? ZVString("http://") + host : ZVString()) + path + " HTTP/1.1\r\n";
+    if (!condition.empty()) text += ZVString("If-Modified-Since: ") + condition + kLineEnd;
+    text += (agentFirst ? agentLine : hostLine) + (agentFirst ? hostLine : agentLine);
+    if (asksProxy) text += proxy.AuthorizationLine();
+    text += kLineEnd;
     soap& context = m_Transport.context();
     return context.fsend(&context, text.c_str(), text.length()) == SOAP_OK;
 }
 
 size_t RawHttp::Receive(char* buffer, size_t size)
 {
-    if (ZVUtilities::MillisecondTime() >= m_Deadline) return 0;
     soap& context = m_Transport.context();
     return context.frecv(&context, buffer, size);
 }

@@ -1,11 +1,16 @@
 // One hand-built HTTP/1.1 GET over a SOAP context's socket, for the few answers that are not SOAP.
 //
 // The exchange takes the context's connection: a kept one is closed before, its own afterwards, so that the context's
-// next SOAP call starts from a defined state. What is read is bounded by the caller's pieces and, in time, by one
-// deadline for all of it.
+// next SOAP call starts from a defined state. What is read is bounded by the caller's pieces and, in time, by the
+// transport's deadline for an exchange.
 #pragma once
 
 #include "Transport.h"
+
+/// Whether the text, or the address, can stand in a request line (no blanks) or in a header line: it holds no control
+/// character, with which one value would write others.
+bool IsHeaderText(const char* text);
+bool IsRequestText(const char* text);
 
 /// The host (with its port, when it has one) and the path without its first "/" of "scheme://host/path"; empty where
 /// missing.
@@ -28,8 +33,9 @@ public:
     /// "https:".
     bool Connect(const ZVString& url);
 
-    /// Sends "GET path" with the two header lines, and before them `more` whole ones. False when it cannot be sent.
-    bool SendGet(const ZVString& path, const ZVString& host, Order order, const ZVString& more = ZVString());
+    /// Sends "GET path" with the two header lines, and before them that of the condition (the value of
+    /// "If-Modified-Since"; none when it is empty). False when it cannot be sent, or holds what a request cannot.
+    bool SendGet(const ZVString& path, const ZVString& host, Order order, const ZVString& condition = ZVString());
 
     /// Receives once, at most 2047 bytes: the answer's head, perhaps with the start of its body. False when nothing
     /// came.
@@ -50,7 +56,7 @@ public:
     /// The part of the body that came with the head. False when the head has no end.
     bool BodyStart(const char*& bytes, size_t& length) const;
 
-    /// Receives once, at most `size` bytes. 0 at the end, on failure and past the deadline.
+    /// Receives once, at most `size` bytes. 0 at the end and on failure.
     size_t Receive(char* buffer, size_t size);
 
     /// The dotted-quad address of this end of the connection.
@@ -59,7 +65,7 @@ public:
 private:
     Transport& m_Transport;
     SigpipeGuard m_Guard;
-    uint64_t m_Deadline;
+    bool m_IsTls = false;
     size_t m_HeadLength = 0;
     char m_Head[kPiece];
 };

@@ -18,11 +18,6 @@ const char kHeader[] = "Retry-After";
 
 }  // namespace
 
-RetryAfter::RetryAfter(soap& context) : m_ParseHeader(context.fparsehdr)
-{
-    context.fparsehdr = HeaderHook;
-}
-
 void RetryAfter::Begin()
 {
     m_Heard = Heard();
@@ -36,13 +31,10 @@ void RetryAfter::Answered(int status)
     m_Heard.unavailable = status == kUnavailable;
 }
 
-// For each header line of an answer; the runtime has read the status line.
-int RetryAfter::HeaderHook(soap* context, const char* key, const char* value)
+void RetryAfter::ReadHeader(int status, const char* name, const char* value)
 {
-    RetryAfter& self = Transport::Of(context).retryAfter();
-    self.Answered(context->status);
-    if (self.m_Heard.unavailable && strcasecmp(key, kHeader) == 0) self.m_Heard.seconds = SecondsOf(value);
-    return self.m_ParseHeader(context, key, value);
+    Answered(status);
+    if (m_Heard.unavailable && strcasecmp(name, kHeader) == 0) m_Heard.seconds = SecondsOf(value);
 }
 
 void RetryAfter::ReadHead(const char* head)

@@ -2,8 +2,6 @@
 // wants to be left alone ("Retry-After" of an HTTP 503). Whoever asks a service unbidden goes by it.
 #pragma once
 
-#include <stdsoap2.h>
-
 #include "ZVWSLib.h"
 
 /// Of one transport, and used like it by one thread at a time.
@@ -17,12 +15,11 @@ public:
         unsigned int seconds = 0;  ///< Its Retry-After. 0: none, or a date: the player's clock may be wrong.
     };
 
-    /// Listens in on the answers that the context (borrowed) reads.
-    explicit RetryAfter(soap& context);
-
     /// A request is about to be sent.
     void Begin();
-    /// The head of an answer that is no SOAP: the bytes from its status line on.
+    /// A header line of an answer with that HTTP status.
+    void ReadHeader(int status, const char* name, const char* value);
+    /// The head of an answer: the bytes from its status line on.
     void ReadHead(const char* head);
 
     /// What was heard in the session's last call. For the thread that uses the session.
@@ -33,8 +30,6 @@ public:
 
 private:
     void Answered(int status);
-    static int HeaderHook(soap* context, const char* key, const char* value);
 
-    decltype(soap::fparsehdr) m_ParseHeader;
     Heard m_Heard;
 };

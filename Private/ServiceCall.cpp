@@ -19,6 +19,7 @@ ZV_WS_Status ServiceCallBase::Finish(soap& context, const Outcome& outcome)
     soap_end(&context);
     context.header = nullptr;
     LogCall(m_Function, outcome.result, outcome.responseCode);
+    if (m_ClockIsWrong) return ZV_WS_Status_clock_wrong;
     if (outcome.result == SOAP_OK && !outcome.answered) return ZV_WS_Status_general_error;
     return ZVUtilities::To_ZV_WS_Status(outcome.result, m_UsesResponseCode ? outcome.responseCode : 0, m_Function);
 }

@@ -9,7 +9,7 @@
 // The first line empties and tags the output, so that it can be released however the call ends. Then the call's own
 // argument checks, where the cache keeps the answer (if it does), and the request's children. Into looks there, or
 // sends the request, once more when a connection kept from an earlier call turns out to be dead and the operation
-// allows it, converts the answer's result (Conversion.h), cleans up, writes the log line and maps the status.
+// allows it, or when the service refuses it for a wrong clock, converts the answer's result (Conversion.h), cleans up, writes the log line and maps the status.
 // Nothing is thrown through it.
 #pragma once
 
@@ -97,6 +97,7 @@ protected:
     bool m_Tagged = true;
     Change m_Change = Change::None;
     bool m_UsesResponseCode = true;
+    bool m_ClockIsWrong = false;
     AnswerCache::Entry m_Entry;
 };
 
@@ -253,13 +254,19 @@ int ServiceCallBase::Exchange(Service& service, const char* operation, bool once
     Transport& transport = service.transport();
     LogProxy("Entering", service.ProxyName(), operation);
     int result = SOAP_OK;
-    bool mayRetry = !once;
+    bool mayReconnect = !once, mayResign = true;
+    const auto isToRepeat = [&] {
+        // What is refused for the time in its header has changed nothing.
+        if (transport.ClockVerdict() == Clock::Verdict::Learned) return std::exchange(mayResign, false);
+        return result == SOAP_EOF && transport.KeptConnectionDied() && std::exchange(mayReconnect, false);
+    };
     do {
         transport.BeginExchange();
         result = service.Setup(operation);
         if (result == SOAP_OK) result = send();
         transport.EndExchange(result);
-    } while (result == SOAP_EOF && transport.KeptConnectionDied() && std::exchange(mayRetry, false));
+    } while (isToRepeat());
+    m_ClockIsWrong = transport.ClockVerdict() == Clock::Verdict::Wrong;
     LogProxy("Exiting", service.ProxyName(), operation);
     return result;
 }

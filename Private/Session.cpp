@@ -4,6 +4,7 @@
 #include "CacheMgr.h"
 #include "CacheSweep.h"
 #include "CallGuard.h"
+#include "RawHttp.h"
 #include "Records.h"
 #include "SessionImpl.h"
 #include "ZVAssert.h"
@@ -31,15 +32,6 @@ bool IsGiven(const char* text)
     return text && *text;
 }
 
-// Everything that ends up in a header or a request line; a control character there would let one value write others.
-bool HoldsNoControls(const char* text)
-{
-    for (; text && *text; ++text) {
-        if (static_cast<unsigned char>(*text) < 0x20 || *text == 0x7f) return false;
-    }
-    return true;
-}
-
 bool AreValid(const ZV_WS_SetupParams& params)
 {
     for (const char* required : {params.APIKey, params.DestinationUniqueID, params.UserName, params.Password}) {
@@ -50,7 +42,7 @@ bool AreValid(const ZV_WS_SetupParams& params)
     if (strlen(params.DestinationUniqueID) > kLongestUniqueID) return false;
     if (cache.Type != CacheType_None && cache.Limit != 0 && cache.Limit < kSmallestCacheLimit) return false;
     for (const char* sent : {params.ApplicationRevision, params.FirmwareRevision, params.ModelCode}) {
-        if (!HoldsNoControls(sent)) return false;
+        if (sent && !IsHeaderText(sent)) return false;
     }
     return true;
 }
@@ -121,11 +113,27 @@ ZVString MakeUserAgent(const ZV_WS_SetupParams2& params)
     return agent;
 }
 
-bool LoadAuthorities(SessionImpl& session, const Deployment& deployment)
+Proxy ProxyOf(const ZV_WS_SetupParams2& params)
 {
-    return session.m_Browse.transport().LoadAuthorities(deployment) &&
-           session.m_Stream.transport().LoadAuthorities(deployment) &&
-           session.m_Download.transport().LoadAuthorities(deployment);
+    Proxy proxy;
+    proxy.host = params.ProxyHost;
+    proxy.port = params.ProxyPort;
+    proxy.userName = params.ProxyUserName;
+    proxy.password = params.ProxyPassword;
+    return proxy;
+}
+
+// Whom the session's connections trust, and which way they go. False when the authorities cannot be loaded.
+bool PrepareConnections(SessionImpl& session, const Deployment& deployment)
+{
+    const Proxy proxy = ProxyOf(session.m_Params);
+    proxy.MakeCurrent();
+    for (Transport* transport :
+         {&session.m_Browse.transport(), &session.m_Stream.transport(), &session.m_Download.transport()}) {
+        if (!transport->LoadAuthorities(deployment)) return false;
+        transport->SetProxy(proxy);
+    }
+    return true;
 }
 
 void SetParams(SessionImpl& session)
@@ -228,11 +236,14 @@ ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
     CopyProxy(own, params.ProxyParam);
     CopyCache(own, params.CacheParam);
 
-    if (!LoadAuthorities(session, *deployment)) return ZV_WS_Status_ssl_error;
+    if (!PrepareConnections(session, *deployment)) return ZV_WS_Status_ssl_error;
     own.ServiceBaseURL =
         ZVUtilities::QueryServiceBaseURL(params.Type, &session.m_Stream, own.DestinationUniqueID.c_str(),
                                          own.DestinationTypeID, params.EnvNum, own.EnvID);
-    if (own.ServiceBaseURL.empty()) return ZV_WS_Status_connection_error;
+    if (own.ServiceBaseURL.empty()) {
+        const bool isClockWrong = session.m_Stream.transport().ClockVerdict() == Clock::Verdict::Wrong;
+        return isClockWrong ? ZV_WS_Status_clock_wrong : ZV_WS_Status_connection_error;
+    }
 
     CopyGiven(own.ApplicationRevision, params.ApplicationRevision);
     CopyGiven(own.FirmwareRevision, params.FirmwareRevision);
@@ -294,8 +305,8 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
         MakeSession(*newHandle);
         SessionImpl& session = *newHandle->_pSessionImpl;
         const Deployment& deployment = source->_pSessionImpl->m_Browse.transport().deployment();
-        if (!LoadAuthorities(session, deployment)) return ZV_WS_Status_ssl_error;
         session.m_Params = source->_pSessionImpl->m_Params;
+        if (!PrepareConnections(session, deployment)) return ZV_WS_Status_ssl_error;
         SetParams(session);
         InitFacade(session);
         // A memory cache is one session's own.
@@ -306,7 +317,7 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
 
 void ZV_WS_abort(const ZV_WS_Session* handle)
 {
-    if (!handle) return;
+    if (!handle) return ZVUtilities::AbortClockQueries();
     ZVMutexLock lock(HandleMutex());
     SessionImpl* session = handle->_pSessionImpl;
     if (!session) return;

@@ -5,6 +5,7 @@
 #include <stdio.h>
 #include <stdsoap2.h>
 
+#include <algorithm>
 #include <map>
 #include <string>
 #include <utility>
@@ -33,27 +34,45 @@ public:
         SSL_CTX*& context = m_Contexts[{caFile, host}];
         if (!context) context = Make(AuthoritiesLocked(caFile), host);
         if (!context) return nullptr;
-        m_Sessions[context];  // here, since Keep must not throw
+        m_Hosts[context];  // here, since Keep must not throw
         SSL_CTX_up_ref(context);
         return context;
     }
 
-    // Takes the reference. The TLS library calls this, too.
+    // Takes the session, which nobody else uses.
     void Keep(SSL_CTX* context, SSL_SESSION* session) ZV_EXCLUDES(m_Mutex)
     {
         ZVMutexLock lock(m_Mutex);
-        std::swap(m_Sessions.find(context)->second, session);
+        std::swap(m_Hosts.find(context)->second.newest, session);
         SSL_SESSION_free(session);
     }
 
     SSL_SESSION* Session(SSL_CTX* context) ZV_EXCLUDES(m_Mutex)
     {
         ZVMutexLock lock(m_Mutex);
-        SSL_SESSION* newest = m_Sessions.find(context)->second;
+        SSL_SESSION* newest = m_Hosts.find(context)->second.newest;
         return newest ? SSL_SESSION_dup(newest) : nullptr;
     }
 
+    void NoteValidity(SSL_CTX* context, const Clock::Validity& validity) ZV_EXCLUDES(m_Mutex)
+    {
+        ZVMutexLock lock(m_Mutex);
+        m_Hosts.find(context)->second.validity = validity;
+    }
+
+    Clock::Validity Validity(SSL_CTX* context) ZV_EXCLUDES(m_Mutex)
+    {
+        ZVMutexLock lock(m_Mutex);
+        return m_Hosts.find(context)->second.validity;
+    }
+
 private:
+    // What its connections have left behind.
+    struct Host {
+        SSL_SESSION* newest = nullptr;
+        Clock::Validity validity;
+    };
+
     static int KeepSession(SSL* connection, SSL_SESSION* session);
 
     X509_STORE* AuthoritiesLocked(const std::string& caFile) ZV_REQUIRES(m_Mutex)
@@ -101,7 +120,7 @@ private:
     ZVMutex m_Mutex;
     std::map<std::string, X509_STORE*> m_Authorities ZV_GUARDED_BY(m_Mutex);
     std::map<std::pair<std::string, std::string>, SSL_CTX*> m_Contexts ZV_GUARDED_BY(m_Mutex);
-    std::map<SSL_CTX*, SSL_SESSION*> m_Sessions ZV_GUARDED_BY(m_Mutex);  // of every context
+    std::map<SSL_CTX*, Host> m_Hosts ZV_GUARDED_BY(m_Mutex);  // of every context
 };
 
 Contexts& TheContexts()
@@ -111,16 +130,22 @@ Contexts& TheContexts()
     return *contexts;
 }
 
-// On the thread that reads from the connection.
+// On the thread that reads from the connection. The connection goes on with its own session, so a copy is kept.
 int Contexts::KeepSession(SSL* connection, SSL_SESSION* session)
 {
-    TheContexts().Keep(SSL_get_SSL_CTX(connection), session);
-    return 1;
+    if (SSL_SESSION* copy = SSL_SESSION_dup(session)) TheContexts().Keep(SSL_get_SSL_CTX(connection), copy);
+    return 0;
 }
 
 std::string Text(const ZVString& text)
 {
     return std::string(text.c_str(), text.length());
+}
+
+time_t TimeOf(const ASN1_TIME* time)
+{
+    tm parts = {};
+    return ASN1_TIME_to_tm(time, &parts) == 1 ? timegm(&parts) : 0;
 }
 
 }  // namespace
@@ -145,6 +170,25 @@ SSL_SESSION* SessionFor(SSL_CTX* context)
 void ForgetSession(SSL_CTX* context)
 {
     TheContexts().Keep(context, nullptr);
+}
+
+// A resumed connection shows no certificates: what is known of them stays.
+void NoteValidity(const SSL* connection)
+{
+    const STACK_OF(X509)* chain = SSL_get0_verified_chain(connection);
+    if (!chain || sk_X509_num(chain) == 0) return;
+    Clock::Validity together = {0, TimeOf(X509_get0_notAfter(sk_X509_value(chain, 0)))};
+    for (int i = 0; i < sk_X509_num(chain); ++i) {
+        const X509* certificate = sk_X509_value(chain, i);
+        together.from = std::max(together.from, TimeOf(X509_get0_notBefore(certificate)));
+        together.to = std::min(together.to, TimeOf(X509_get0_notAfter(certificate)));
+    }
+    TheContexts().NoteValidity(SSL_get_SSL_CTX(connection), together);
+}
+
+Clock::Validity ValidityFor(SSL_CTX* context)
+{
+    return TheContexts().Validity(context);
 }
 
 }  // namespace Tls

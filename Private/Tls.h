@@ -6,6 +6,7 @@
 
 #include <openssl/ssl.h>
 
+#include "Clock.h"
 #include "ZVString.h"
 
 namespace Tls {
@@ -24,5 +25,10 @@ SSL_SESSION* SessionFor(SSL_CTX* context);
 
 /// Makes the next connection's handshake a full one.
 void ForgetSession(SSL_CTX* context);
+
+/// After a handshake: notes from when to when all certificates are valid by which the peer has proved itself.
+void NoteValidity(const SSL* connection);
+/// As of the host's last full handshake.
+Clock::Validity ValidityFor(SSL_CTX* context);
 
 }  // namespace Tls

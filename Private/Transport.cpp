@@ -8,7 +8,6 @@
 
 #include <algorithm>
 
-#include "Connector.h"
 #include "Namespaces.h"
 #include "RawHttp.h"
 #include "ReadLimits.h"
@@ -23,6 +22,14 @@ constexpr int kReceiveSeconds = 88;
 
 // The toolkit's own text, sent by a session without a user agent.
 const char kToolkitAgent[] = "gSOAP/2.7";
+
+// Whether the service has refused a request for what it is, or for what its header says, and so has not acted on it.
+bool IsRefused(soap& context, int result)
+{
+    if (result == 401 || result == 403 || result == SOAP_CLI_FAULT) return true;
+    const char* code = result == SOAP_FAULT && context.fault ? *soap_faultcode(&context) : nullptr;
+    return code && (strncmp(code, "wsse:", 5) == 0 || strncmp(code, "wsu:", 4) == 0);
+}
 
 }  // namespace
 
@@ -49,13 +56,7 @@ SigpipeGuard::~SigpipeGuard()
     pthread_sigmask(SIG_SETMASK, &m_Before, nullptr);
 }
 
-Transport::Transport(soap& context)
-    : m_Soap(context),
-      m_Open(context.fopen),
-      m_CloseSocket(context.fclosesocket),
-      m_Send(context.fsend),
-      m_Receive(context.frecv),
-      m_Header(context.fposthdr)
+Transport::Transport(soap& context) : m_Soap(context), m_Header(context.fposthdr), m_AnswerHeader(context.fparsehdr)
 {
     soap_init_zv_log();
     soap_set_namespaces(&context, namespaces);
@@ -65,8 +66,8 @@ Transport::Transport(soap& context)
     context.frecv = ReceiveHook;
     context.fpreparerecv = PreparedHook;
     context.fposthdr = HeaderHook;
+    context.fparsehdr = AnswerHeaderHook;
     context.fshutdownsocket = ShutdownHook;
-    context.fclosesocket = CloseHook;
     context.cookie_max = 0;
     LimitReading(context);
     context.ssl_flags = SOAP_SSL_DEFAULT | SOAP_TLSv1_2 | SOAP_TLSv1_3 | SOAP_SSL_NO_DEFAULT_CA_PATH;
@@ -109,35 +110,54 @@ void Transport::ForgetTls()
 
 void Transport::SetTimeouts(int sendSeconds, int receiveSeconds)
 {
-    m_Soap.connect_timeout = sendSeconds;
-    m_Soap.send_timeout = sendSeconds;
-    m_Soap.recv_timeout = receiveSeconds;
-    m_Soap.transfer_timeout = sendSeconds + receiveSeconds;  // a peer that drips bytes never meets the others
+    m_SendTimeout = 1000ull * static_cast<unsigned int>(sendSeconds);
+    m_ReceiveTimeout = 1000ull * static_cast<unsigned int>(receiveSeconds);
 }
 
 void Transport::BeginExchange()
 {
     m_Begun = ZVUtilities::MillisecondTime();
+    const bool isUsable = m_Begun - m_Rests < deployment().ConnectionIdleLimit() && OpenConnection().IsQuiet();
+    if (soap_valid_socket(m_Soap.socket) && !isUsable) Close();
     m_Connected = false;
     m_HasSent = false;
     m_Received = 0;
-    m_Soap.start = static_cast<ULONG64>(time(nullptr));  // of transfer_timeout; the runtime sets it for SOAP alone
+    m_ClockOffset = Clock::Offset();
+    m_ClockVerdict = Clock::Verdict::Right;
     m_RetryAfter.Begin();
     m_SentSecrets.Restart();
     m_ReceivedSecrets.Restart();
 }
 
+// A peer that drips bytes never meets the timeouts of single steps.
+Patience Transport::PatienceFor(uint64_t milliseconds) const
+{
+    const uint64_t end = m_Begun + m_SendTimeout + m_ReceiveTimeout;
+    return {std::min(end, ZVUtilities::MillisecondTime() + milliseconds), m_Aborted};
+}
+
 bool Transport::KeptConnectionDied() const
 {
-    const uint64_t shortestTimeout =
-        1000ull * static_cast<unsigned int>(std::min(m_Soap.send_timeout, m_Soap.recv_timeout));
-    return !m_Connected && m_Received == 0 && ZVUtilities::MillisecondTime() - m_Begun < shortestTimeout;
+    const uint64_t shortestTimeout = std::min(m_SendTimeout, m_ReceiveTimeout);
+    return !m_Connected && m_Received == 0 && !m_Aborted && ZVUtilities::MillisecondTime() - m_Begun < shortestTimeout;
 }
 
 void Transport::EndExchange(int result)
 {
+    LookAtClock(result);
+    m_Rests = ZVUtilities::MillisecondTime();
     const bool leftOver = m_Soap.bufidx < m_Soap.buflen;
     if (result != SOAP_OK || leftOver) Close();
+}
+
+// Only what comes over a verified connection, and from the service itself, says something about the time.
+void Transport::LookAtClock(int result)
+{
+    if (m_Date == 0 || m_IsOld || !m_Soap.ssl) return;
+    if (result == SOAP_OK) Clock::NoteGood(m_Date, deployment());
+    if (IsRefused(m_Soap, result)) {
+        m_ClockVerdict = Clock::Compare(m_Date, m_ClockOffset, Tls::ValidityFor(m_Soap.ctx));
+    }
 }
 
 void Transport::Close()
@@ -157,77 +177,74 @@ SOAP_SOCKET Transport::OpenHook(soap* context, const char* endpoint, const char*
 {
     Transport& self = Of(context);
     self.m_Connected = true;
-    // The way through a proxy is the toolkit's.
-    const SOAP_SOCKET socket =
-        context->proxy_host ? self.m_Open(context, endpoint, host, port) : self.Open(endpoint, host, port);
-    self.Watch(socket);
-    return socket;
+    context->errnum = 0;
+    context->error = SOAP_OK;
+    return self.Open(endpoint, host, port);
 }
 
 SOAP_SOCKET Transport::Open(const char* endpoint, const char* host, int port)
 {
-    const Patience patience = {ZVUtilities::MillisecondTime() + 1000ull * m_Soap.connect_timeout, m_Aborted};
+    const Patience patience = PatienceFor(m_SendTimeout);
     m_Soap.imode &= ~SOAP_ENC_SSL;
     m_Soap.omode &= ~SOAP_ENC_SSL;
-    m_Soap.errnum = 0;
-    const int socket = Connector::OpenTcp(host, port, patience);
+    const int socket = m_Proxy.IsUsed() ? Connector::OpenTcp(m_Proxy.host, m_Proxy.port, patience)
+                                        : Connector::OpenTcp(host, port, patience);
     if (socket < 0) {
         m_Soap.error = SOAP_TCP_ERROR;
         return SOAP_INVALID_SOCKET;
     }
-    if (!IsTls(endpoint) || OpenTls(socket, host, patience)) return socket;
+    if (IsTls(endpoint)) {
+        if (m_Proxy.IsUsed()) m_Soap.error = OpenTunnel(socket, host, port, patience);
+        if (m_Soap.error == SOAP_OK && !OpenTls(socket, host, patience)) m_Soap.error = SOAP_SSL_ERROR;
+    }
+    if (m_Soap.error == SOAP_OK) return socket;
     close(socket);
-    m_Soap.error = SOAP_SSL_ERROR;
     return SOAP_INVALID_SOCKET;
+}
+
+// The SOAP runtime's error number: the proxy's status, when it has one.
+int Transport::OpenTunnel(int socket, const char* host, int port, const Patience& patience)
+{
+    const int status = Connector::OpenTunnel(socket, host, port, m_Proxy, patience);
+    if (status >= 0) return status;
+    return patience.IsOver() ? SOAP_TCP_ERROR : SOAP_HTTP_ERROR;
 }
 
 bool Transport::OpenTls(int socket, const char* host, const Patience& patience)
 {
     SSL_SESSION* const offered = Tls::SessionFor(m_Soap.ctx);
-    m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, offered, patience);
+    const time_t now = Clock::ForCertificates(deployment());
+    time_t validFrom = 0;
+    m_Soap.ssl = Connector::OpenTls(m_Soap.ctx, socket, host, offered, now, patience, validFrom);
     SSL_SESSION_free(offered);
     if (!m_Soap.ssl) {
         Tls::ForgetSession(m_Soap.ctx);  // perhaps it was what the peer did not like
+        if (validFrom != 0) {
+            m_ClockVerdict = Clock::Verdict::Wrong;
+            Clock::TellBehind(validFrom, now);
+        }
         return false;
     }
+    Tls::NoteValidity(m_Soap.ssl);
     m_Soap.imode |= SOAP_ENC_SSL;
     m_Soap.omode |= SOAP_ENC_SSL;
     return true;
-}
-
-void Transport::Watch(SOAP_SOCKET socket)
-{
-    ZVMutexLock lock(m_AbortMutex);
-    m_Watched = socket;
-    if (m_Aborted && soap_valid_socket(socket)) shutdown(socket, SHUT_RDWR);
-}
-
-void Transport::Abort()
-{
-    ZVMutexLock lock(m_AbortMutex);
-    m_Aborted = true;
-    if (soap_valid_socket(m_Watched)) shutdown(m_Watched, SHUT_RDWR);
-}
-
-int Transport::CloseHook(soap* context, SOAP_SOCKET socket)
-{
-    Transport& self = Of(context);
-    self.Watch(SOAP_INVALID_SOCKET);
-    return self.m_CloseSocket(context, socket);
 }
 
 int Transport::SendHook(soap* context, const char* data, size_t length)
 {
     Transport& self = Of(context);
     self.m_HasSent = true;
+    self.m_Date = 0;
+    self.m_IsOld = false;
     TrafficLog::Sent(self.m_SentSecrets, data, length);
-    return self.m_Send(context, data, length);
+    return self.OpenConnection().Send(data, length, self.PatienceFor(self.m_SendTimeout)) ? SOAP_OK : SOAP_EOF;
 }
 
 size_t Transport::ReceiveHook(soap* context, char* buffer, size_t size)
 {
     Transport& self = Of(context);
-    const size_t received = self.m_Receive(context, buffer, size);
+    const size_t received = self.OpenConnection().Receive(buffer, size, self.PatienceFor(self.m_ReceiveTimeout));
     self.m_Received += received;
     return received;
 }
@@ -244,7 +261,18 @@ int Transport::HeaderHook(soap* context, const char* key, const char* value)
     if (key && strcmp(key, "User-Agent") == 0) {
         value = self.m_UserAgent.empty() ? kToolkitAgent : self.m_UserAgent.c_str();
     }
+    // The toolkit would announce deflate, too, of which it reads only one of the two kinds that there are.
+    if (key && strcmp(key, "Accept-Encoding") == 0) value = "gzip";
     return self.m_Header(context, key, value);
+}
+
+int Transport::AnswerHeaderHook(soap* context, const char* key, const char* value)
+{
+    Transport& self = Of(context);
+    self.m_RetryAfter.ReadHeader(context->status, key, value);
+    if (strcasecmp(key, "Date") == 0) self.m_Date = Clock::ParseHttpDate(value);
+    if (strcasecmp(key, "Age") == 0) self.m_IsOld = true;
+    return self.m_AnswerHeader(context, key, value);
 }
 
 // A result other than 0 keeps the runtime from waiting for the peer's side of the close.

@@ -1,5 +1,5 @@
-// What the library adds to a SOAP context: trust, limits, the user agent, the traffic log, and the rules for kept
-// connections.
+// What the library adds to a SOAP context: its connections, trust, limits, the user agent, the traffic log, and the
+// rules for kept connections.
 //
 // One Transport belongs to one context and, like it, to one thread at a time.
 #pragma once
@@ -11,13 +11,12 @@
 
 #include <atomic>
 
+#include "Clock.h"
+#include "Connector.h"
 #include "Deployment.h"
 #include "RetryAfter.h"
 #include "TrafficLog.h"
-#include "ZVMutex.h"
 #include "ZVString.h"
-
-struct Patience;
 
 /// While one exists, a connection that the peer has reset does not kill the process: SIGPIPE is blocked in the calling
 /// thread and taken off it afterwards. The process's own handling of the signal stays as it is.
@@ -52,10 +51,17 @@ public:
     /// none.
     bool UseHost(const char* url);
 
+    /// Everything goes through it from the next connection on.
+    void SetProxy(const Proxy& proxy) { m_Proxy = proxy; }
+    const Proxy& proxy() const { return m_Proxy; }
+
+    /// How long a connection may take and sending may stand still, and how long receiving may: together what a whole
+    /// exchange may take.
     void SetTimeouts(int sendSeconds, int receiveSeconds);
     void SetUserAgent(const ZVString& text) { m_UserAgent = text; }
 
-    /// Before an exchange: what KeptConnectionDied tells is about bytes from here on.
+    /// Before an exchange: what is told below is about this one. A kept connection that has rested too long, that the
+    /// peer has closed, or on which something waits that nobody has asked for, is closed.
     void BeginExchange();
 
     /// Whether anything was sent since then: the peer may have acted on it.
@@ -66,15 +72,18 @@ public:
     bool KeptConnectionDied() const;
 
     /// After an exchange with the SOAP runtime's result: keeps the connection only when the answer was whole and
-    /// nothing is left over.
+    /// nothing is left over. Looks at the clock when the result is a refusal.
     void EndExchange(int result);
+
+    /// Whether the exchange failed for the clock's sake.
+    Clock::Verdict ClockVerdict() const { return m_ClockVerdict; }
 
     /// Closes the connection at once, without waiting for the peer.
     void Close();
 
     /// Any thread: breaks off the exchange that is under way and lets no other begin. For the end of a session whose
     /// call hangs.
-    void Abort() ZV_EXCLUDES(m_AbortMutex);
+    void Abort() { m_Aborted = true; }
 
     /// The one whose authorities were loaded; the current one before.
     const Deployment& deployment() const { return m_Deployment ? *m_Deployment : Deployment::Current(); }
@@ -83,38 +92,46 @@ public:
 
 private:
     SOAP_SOCKET Open(const char* endpoint, const char* host, int port);
+    int OpenTunnel(int socket, const char* host, int port, const Patience& patience);
     bool OpenTls(int socket, const char* host, const Patience& patience);
-    void Watch(SOAP_SOCKET socket) ZV_EXCLUDES(m_AbortMutex);
+    Connection OpenConnection() const { return {m_Soap.socket, m_Soap.ssl}; }
+    /// For one step of the exchange.
+    Patience PatienceFor(uint64_t milliseconds) const;
+    void LookAtClock(int result);
 
-    static int CloseHook(soap* context, SOAP_SOCKET socket);
     static SOAP_SOCKET OpenHook(soap* context, const char* endpoint, const char* host, int port);
     static int SendHook(soap* context, const char* data, size_t length);
     static size_t ReceiveHook(soap* context, char* buffer, size_t size);
     static int PreparedHook(soap* context, const char* data, size_t length);
     static int HeaderHook(soap* context, const char* key, const char* value);
+    static int AnswerHeaderHook(soap* context, const char* key, const char* value);
     static int ShutdownHook(soap* context, SOAP_SOCKET socket, int how);
 
     void ForgetTls();
 
     soap& m_Soap;
-    RetryAfter m_RetryAfter{m_Soap};
+    RetryAfter m_RetryAfter;
     const Deployment* m_Deployment = nullptr;
+    Proxy m_Proxy;
     ZVString m_TlsHost;
     ZVString m_UserAgent;
-    uint64_t m_Begun = 0;  // of the exchange, by ZVUtilities::MillisecondTime
+    uint64_t m_SendTimeout = 0, m_ReceiveTimeout = 0;  // milliseconds
+
+    // Of the exchange. Times are those of ZVUtilities::MillisecondTime.
+    uint64_t m_Begun = 0;
+    uint64_t m_Rests = 0;  // since when the kept connection does
     bool m_Connected = false;
     bool m_HasSent = false;
     size_t m_Received = 0;
+    int64_t m_ClockOffset = 0;
+    time_t m_Date = 0;  // that the answer bears; 0: none
+    bool m_IsOld = false;  // it comes from somebody's cache
+    Clock::Verdict m_ClockVerdict = Clock::Verdict::Right;
     SecretFilter m_SentSecrets;
     SecretFilter m_ReceivedSecrets;
 
     std::atomic<bool> m_Aborted{false};
-    ZVMutex m_AbortMutex;
-    SOAP_SOCKET m_Watched ZV_GUARDED_BY(m_AbortMutex) = SOAP_INVALID_SOCKET;  // the open one, as Abort may know it
 
-    decltype(soap::fopen) m_Open;
-    decltype(soap::fclosesocket) m_CloseSocket;
-    decltype(soap::fsend) m_Send;
-    decltype(soap::frecv) m_Receive;
     decltype(soap::fposthdr) m_Header;
+    decltype(soap::fparsehdr) m_AnswerHeader;
 };

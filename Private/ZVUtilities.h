@@ -59,4 +59,9 @@ void print_soap_error(struct soap* context);
 const char* QueryServiceBaseURL(ContentType type, struct soap* context, const char* destinationUniqueID,
                                 int destinationTypeID, ZV_WS_EnvNum envNum, ZV_WS_EnvID& envID);
 
+// ---- HttpCalls.cpp
+
+/// Breaks off every ZV_WS_getServerTime that is under way.
+void AbortClockQueries();
+
 }  // namespace ZVUtilities

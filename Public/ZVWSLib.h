@@ -539,6 +539,7 @@ struct ZV_WS_AuthorizeDeviceResponse : ZV_WS_StandardResponse {
 ///  - ZV_WS_Status_file_operation_error: the deployment file cannot be used (one line on the error stream says why);
 ///  - ZV_WS_Status_ssl_error: the certificate authorities cannot be loaded;
 ///  - ZV_WS_Status_connection_error: discovery could not reach the service;
+///  - ZV_WS_Status_clock_wrong: nor can it before somebody sets the device's clock;
 ///  - ZV_WS_Status_local_cache_error: the cache cannot be opened, not even anew.
 ZV_WS_Status ZV_WS_initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams* params);
 
@@ -553,9 +554,9 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
 ZV_WS_Status ZV_WS_release(ZV_WS_Object* any);
 
 /// Breaks off the call that another thread makes with the session, and lets no further one begin: the call returns
-/// within a second with a transport failure (but for the time that the system takes to look a host's name up). For
-/// ending a session that may hang in the network; ZV_WS_release still has to follow, after that thread's call has
-/// returned. Any thread. A null or empty handle is fine.
+/// within 200 ms with a transport failure. For ending a session that may hang in the network; ZV_WS_release still has to
+/// follow, after that thread's call has returned. Any thread. An empty handle is fine. A null one breaks off every
+/// ZV_WS_getServerTime that is under way, and lets others begin.
 void ZV_WS_abort(const ZV_WS_Session* handle);
 
 /// The library's version, 1.3.1.
@@ -769,8 +770,9 @@ ZV_WS_Status ZV_WS_getBoxArtImage(ZV_WS_Session* handle, ZV_WS_BoxArtSize size, 
 
 // ---- Clock, bandwidth, address
 
-/// The service's clock in seconds since 1970 UTC; -1 on failure. Needs no session. ZV_WS_Status_connection_error,
-/// ZV_WS_Status_net_error, or ZV_WS_Status_general_error for an answer that is no time.
+/// The service's clock in seconds since 1970 UTC; -1 on failure. Needs no session, and goes through the proxy of the one
+/// that was last set up. ZV_WS_Status_connection_error, ZV_WS_Status_net_error, or ZV_WS_Status_general_error for an
+/// answer that is no time.
 ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime);
 
 /// The download rate in bits per second, measured on at most 200 KiB; 0 on failure. The file's address is asked once

@@ -67,4 +67,6 @@ enum ZV_WS_Status : int {
     ZV_WS_Status_http_error = -4000,
     ZV_WS_Status_ssl_error = -5000,
     ZV_WS_Status_soap_error = -6000,
+    /// The device's clock is so wrong that no service accepts its requests, or no certificate is valid yet.
+    ZV_WS_Status_clock_wrong = -7001,
 };

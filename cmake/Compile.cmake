@@ -18,3 +18,13 @@ endif()
 # Assertions stay in every build type.
 string(REPLACE "-DNDEBUG" "" CMAKE_CXX_FLAGS_RELWITHDEBINFO "${CMAKE_CXX_FLAGS_RELWITHDEBINFO}")
 string(REPLACE "-DNDEBUG" "" CMAKE_CXX_FLAGS_RELEASE "${CMAKE_CXX_FLAGS_RELEASE}")
+
+# A time, in seconds, that is certainly over on every device. The same sources build the same library.
+set(ZV_BUILD_TIME "$ENV{SOURCE_DATE_EPOCH}")
+if(NOT ZV_BUILD_TIME)
+    execute_process(COMMAND git log -1 --format=%ct WORKING_DIRECTORY ${PROJECT_SOURCE_DIR}
+        OUTPUT_VARIABLE ZV_BUILD_TIME OUTPUT_STRIP_TRAILING_WHITESPACE ERROR_QUIET)
+endif()
+if(NOT ZV_BUILD_TIME MATCHES "^[0-9]+$")
+    string(TIMESTAMP ZV_BUILD_TIME "%s" UTC)
+endif()

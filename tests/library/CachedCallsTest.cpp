@@ -3,6 +3,7 @@
 #include <fstream>
 #include <functional>
 
+#include "SessionImpl.h"
 #include "Store.h"
 #include "TempFolder.h"
 
@@ -286,6 +287,7 @@ TEST_F(BoxArt, OldImagesMakeRoom)
         const std::string prefix = "ZV000" + std::to_string(title);
         ASSERT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getBoxArtImage, BOX_ART_SIZE_321, prefix.c_str())(&session)) << title;
     }
+    session._pSessionImpl->m_Writer->Flush();  // its thread makes room, too
     size_t bytes = 0;
     for (const auto& entry : fs::directory_iterator(folder))
         bytes += entry.file_size();

@@ -49,6 +49,7 @@ public:
         s_Client = ends[0];
         EXPECT_EQ(static_cast<ssize_t>(answer.size()), write(ends[1], answer.data(), answer.size()));
         shutdown(ends[1], SHUT_WR);
+        m_Service.transport().BeginExchange();
         EXPECT_EQ(SOAP_OK, m_Service.Setup(operation.c_str()));
         const int result = call(m_Service);
         m_Service.transport().Close();

@@ -43,8 +43,9 @@ uint64_t PrefetchPause::Answers()
 bool PrefetchPause::IsTrouble(ZV_WS_Status status, const RetryAfter::Heard& heard)
 {
     // An image that is there can be used although its host did not answer: the status alone does not tell.
-    return heard.silent || heard.unavailable || status == ZV_WS_Status_connection_error ||
-           status == ZV_WS_Status_timeout_error || status == ZV_WS_Status_net_error || IsTransportFamily(status);
+    if (heard.silent || heard.unavailable || IsTransportFamily(status)) return true;
+    return status == ZV_WS_Status_connection_error || status == ZV_WS_Status_timeout_error ||
+           status == ZV_WS_Status_net_error || status == ZV_WS_Status_clock_wrong;
 }
 
 bool PrefetchPause::Note(ZV_WS_Status status, const RetryAfter::Heard& heard)
