@@ -88,6 +88,7 @@ bool RawHttp::ReceiveHead()
 {
     m_HeadLength = Receive(m_Head, sizeof m_Head - 1);
     m_Head[m_HeadLength] = '\0';
+    if (m_HeadLength != 0) m_Transport.retryAfter().ReadHead(m_Head);
     SecretFilter filter;
     TrafficLog::Received(filter, m_Head, m_HeadLength);
     return m_HeadLength != 0;

@@ -126,6 +126,7 @@ void Transport::BeginExchange()
     m_Received = 0;
     m_ClockOffset = Clock::Offset();
     m_ClockVerdict = Clock::Verdict::Right;
+    m_RetryAfter.Begin();
     m_SentSecrets.Restart();
     m_ReceivedSecrets.Restart();
 }
@@ -270,6 +271,7 @@ int Transport::HeaderHook(soap* context, const char* key, const char* value)
 int Transport::AnswerHeaderHook(soap* context, const char* key, const char* value)
 {
     Transport& self = Of(context);
+    self.m_RetryAfter.ReadHeader(context->status, key, value);
     if (strcasecmp(key, "Date") == 0) self.m_Date = Clock::ParseHttpDate(value);
     if (strcasecmp(key, "Age") == 0) self.m_IsOld = true;
     return self.m_AnswerHeader(context, key, value);

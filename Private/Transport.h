@@ -14,6 +14,7 @@
 #include "Clock.h"
 #include "Connector.h"
 #include "Deployment.h"
+#include "RetryAfter.h"
 #include "TrafficLog.h"
 #include "ZVString.h"
 
@@ -87,6 +88,7 @@ public:
     /// The one whose authorities were loaded; the current one before.
     const Deployment& deployment() const { return m_Deployment ? *m_Deployment : Deployment::Current(); }
     soap& context() { return m_Soap; }
+    RetryAfter& retryAfter() { return m_RetryAfter; }
 
 private:
     SOAP_SOCKET Open(const char* endpoint, const char* host, int port);
@@ -108,6 +110,7 @@ private:
     void ForgetTls();
 
     soap& m_Soap;
+    RetryAfter m_RetryAfter;
     const Deployment* m_Deployment = nullptr;
     Proxy m_Proxy;
     ZVString m_TlsHost;

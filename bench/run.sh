@@ -6,16 +6,21 @@ cd "$(dirname "${BASH_SOURCE[0]}")/.."
 source cmake/setup.sh
 
 zv_install
-zv_build default zv_bench
+zv_build default zv_bench zv_outage
 table=$(build/bin/zv_bench --benchmark_repetitions=5 --benchmark_min_time=0.2 \
     --benchmark_enable_random_interleaving=true "$@" 2>build/bench.log) ||
     { tail -n 5 build/bench.log >&2; exit 1; }
 flash=$(bench/flash.sh)
+evening=$(bench/evening-cost.sh)
+outage=$(build/bin/zv_outage docs/outage.svg)
 {
     cat bench/performance.head.md
     echo "$table"
     cat bench/flash.head.md
     echo "$flash"
+    cat bench/evening-cost.head.md
+    echo "$evening"
+    cat bench/outage.head.md
+    echo "$outage"
 } >docs/performance.md
-echo "$table"
-echo "$flash"
+printf '%s\n' "$table" "$flash" "$evening" "$outage"

@@ -3,10 +3,11 @@
 //
 //     ZV_STOREFRONT_OPTIONS="--latency 200" ./run.sh movies/pages.js
 //
-// The cache is a folder in the system's temporary one, emptied before and after.
+// The cache is a folder in the system's temporary one, emptied before and after, unless ZV_FLASHVARS says keep=1.
 
 var ws = new com.orvex.ZVWSLib();
 var folder = (getenv("TMPDIR") || "/tmp") + "/storefront-pages/";
+var keeps = flashvars.keep === "1";
 var genre = 8, perPage = 4, pause = 1000;
 
 // A page that comes faster than the store can answer did not need it.
@@ -51,12 +52,12 @@ function walk() {
     (function step() {
         if (numbers.length !== 0) return show(numbers.shift(), step);
         trace("After the first page " + Math.round(ready * 100 / (turned - 1)) + " % of " + (turned - 1) + " pages were there.");
-        com.orvex.ZVWSLib.clearLocalCache(folder);
+        if (!keeps) com.orvex.ZVWSLib.clearLocalCache(folder);
         quit();
     })();
 }
 
-com.orvex.ZVWSLib.clearLocalCache(folder);
+if (!keeps) com.orvex.ZVWSLib.clearLocalCache(folder);
 call("init", {
     APIKey: flashvars.apikey || "desktop",
     UserName: flashvars.user || "customer",

@@ -23,7 +23,7 @@ const struct {
     {"fault11", kSoap, "a SOAP 1.1 fault"},
     {"fault12", kSoap, "a SOAP 1.2 fault"},
     {"soap12", kSoap, "the right answer in a SOAP 1.2 envelope"},
-    {"http:N", kAnswers, "HTTP status N (302 with a Location)"},
+    {"http:N", kAnswers, "HTTP status N (302 with a Location; retry=SECONDS adds a Retry-After)"},
     {"cut", kAnswers, "the connection is closed before the answer"},
     {"cut-header", kAnswers, "closed in the middle of the HTTP header"},
     {"cut-body", kAnswers, "closed in the middle of the body"},
@@ -112,10 +112,11 @@ std::string ReadKind(const std::string& operation, unsigned places, const std::s
     return "";
 }
 
-// One of "after", "delay=MS", "count=N".
+// One of "after", "delay=MS", "count=N", "retry=SECONDS".
 bool ReadCondition(const std::string& text, Fault& fault)
 {
     if (text == "after") return fault.afterEffect = true;
+    if (text.rfind("retry=", 0) == 0) return fault.Is("http") && ReadNumber(text.substr(6), 1, fault.retryAfter);
     if (text.rfind("delay=", 0) == 0) return ReadNumber(text.substr(6), 0, fault.delay);
     return text.rfind("count=", 0) == 0 && ReadNumber(text.substr(6), 1, fault.count);
 }

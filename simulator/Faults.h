@@ -12,6 +12,7 @@ struct Fault {
     std::string value;
     int delay = 0;  ///< Milliseconds before the answer.
     int count = 1;
+    int retryAfter = 0;        ///< Seconds that an HTTP status comes with; 0: none.
     bool afterEffect = false;  ///< What the request asks for is done although the answer claims otherwise.
     unsigned long clears = 0;  ///< How often the lists had been cleared when it was taken.
 

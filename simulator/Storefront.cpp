@@ -427,6 +427,7 @@ bool Simulator::Send(Connection& connection, const HttpRequest& request, HttpRes
     if (fault.Is("http")) {
         response.status = fault.Number(503);
         response.body.clear();
+        if (fault.retryAfter > 0) response.headers.emplace_back("Retry-After", std::to_string(fault.retryAfter));
         if (response.status == 302) response.headers.emplace_back("Location", "https://localhost/elsewhere");
     } else if (fault.Is("body")) {
         response.body = fault.value;

@@ -2,9 +2,11 @@
 
 #include <stdlib.h>
 
+#include <utility>
+
 #include "TempFolder.h"
 #include "ZVCfgLibAE.h"
-#include "ZVWSLibAE.h"
+#include "ZVWSLibAEPrefetch.h"
 #include "stagecraft/IStagecraft.h"
 
 using namespace ae::stagecraft;
@@ -14,6 +16,7 @@ namespace {
 MovieRun* s_Run = nullptr;
 const Result* s_Shown = nullptr;
 const Answer* s_Answer = nullptr;
+std::shared_ptr<PrefetchPause> s_Pause;
 
 class TestClass : public ASExtensionClass {
 public:
@@ -45,6 +48,18 @@ private:
     }
 };
 
+class PausedWSLib : public ZVWSLibAE {
+public:
+    using ZVWSLibAE::ZVWSLibAE;
+
+    static ASExtensionClass* ConstructInstance(StageWindow* window, ASObject& object, ASValueArray& arguments)
+    {
+        auto* instance = new PausedWSLib(window, object, arguments);
+        if (s_Pause) instance->GetPrefetcher().UsePause(std::exchange(s_Pause, nullptr));
+        return instance;
+    }
+};
+
 }  // namespace
 
 std::string MovieRun::Text() const
@@ -55,12 +70,14 @@ std::string MovieRun::Text() const
     return text;
 }
 
-MovieRun RunMovie(const std::string& script, const Result& shown, const Answer& answer)
+MovieRun RunMovie(const std::string& script, const Result& shown, const Answer& answer,
+                  std::shared_ptr<PrefetchPause> pause)
 {
     MovieRun run;
     s_Run = &run;
     s_Shown = &shown;
     s_Answer = &answer;
+    s_Pause = std::move(pause);
     const TempFolder folder;
     const std::string movie = folder.Write("movie.js",
                                            "function report(text) { test.Native.report(text); }\n"
@@ -72,7 +89,7 @@ MovieRun RunMovie(const std::string& script, const Result& shown, const Answer& 
     const char* arguments[] = {"test", movie.c_str()};
     IStagecraft* runtime = IStagecraft::InitializeStagecraftLibrary(2, arguments);
     if (!runtime) return run;
-    runtime->RegisterExtensionClass<ZVWSLibAE>();
+    runtime->RegisterExtensionClass<PausedWSLib>();
     runtime->RegisterExtensionClass<ZVCfgLibAE>();
     runtime->RegisterExtensionClass<TestClass>();
     AEArray<StageWindow*> windows;

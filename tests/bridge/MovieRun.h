@@ -2,9 +2,11 @@
 #pragma once
 
 #include <functional>
+#include <memory>
 #include <string>
 #include <vector>
 
+#include "ZVWSLibAEPrefetchPause.h"
 #include "ZVWSLibAEResult.h"
 
 struct MovieRun {
@@ -19,5 +21,6 @@ struct MovieRun {
 using Answer = std::function<std::string(const std::string& question)>;
 
 /// The movie sees com.orvex.ZVWSLib, com.orvex.ZVCfgLib, report(text), answer(question), and result(): the script value
-/// of `shown`.
-MovieRun RunMovie(const std::string& script, const Result& shown = Result(), const Answer& answer = nullptr);
+/// of `shown`. A `pause` takes the place of the first instance's own.
+MovieRun RunMovie(const std::string& script, const Result& shown = Result(), const Answer& answer = nullptr,
+                  std::shared_ptr<PrefetchPause> pause = nullptr);

@@ -41,7 +41,7 @@ function when(name, count, then) {
     }, 5);
 }
 )" + script,
-                        Result(), [this](const std::string& question) { return AnswerTo(question); });
+                        Result(), [this](const std::string& question) { return AnswerTo(question); }, pause);
     }
 
     std::string Report(const std::string& script)
@@ -50,4 +50,6 @@ function when(name, count, then) {
         EXPECT_TRUE(run.succeeded);
         return run.Text();
     }
+
+    std::shared_ptr<PrefetchPause> pause;  ///< Of the next movie's first instance; null: its own.
 };

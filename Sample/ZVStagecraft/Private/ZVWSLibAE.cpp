@@ -49,7 +49,7 @@ ZVWSLibAE::~ZVWSLibAE()
 void ZVWSLibAE::OnUpdate(StageWindow* /*window*/, ASObject& object)
 {
     if (!m_Call->HasResult()) {
-        m_Prefetcher->FetchBoxArtWhenIdle();
+        m_Prefetcher->FetchWhenIdle();
         return;
     }
     object.StopUpdates();

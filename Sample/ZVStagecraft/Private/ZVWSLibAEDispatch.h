@@ -78,7 +78,8 @@ void Work(const char* name, ZV_WS_Status (*call)(ZV_WS_Session*, Parameters...),
     OutputOf<Parameters...> output{};
     const ZV_WS_Status status = CallLibrary(call, foreground.Session(), *param, output);
     LogStatus(name, status);
-    if (kIsListing<Param> && status == ZV_WS_Status_ok) param->pZVWSLibAE->GetPrefetcher().ListingAnswered();
+    const RetryAfter::Heard heard = RetryAfter::Take(foreground.Session());
+    if (kIsListing<Param>) param->pZVWSLibAE->GetPrefetcher().ListingEnded(status, heard);
     foreground.Publish(output, status);
 }
 

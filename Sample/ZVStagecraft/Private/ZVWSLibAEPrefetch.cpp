@@ -144,33 +144,83 @@ void Prefetcher::RunPrefetchThread(const char* name, void (*function)(void*), vo
     slot = nullptr;
 }
 
+// ---- Trouble
+
+void Prefetcher::ListingEnded(ZV_WS_Status status, const RetryAfter::Heard& heard)
+{
+    if (status == ZV_WS_Status_ok) m_NeedPrefetchTitles = true;
+    if (!m_StopPrefetch) Pause().Note(status, heard);  // else it was broken off
+}
+
+bool Prefetcher::MetTrouble(const std::string& what, ZV_WS_Status status, const ZV_WS_Session& session)
+{
+    const RetryAfter::Heard heard = RetryAfter::Take(session);
+    if (m_StopPrefetch) return true;
+    if (!PrefetchPause::IsTrouble(status, heard)) {
+        Pause().Note(status, heard);
+        const KernelLock lock(m_Mutex);
+        m_Failed.erase(what);
+        return false;
+    }
+    if (heard.answered && !heard.unavailable) {
+        // When the service has done well by others since it first failed at this, then this is what is wrong: one image
+        // that it cannot give must not keep all others waiting for ever longer.
+        const uint64_t answers = Pause().Answers();
+        const KernelLock lock(m_Mutex);
+        const auto before = m_Failed.emplace(what, answers).first;
+        if (before->second != answers) return false;
+    }
+    return Pause().Note(status, heard);
+}
+
 // ---- Pages
 
 void Prefetcher::ResultComes(const Result& shown)
 {
     if (shown.retCode != ZV_WS_Status_ok || m_Settings.m_CurrentCacheType != CacheType_File) return;
-    if (!m_NeedPrefetchTitles || m_PrefetchTitlesIsRunning) return;
-    std::visit([&](const auto& request) { FetchAround(request, shown); }, m_LastListing.request);
+    if (!m_NeedPrefetchTitles) return;
+    std::visit([&](const auto& request) { Show(request, shown); }, m_LastListing.request);
 }
 
 template <class Request>
-void Prefetcher::FetchAround(const Request& request, const Result& shown)
+void Prefetcher::Show(const Request& /*request*/, const Result& shown)
+{
+    const auto& page = AnswerOf(Listing<Request>::kCall, shown);
+    m_Shown.listing = m_LastListing;
+    m_Shown.type = shown.type();
+    m_Shown.number = page.CurrentPageNumber;
+    m_Shown.totalPages = page.TotalPages;
+    m_Shown.totalItems = page.TotalItems;
+    if (!m_PrefetchTitlesIsRunning) FetchAroundShown();
+}
+
+void Prefetcher::FetchAroundShown()
+{
+    m_PagesWait = false;
+    std::visit([&](const auto& request) { FetchAround(request); }, m_Shown.listing.request);
+}
+
+template <class Request>
+void Prefetcher::FetchAround(const Request& request)
 {
     using Listed = Listing<Request>;
-    const auto& page = AnswerOf(Listed::kCall, shown);
-    if (!Caches(Listed::kData) || page.TotalPages < 2) return;
+    if (!Caches(Listed::kData) || m_Shown.totalPages < 2) return;
 
     // The manager takes the mutex itself. Nobody adds to the list meanwhile: no page is being fetched.
     AEArray<AEString> waiting = TakeWaitingForDownloadBoxArts();
     const std::array<int, 3> identity = Listed::Identity(request);
-    m_PrefetchMgr.Update(waiting, shown.type(), page.TotalPages, page.TotalItems, request.page.ItemsPerPage,
+    m_PrefetchMgr.Update(waiting, m_Shown.type, m_Shown.totalPages, m_Shown.totalItems, request.page.ItemsPerPage,
                          identity[0], identity[1], identity[2]);
     AddWaitingForDownloadBoxArts(waiting);
 
-    m_PrefetchMgr.MarkPagePrefetched(request.page.CurrentPageNumber, m_LastListing.drops);
+    m_PrefetchMgr.MarkPagePrefetched(request.page.CurrentPageNumber, m_Shown.listing.drops);
+    if (!Pause().IsOver()) {
+        m_PagesWait = true;
+        return;
+    }
     unsigned int pages[PrefetchMgr::m_kPrefetchPages];
     unsigned int found = 0;
-    m_PrefetchMgr.GetPagesForPrefetch(page.CurrentPageNumber, std::size(pages), pages, found);
+    m_PrefetchMgr.GetPagesForPrefetch(m_Shown.number, std::size(pages), pages, found);
     if (found == 0) return;
     auto param = std::make_unique<typename Listed::Ahead>(request);
     for (unsigned int i = 0; i < found; ++i)
@@ -181,23 +231,34 @@ void Prefetcher::FetchAround(const Request& request, const Result& shown)
 template <class Request>
 void Prefetcher::FetchPages(void* argument)
 {
-    using Listed = Listing<Request>;
-    const std::unique_ptr<typename Listed::Ahead> param(static_cast<typename Listed::Ahead*>(argument));
+    using Ahead = typename Listing<Request>::Ahead;
+    const std::unique_ptr<Ahead> param(static_cast<Ahead*>(argument));
     Prefetcher& self = param->pZVWSLibAE->GetPrefetcher();
     const Running running(self.m_PrefetchTitlesIsRunning);
-    for (const unsigned int number : param->prefetchpages) {
-        if (self.m_StopPrefetch) return;
-        std::decay_t<decltype(AnswerOf(Listed::kCall, Result()))> page;
+    const AEArray<unsigned int>& pages = param->prefetchpages;
+    self.m_PagesWait = !std::all_of(pages.begin(), pages.end(), [&](unsigned int number) {
         param->page.CurrentPageNumber = number;
-        const uint64_t drops = CacheInterface::Drops();
-        const ZV_WS_Status status = ZVWSLib::CallLibrary(Listed::kCall, self.SessionFor(Listed::kData), *param, page);
-        if (status == ZV_WS_Status_ok) {
-            self.m_PrefetchMgr.MarkPagePrefetched(number, drops);
-            self.AddWaitingForDownloadBoxArts(BoxArtsOf(page));
-        }
-        ZV_WS_release(&page);
-        if (status != ZV_WS_Status_ok) return;
+        return self.FetchPage<Request>(*param);
+    });
+}
+
+template <class Request>
+bool Prefetcher::FetchPage(const Request& request)
+{
+    using Listed = Listing<Request>;
+    if (m_StopPrefetch || !Pause().IsOver()) return false;  // another call may have met trouble
+    std::decay_t<decltype(AnswerOf(Listed::kCall, Result()))> page;
+    const unsigned int number = request.page.CurrentPageNumber;
+    const uint64_t drops = CacheInterface::Drops();
+    ZV_WS_Session& session = SessionFor(Listed::kData);
+    const ZV_WS_Status status = ZVWSLib::CallLibrary(Listed::kCall, session, request, page);
+    const bool isTrouble = MetTrouble("page " + std::to_string(number), status, session);
+    if (status == ZV_WS_Status_ok) {
+        m_PrefetchMgr.MarkPagePrefetched(number, drops);
+        AddWaitingForDownloadBoxArts(BoxArtsOf(page));
     }
+    ZV_WS_release(&page);
+    return !isTrouble;
 }
 
 #define ZVWS_PREFETCH_WORKER(call, ...)              \
@@ -209,8 +270,9 @@ ZVWS_PAGED_LISTINGS(ZVWS_PREFETCH_WORKER)
 
 // ---- Box art
 
-void Prefetcher::FetchAround(const Param_getAllTvEpisodeListings& /*request*/, const Result& shown)
+void Prefetcher::Show(const Param_getAllTvEpisodeListings& /*request*/, const Result& shown)
 {
+    if (m_PrefetchTitlesIsRunning) return;
     const auto& listings = AnswerOf(ZV_WS_getAllTvEpisodeListings, shown);
     if (listings.size < 2) return;
     TakeWaitingForDownloadBoxArts();
@@ -232,9 +294,15 @@ AEArray<AEString> Prefetcher::TakeWaitingForDownloadBoxArts()
     return std::exchange(m_WaitingForDownloadBoxArts, AEArray<AEString>());
 }
 
-void Prefetcher::FetchBoxArtWhenIdle()
+void Prefetcher::FetchWhenIdle()
 {
-    if (!m_FlashIdle || m_PrefetchTitlesIsRunning || m_PrefetchBoxArtsIsRunning) return;
+    if (!m_FlashIdle || m_PrefetchTitlesIsRunning || m_PrefetchBoxArtsIsRunning || !Pause().IsOver()) return;
+    if (m_PagesWait) FetchAroundShown();
+    if (!m_PrefetchTitlesIsRunning) FetchBoxArt();
+}
+
+void Prefetcher::FetchBoxArt()
+{
     if (!Caches(ZV_WS_CacheParam::CacheData_BoxArtImage)) return;
     auto param = std::make_unique<Param_prefetch_getBoxArts>();
     {
@@ -256,8 +324,14 @@ void Prefetcher::FetchBoxArts(void* argument)
     for (const AEString& prefix : param->boxartprefixs) {
         if (self.m_StopPrefetch) return;
         ZV_WS_String place;
-        ZV_WS_getBoxArtImage(&self.m_PrefetchBoxArtsSession, param->boxartsize, prefix.c_str(), &place);
+        ZV_WS_Session& session = self.m_PrefetchBoxArtsSession;
+        const ZV_WS_Status status = ZV_WS_getBoxArtImage(&session, param->boxartsize, prefix.c_str(), &place);
         ZV_WS_release(&place);
+        if (!self.MetTrouble(prefix.c_str(), status, session)) continue;
+        // Behind the others, which may be better off.
+        AEArray<AEString> again;
+        again.Append(prefix);
+        self.AddWaitingForDownloadBoxArts(again);
     }
 }
 
