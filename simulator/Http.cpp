@@ -98,14 +98,16 @@ bool HttpRequest::KeepAlive() const
     return strcasecmp(Header("connection").c_str(), "close") != 0;
 }
 
-std::string HttpResponse::Head(size_t length, bool keepAlive) const
+std::string HttpResponse::Head(const Framing& framing) const
 {
     std::string head = "HTTP/1.1 " + std::to_string(status) + " " + Reason(status) + "\r\n";
     head += "Server: storefront-simulator\r\nContent-Type: " + contentType + "\r\n";
     for (const auto& header : headers)
         head += header.first + ": " + header.second + "\r\n";
-    head += "Content-Length: " + std::to_string(length) + "\r\n";
-    return head + "Connection: " + (keepAlive ? "keep-alive" : "close") + "\r\n\r\n";
+    if (framing.length == Framing::Announced) {
+        head += "Content-Length: " + std::to_string(framing.announced) + "\r\n";
+    }
+    return head + "Connection: " + (framing.keepAlive ? "keep-alive" : "close") + "\r\n\r\n";
 }
 
 bool ReadRequest(Channel& channel, std::string& rest, HttpRequest& request)

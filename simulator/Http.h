@@ -22,14 +22,21 @@ struct HttpRequest {
     bool KeepAlive() const;
 };
 
+/// What an answer's head tells of its body's end and of the connection's.
+struct Framing {
+    enum Length { Announced, Unannounced } length = Announced;
+    size_t announced = 0;
+    bool keepAlive = true;
+};
+
 struct HttpResponse {
     int status = 200;
     Headers headers;
     std::string body;
     std::string contentType = "text/plain; charset=utf-8";
 
-    /// The lines before the body, with the length given.
-    std::string Head(size_t length, bool keepAlive) const;
+    /// The lines before the body.
+    std::string Head(const Framing& framing) const;
 };
 
 /// Reads one request; `rest` holds what came too early. False when the connection ends, or the request is none or

@@ -2,7 +2,6 @@
 
 #include <cctype>
 #include <ctime>
-#include <sstream>
 
 namespace {
 
@@ -106,32 +105,6 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
     } else {
         response.contentType = "application/octet-stream";
         response.body.assign(kBandwidthFile, 'b');
-    }
-    return response;
-}
-
-HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log)
-{
-    HttpResponse response;
-    const std::string what = request.method + " " + request.Path();
-    if (what == "POST /control/faults") {
-        std::istringstream lines(request.body);
-        for (std::string line, error; std::getline(lines, line);) {
-            if (line.empty() || faults.Add(line, error)) continue;
-            response.status = 400;
-            response.body += error + "\n";
-        }
-    } else if (what == "GET /control/faults") {
-        response.body = faults.Pending();
-    } else if (what == "DELETE /control/faults") {
-        faults.Clear();
-    } else if (what == "GET /control/log") {
-        response.contentType = "application/x-ndjson";
-        response.body = log.Json();
-    } else if (what == "DELETE /control/log") {
-        log.Clear();
-    } else {
-        return NotFound();
     }
     return response;
 }

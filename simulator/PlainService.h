@@ -1,4 +1,4 @@
-// What is asked without SOAP: discovery, box art, clock, bandwidth file, and control.
+// What is asked without SOAP: discovery, box art, clock, bandwidth file.
 #pragma once
 
 #include <string>
@@ -13,9 +13,6 @@ std::string PlainServiceName(const std::string& path);
 /// Answers one of them. `fault` has already been chosen.
 HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, const Fault& fault,
                          LoggedRequest& log);
-
-/// "/control/...": faults and log, for people and scripts.
-HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log);
 
 /// A picture of that many pixels' width for the title; the same one every time.
 std::string MakeBoxArt(const std::string& prefix, int width);

@@ -1,0 +1,123 @@
+#include "AnswerWriter.h"
+
+#include <algorithm>
+
+struct AnswerWriter::Answer {
+    AnswerWriter& writer;
+    Channel& channel;
+    const HttpResponse& response;
+    const Fault& fault;
+    Framing framing;
+
+    std::string Head() const { return response.Head(framing); }
+    std::string Whole() const { return Head() + response.body; }
+    std::string Half() const { return response.body.substr(0, response.body.size() / 2); }
+    /// Writes and ends the connection.
+    bool Last(const std::string& bytes) const
+    {
+        channel.Write(bytes);
+        channel.Close();
+        return false;
+    }
+};
+
+// How an answer with that fault is written; false when the connection has come to its end. The others' are written
+// whole.
+struct AnswerWriter::Way {
+    const char* kind;
+    bool (*write)(Answer& answer);
+};
+
+const AnswerWriter::Way AnswerWriter::kWays[] = {
+    {"cut", [](Answer& a) { return a.Last(""); }},
+    {"cut-header", [](Answer& a) { return a.Last(a.Head().substr(0, a.Head().size() / 2)); }},
+    {"cut-body", [](Answer& a) { return a.Last(a.Head() + a.Half()); }},
+    {"reset", [](Answer& a) { return a.channel.Reset(), false; }},
+    {"stall", [](Answer& a) { return a.channel.Stall(), false; }},
+    {"stall-body",
+     [](Answer& a) {
+         a.channel.Write(a.Head() + a.Half());
+         return a.channel.Stall(), false;
+     }},
+    {"drip", [](Answer& a) { return a.writer.Drip(a.channel, a.Whole(), a.fault.Number(100)); }},
+    {"hold", [](Answer& a) { return a.writer.m_Faults.WaitForClear(a.fault) && a.channel.Write(a.Whole()); }},
+    {"split",
+     [](Answer& a) {
+         return a.channel.Write(a.Head()) && a.writer.m_Server.Pause(a.fault.Number(50)) &&
+                a.channel.Write(a.response.body);
+     }},
+    {"no-http", [](Answer& a) { return a.Last("no protocol that anyone speaks\r\n\r\n"); }},
+    {"short",
+     [](Answer& a) {
+         a.framing.announced += 100;
+         return a.Last(a.Whole());
+     }},
+    {"long", [](Answer& a) { return a.channel.Write(a.Whole() + "left over"); }},
+    {"no-length",
+     [](Answer& a) {
+         a.framing.length = Framing::Unannounced;
+         return a.Last(a.Whole());
+     }},
+    {"zero-length",
+     [](Answer& a) {
+         a.framing.announced = 0;
+         return a.channel.Write(a.Whole());
+     }},
+    // Half of the right body, and text from there on.
+    {"endless",
+     [](Answer& a) {
+         a.framing = {Framing::Unannounced, 0, false};
+         const std::string piece(16384, 'x');
+         bool more = a.channel.Write(a.Head() + a.Half());
+         while (more)
+             more = a.channel.Write(piece) && a.writer.m_Server.Pause(0);
+         return false;
+     }},
+};
+
+bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpResponse response, const Fault& fault)
+{
+    if (fault.Is("http")) {
+        response.status = fault.Number(503);
+        response.body.clear();
+        if (response.status == 302) response.headers.emplace_back("Location", "https://localhost/elsewhere");
+    } else if (fault.Is("body")) {
+        response.body = fault.value;
+    } else if (fault.Is("garbage")) {
+        response.body = "\x01\x02 this is no answer <<<";
+    } else if (fault.Is("empty")) {
+        response.body.clear();
+    } else {
+        Encode(response, request.Header("accept-encoding").find("gzip") != std::string::npos, fault);
+    }
+    const bool keepAlive = request.KeepAlive();
+    const size_t length = response.status == 304 ? 0 : response.body.size();
+    Answer answer = {*this, channel, response, fault, {Framing::Announced, length, keepAlive}};
+    const auto way = std::find_if(std::begin(kWays), std::end(kWays), [&](const Way& w) { return fault.Is(w.kind); });
+    if (!(way == std::end(kWays) ? channel.Write(answer.Whole()) : way->write(answer))) return false;
+    if (!keepAlive) channel.Close();
+    return keepAlive;
+}
+
+void AnswerWriter::Encode(HttpResponse& response, bool accepted, const Fault& fault) const
+{
+    const bool bomb = fault.Is("bomb");
+    if (!bomb && !fault.Is("damaged-gzip") && !fault.Is("wrong-checksum") && !(m_Gzip && accepted)) return;
+    if (bomb) response.body += std::string(static_cast<size_t>(fault.Number(256)) << 20, ' ');
+    response.headers.emplace_back("Content-Encoding", "gzip");
+    response.body = Gzip(response.body);
+    // The last eight bytes are the checksum and the length.
+    if (fault.Is("wrong-checksum")) response.body[response.body.size() - 8] ^= 0x55;
+    if (fault.Is("damaged-gzip")) {
+        for (size_t i = response.body.size() / 2; i < response.body.size(); i += 3)
+            response.body[i] ^= 0x55;
+    }
+}
+
+bool AnswerWriter::Drip(Channel& channel, const std::string& bytes, int pause)
+{
+    for (const char byte : bytes) {
+        if (!channel.Write(std::string(1, byte)) || !m_Server.Pause(pause)) return false;
+    }
+    return true;
+}

@@ -1,0 +1,30 @@
+#include "Control.h"
+
+#include <sstream>
+
+HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log)
+{
+    HttpResponse response;
+    const std::string what = request.method + " " + request.Path();
+    if (what == "POST /control/faults") {
+        std::istringstream lines(request.body);
+        for (std::string line, error; std::getline(lines, line);) {
+            if (line.empty() || faults.Add(line, error)) continue;
+            response.status = 400;
+            response.body += error + "\n";
+        }
+    } else if (what == "GET /control/faults") {
+        response.body = faults.Pending();
+    } else if (what == "DELETE /control/faults") {
+        faults.Clear();
+    } else if (what == "GET /control/log") {
+        response.contentType = "application/x-ndjson";
+        response.body = log.Json();
+    } else if (what == "DELETE /control/log") {
+        log.Clear();
+    } else {
+        response.status = 404;
+        response.body = "not found";
+    }
+    return response;
+}

@@ -1,0 +1,8 @@
+// "/control/...": faults and log, for people and scripts.
+#pragma once
+
+#include "Faults.h"
+#include "Http.h"
+#include "RequestLog.h"
+
+HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log);

@@ -1,0 +1,112 @@
+#include "Server.h"
+
+#include <netinet/in.h>
+#include <netinet/tcp.h>
+#include <signal.h>
+#include <sys/socket.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <chrono>
+
+int Server::Open(int port, Handler handler)
+{
+    const int listener = socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
+    const int on = 1;
+    setsockopt(listener, SOL_SOCKET, SO_REUSEADDR, &on, sizeof on);
+    sockaddr_in address = {};
+    address.sin_family = AF_INET;
+    address.sin_port = htons(static_cast<uint16_t>(port));
+    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+    socklen_t size = sizeof address;
+    if (bind(listener, reinterpret_cast<sockaddr*>(&address), size) != 0 || listen(listener, 64) != 0) {
+        const int error = errno;
+        close(listener);
+        errno = error;
+        return -1;
+    }
+    getsockname(listener, reinterpret_cast<sockaddr*>(&address), &size);
+    m_Ports.push_back({listener, std::move(handler), std::thread()});
+    return ntohs(address.sin_port);
+}
+
+void Server::Begin()
+{
+    for (Port& port : m_Ports)
+        port.acceptor = std::thread([this, &port] { Accept(port); });
+}
+
+void Server::End()
+{
+    {
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        m_Ended = true;
+        m_Ending.notify_all();
+        for (const int descriptor : m_Open)
+            shutdown(descriptor, SHUT_RDWR);
+    }
+    for (Port& port : m_Ports) {
+        shutdown(port.listener, SHUT_RDWR);
+        if (port.acceptor.joinable()) port.acceptor.join();
+        close(port.listener);
+    }
+    // No worker is added from here on.
+    for (Worker& worker : m_Workers)
+        worker.thread.join();
+    m_Workers.clear();
+    m_Ports.clear();
+}
+
+bool Server::Pause(int milliseconds)
+{
+    std::unique_lock<std::mutex> lock(m_Mutex);
+    return !m_Ending.wait_for(lock, std::chrono::milliseconds(milliseconds), [this] { return m_Ended; });
+}
+
+void Server::Accept(const Port& port)
+{
+    for (;;) {
+        const int descriptor = accept4(port.listener, nullptr, nullptr, SOCK_CLOEXEC);
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        if (m_Ended || (descriptor < 0 && errno != EINTR && errno != ECONNABORTED && errno != EMFILE)) {
+            if (descriptor >= 0) close(descriptor);
+            return;
+        }
+        if (descriptor < 0) continue;
+        // An answer would wait up to 40 ms for the peer's word that it has the session tickets sent before.
+        const int on = 1;
+        setsockopt(descriptor, IPPROTO_TCP, TCP_NODELAY, &on, sizeof on);
+        const unsigned long number = ++m_Connections;
+        m_Open.insert(descriptor);
+        Reap();
+        Worker& worker = m_Workers.emplace_back();
+        worker.thread = std::thread([this, &port, &worker, descriptor, number] {
+            Serve(port, descriptor, number);
+            const std::lock_guard<std::mutex> ending(m_Mutex);
+            worker.done = true;
+        });
+    }
+}
+
+void Server::Serve(const Port& port, int descriptor, unsigned long number)
+{
+    // A peer that goes away must not end the process.
+    sigset_t broken;
+    sigemptyset(&broken);
+    sigaddset(&broken, SIGPIPE);
+    pthread_sigmask(SIG_BLOCK, &broken, nullptr);
+    Connection connection{Channel(descriptor), number};
+    port.handler(connection);
+    // Not open any more before the descriptor is closed and its number given out again.
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    m_Open.erase(descriptor);
+}
+
+// Joins the threads whose connections have ended; with the mutex held.
+void Server::Reap()
+{
+    for (auto worker = m_Workers.begin(); worker != m_Workers.end();) {
+        if (worker->done) worker->thread.join();
+        worker = worker->done ? m_Workers.erase(worker) : std::next(worker);
+    }
+}

@@ -1,0 +1,62 @@
+// Listens on ports of this machine and gives each connection a thread of its own. Every member may be called from any
+// thread, except as said.
+#pragma once
+
+#include <condition_variable>
+#include <functional>
+#include <list>
+#include <mutex>
+#include <set>
+#include <thread>
+
+#include "Channel.h"
+
+struct Connection {
+    Channel channel;
+    unsigned long number;  ///< From 1, over all ports.
+};
+
+class Server {
+public:
+    /// Serves a connection to its end, on the connection's thread.
+    using Handler = std::function<void(Connection&)>;
+
+    Server() = default;
+    ~Server() { End(); }
+    Server(const Server&) = delete;
+    Server& operator=(const Server&) = delete;
+
+    /// Opens a port of the loopback address, 0: a free one. The port; -1 with errno when it cannot be had. Connections
+    /// wait until Begin. Not beside another Open, Begin or End.
+    int Open(int port, Handler handler);
+    void Begin();
+    /// Breaks off whatever connections do, and waits for their threads. The last call.
+    void End();
+
+    /// False when the end comes meanwhile.
+    bool Pause(int milliseconds);
+
+private:
+    struct Port {
+        int listener;
+        Handler handler;
+        std::thread acceptor;
+    };
+    struct Worker {
+        std::thread thread;
+        bool done = false;
+    };
+
+    void Accept(const Port& port);
+    void Serve(const Port& port, int descriptor, unsigned long number);
+    void Reap();
+
+    std::list<Port> m_Ports;
+
+    std::mutex m_Mutex;
+    std::condition_variable m_Ending;
+    bool m_Ended = false;
+    std::set<int> m_Open;  // descriptors of the connections being served
+    std::list<Worker> m_Workers;
+    unsigned long m_Connections = 0;
+};
