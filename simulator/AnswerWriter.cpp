@@ -2,6 +2,16 @@
 
 #include <algorithm>
 
+namespace {
+
+// A header line of 1 KiB that means nothing.
+std::string Filler()
+{
+    return "X-Filler: " + std::string(1012, 'x') + "\r\n";
+}
+
+}  // namespace
+
 struct AnswerWriter::Answer {
     AnswerWriter& writer;
     Channel& channel;
@@ -34,6 +44,11 @@ const AnswerWriter::Way AnswerWriter::kWays[] = {
     {"cut-body", [](Answer& a) { return a.Last(a.Head() + a.Half()); }},
     {"reset", [](Answer& a) { return a.channel.Reset(), false; }},
     {"stall", [](Answer& a) { return a.channel.Stall(), false; }},
+    {"stall-header",
+     [](Answer& a) {
+         a.channel.Write(a.Head().substr(0, a.Head().size() / 2));
+         return a.channel.Stall(), false;
+     }},
     {"stall-body",
      [](Answer& a) {
          a.channel.Write(a.Head() + a.Half());
@@ -60,6 +75,7 @@ const AnswerWriter::Way AnswerWriter::kWays[] = {
      }},
     {"zero-length",
      [](Answer& a) {
+         a.framing.length = Framing::Announced;
          a.framing.announced = 0;
          return a.channel.Write(a.Whole());
      }},
@@ -73,6 +89,13 @@ const AnswerWriter::Way AnswerWriter::kWays[] = {
              more = a.channel.Write(piece) && a.writer.m_Server.Pause(0);
          return false;
      }},
+    {"endless-header",
+     [](Answer& a) {
+         bool more = a.channel.Write(a.Head().substr(0, a.Head().size() - 2));
+         while (more)
+             more = a.channel.Write(Filler()) && a.writer.m_Server.Pause(0);
+         return false;
+     }},
 };
 
 bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpResponse response, const Fault& fault)
@@ -80,6 +103,7 @@ bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpRespon
     if (fault.Is("http")) {
         response.status = fault.Number(503);
         response.body.clear();
+        response.opensTunnel = false;
         if (response.status == 302) response.headers.emplace_back("Location", "https://localhost/elsewhere");
     } else if (fault.Is("body")) {
         response.body = fault.value;
@@ -90,9 +114,15 @@ bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpRespon
     } else {
         Encode(response, request.Header("accept-encoding").find("gzip") != std::string::npos, fault);
     }
-    const bool keepAlive = request.KeepAlive();
+    for (int i = 0; fault.Is("headers") && i < fault.Number(64); ++i)
+        response.headers.emplace_back("X-Filler", std::string(1012, 'x'));
+    const bool keepAlive = response.opensTunnel || request.KeepAlive();
     const size_t length = response.status == 304 ? 0 : response.body.size();
-    Answer answer = {*this, channel, response, fault, {Framing::Announced, length, keepAlive}};
+    Answer answer = {*this,
+                     channel,
+                     response,
+                     fault,
+                     {response.opensTunnel ? Framing::Unannounced : Framing::Announced, length, keepAlive}};
     const auto way = std::find_if(std::begin(kWays), std::end(kWays), [&](const Way& w) { return fault.Is(w.kind); });
     if (!(way == std::end(kWays) ? channel.Write(answer.Whole()) : way->write(answer))) return false;
     if (!keepAlive) channel.Close();

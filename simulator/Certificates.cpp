@@ -6,6 +6,8 @@
 
 #include <cstdio>
 
+#include "Hosts.h"
+
 namespace {
 
 constexpr long kDay = 24 * 60 * 60;
@@ -55,17 +57,22 @@ X509* NewAuthority(EVP_PKEY* key)
     return authority;
 }
 
-const char* NamesOf(CertificateKind kind)
+// Those of the subject's alternative names.
+std::string NamesOf(CertificateKind kind)
 {
+    std::string names = "DNS:localhost,IP:127.0.0.1";
+    for (const HostRow& host : kHosts) {
+        if (host.tls) names += std::string(",DNS:") + host.name;
+    }
     switch (kind) {
         case CertificateKind::WrongName:
             return "DNS:other.example";
         case CertificateKind::WideWildcard:
             return "DNS:*";  // must not stand for a host
         case CertificateKind::NameOnly:
-            return nullptr;
+            return "";
         default:
-            return "DNS:localhost,IP:127.0.0.1";
+            return names;
     }
 }
 
@@ -121,7 +128,8 @@ SSL_CTX* Certificates::Context(CertificateKind kind, bool oldTls) const
     X509* certificate =
         NewCertificate(key, "localhost", expired ? -20 * kDay : -kDay, expired ? -10 * kDay : 365 * kDay);
     X509_set_issuer_name(certificate, X509_get_subject_name(issuer));
-    if (const char* names = NamesOf(kind)) AddExtension(certificate, issuer, NID_subject_alt_name, names);
+    const std::string names = NamesOf(kind);
+    if (!names.empty()) AddExtension(certificate, issuer, NID_subject_alt_name, names);
     X509_sign(certificate, signer, EVP_sha256());
 
     SSL_CTX* context = SSL_CTX_new(TLS_server_method());

@@ -10,49 +10,59 @@
 namespace {
 
 // Where a kind makes sense.
-enum Place : unsigned { kSoap = 1, kPlain = 2, kBoxArt = 4, kConnect = 8 };
+enum Place : unsigned { kSoap = 1, kPlain = 2, kBoxArt = 4, kConnect = 8, kProxy = 16 };
 constexpr unsigned kAnswers = kSoap | kPlain | kBoxArt;
+constexpr unsigned kAll = kAnswers | kConnect | kProxy;
 
-const struct {
+// Whether what the request asks for is done with such an answer.
+enum Effect { kDone, kUndone };
+
+const struct KindRow {
     const char* kind;  // ":N" behind it takes a number, ":TEXT" any text
     unsigned places;
+    Effect effect;
     const char* help;
 } kKinds[] = {
-    {"ok", kAnswers | kConnect, "no fault: the request passes (to let some requests through first)"},
-    {"code:N", kSoap, "the service refuses with response code N (answers that have one)"},
-    {"fault11", kSoap, "a SOAP 1.1 fault"},
-    {"fault12", kSoap, "a SOAP 1.2 fault"},
-    {"soap12", kSoap, "the right answer in a SOAP 1.2 envelope"},
-    {"http:N", kAnswers, "HTTP status N (302 with a Location)"},
-    {"cut", kAnswers, "the connection is closed before the answer"},
-    {"cut-header", kAnswers, "closed in the middle of the HTTP header"},
-    {"cut-body", kAnswers, "closed in the middle of the body"},
-    {"reset", kAnswers | kConnect, "the connection is reset"},
-    {"stall", kAnswers | kConnect, "no answer (connect: no handshake), as long as the client waits"},
-    {"stall-body", kAnswers, "half of the body, and then nothing"},
-    {"stall-handshake", kConnect, "the beginning of a handshake record, and then nothing"},
-    {"drip:N", kAnswers, "the answer in single bytes, N milliseconds (100) apart"},
-    {"hold", kAnswers, "the right answer, made now and kept back until the faults are cleared"},
-    {"split:N", kAnswers, "header and body in two writes, N milliseconds (50) apart"},
-    {"garbage", kAnswers, "200, and a body that is no XML"},
-    {"no-http", kAnswers | kConnect, "bytes that are no HTTP (connect: no TLS)"},
-    {"short", kAnswers, "less body than its length announces"},
-    {"long", kAnswers, "bytes left over behind the announced length"},
-    {"no-length", kAnswers, "no Content-Length"},
-    {"zero-length", kAnswers, "Content-Length 0"},
-    {"empty", kAnswers, "200 with an empty body"},
-    {"endless", kAnswers, "a body that never ends"},
-    {"bomb:N", kAnswers, "a compressed body of N MiB (256) of blanks"},
-    {"damaged-gzip", kAnswers, "a compressed body with wrong bytes in it"},
-    {"wrong-checksum", kAnswers, "a compressed body whose checksum is wrong"},
-    {"missing-result", kSoap, "an answer without its result element"},
-    {"must-understand", kSoap, "an unknown header block that must be understood"},
-    {"extra-header", kSoap, "an unknown header block that need not be"},
-    {"unknown-enum", kSoap, "an enumeration text that no contract knows (in answers that hold one)"},
-    {"not-modified", kBoxArt, "304"},
-    {"modified", kBoxArt, "box art that is newer than the client's"},
-    {"body:TEXT", kPlain, "another body"},
-    {"close", kConnect, "closed before the TLS handshake"},
+    {"ok", kAll, kDone, "no fault: the request passes (to let some requests through first)"},
+    {"code:N", kSoap, kUndone, "the service refuses with response code N (answers that have one)"},
+    {"fault11", kSoap, kUndone, "a SOAP 1.1 fault"},
+    {"fault12", kSoap, kUndone, "a SOAP 1.2 fault"},
+    {"soap12", kSoap, kDone, "the right answer in a SOAP 1.2 envelope"},
+    {"http:N", kAnswers | kProxy, kUndone, "HTTP status N (302 with a Location)"},
+    {"cut", kAnswers | kProxy, kUndone, "the connection is closed before the answer"},
+    {"cut-header", kAnswers | kProxy, kUndone, "closed in the middle of the HTTP header"},
+    {"cut-body", kAnswers, kUndone, "closed in the middle of the body"},
+    {"reset", kAll, kUndone, "the connection is reset"},
+    {"stall", kAll, kUndone, "no answer (connect: no handshake), as long as the client waits"},
+    {"stall-header", kAnswers | kProxy, kUndone, "half of the HTTP header, and then nothing"},
+    {"stall-body", kAnswers, kDone, "half of the body, and then nothing"},
+    {"stall-handshake", kConnect, kUndone, "the beginning of a handshake record, and then nothing"},
+    {"drip:N", kAnswers | kProxy, kDone, "the answer in single bytes, N milliseconds (100) apart"},
+    {"hold", kAnswers | kProxy, kDone, "the right answer, made now and kept back until the faults are cleared"},
+    {"split:N", kAnswers, kDone, "header and body in two writes, N milliseconds (50) apart"},
+    {"garbage", kAnswers | kProxy, kUndone, "200, and a body that is no XML"},
+    {"no-http", kAll, kUndone, "bytes that are no HTTP (connect: no TLS)"},
+    {"short", kAnswers, kUndone, "less body than its length announces"},
+    {"long", kAnswers | kProxy, kDone, "bytes left over behind the announced length"},
+    {"no-length", kAnswers, kUndone, "no Content-Length"},
+    {"zero-length", kAnswers | kProxy, kUndone, "Content-Length 0"},
+    {"empty", kAnswers, kUndone, "200 with an empty body"},
+    {"endless", kAnswers | kProxy, kUndone, "a body that never ends"},
+    {"endless-header", kAnswers | kProxy, kUndone, "header lines that never end"},
+    {"headers:N", kAnswers | kProxy, kDone, "N KiB (64) of further header lines"},
+    {"bomb:N", kAnswers, kUndone, "a compressed body of N MiB (256) of blanks"},
+    {"damaged-gzip", kAnswers, kUndone, "a compressed body with wrong bytes in it"},
+    {"wrong-checksum", kAnswers, kUndone, "a compressed body whose checksum is wrong"},
+    {"missing-result", kSoap, kUndone, "an answer without its result element"},
+    {"must-understand", kSoap, kDone, "an unknown header block that must be understood"},
+    {"extra-header", kSoap, kDone, "an unknown header block that need not be"},
+    {"unknown-enum", kSoap, kDone, "an enumeration text that no contract knows (in answers that hold one)"},
+    {"not-modified", kBoxArt, kDone, "304"},
+    {"modified", kBoxArt, kDone, "box art that is newer than the client's"},
+    {"body:TEXT", kPlain, kUndone, "another body"},
+    {"close", kConnect, kUndone, "closed before the TLS handshake"},
+    {"cut-tunnel:N", kProxy, kDone, "closed when N bytes (0) have come back through the proxy"},
+    {"stall-tunnel:N", kProxy, kDone, "nothing more passes when N bytes (0) have come back"},
 };
 
 std::string Name(const std::string& kind)
@@ -60,11 +70,19 @@ std::string Name(const std::string& kind)
     return kind.substr(0, kind.find(':'));
 }
 
+const KindRow* FindKind(const std::string& kind)
+{
+    const KindRow* row = std::find_if(std::begin(kKinds), std::end(kKinds),
+                                      [&](const KindRow& known) { return Name(known.kind) == kind; });
+    return row == std::end(kKinds) ? nullptr : row;
+}
+
 // Where the faults of a list go; 0 when there is no such list.
 unsigned PlacesOf(const std::string& operation)
 {
     if (operation == "any") return kAnswers;
     if (operation == "connect") return kConnect;
+    if (operation == "proxy") return kProxy;
     if (operation == "boxart") return kBoxArt;
     if (operation == "discovery" || operation == "clock" || operation == "bandwidth") return kPlain;
     for (const ServiceRow& service : Services()) {
@@ -95,9 +113,8 @@ std::string ReadKind(const std::string& operation, unsigned places, const std::s
 {
     fault.kind = Name(text);
     if (fault.kind.size() < text.size()) fault.value = text.substr(fault.kind.size() + 1);
-    const auto* row = std::find_if(std::begin(kKinds), std::end(kKinds),
-                                   [&](const auto& known) { return Name(known.kind) == fault.kind; });
-    if (row == std::end(kKinds)) return "\"" + text + "\" is no kind of fault; --help lists them";
+    const KindRow* row = FindKind(fault.kind);
+    if (!row) return "\"" + text + "\" is no kind of fault; --help lists them";
     if ((row->places & places) == 0) return fault.kind + " cannot happen to " + operation;
     const std::string shape = row->kind;
     int number = 0;
@@ -121,6 +138,12 @@ bool ReadCondition(const std::string& text, Fault& fault)
 }
 
 }  // namespace
+
+bool Fault::ClaimsFailure() const
+{
+    const KindRow* row = FindKind(kind);
+    return row && row->effect == kUndone && !afterEffect;
+}
 
 int Fault::Number(int standard) const
 {
@@ -160,7 +183,7 @@ Fault Faults::Take(const std::string& operation)
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
     for (const std::string& name : {operation, std::string("any")}) {
-        if (name == "any" && operation == "connect") break;
+        if (name == "any" && (operation == "connect" || operation == "proxy")) break;
         auto& list = m_Lists[name];
         if (list.empty()) continue;
         Fault fault = list.front();
@@ -209,11 +232,13 @@ std::string Faults::Help()
 {
     std::string help =
         "Faults: OPERATION=KIND[:VALUE][,delay=MS][,count=N][,after]\n"
-        "  OPERATION is a SOAP operation (getTitleListing), discovery, clock, bandwidth, boxart, connect (before a "
-        "TLS\n"
-        "  handshake) or any. Each request takes the first fault of its list; count=N serves N requests. A fault "
-        "suppresses\n"
-        "  what it claims has failed, unless \"after\" is given: then it is done and only the answer lies.\n"
+        "  OPERATION is a SOAP operation (getTitleListing), discovery, clock, bandwidth, boxart, any (of these), "
+        "connect\n"
+        "  (before a TLS handshake) or proxy (a request to the proxy). Each request takes the first fault of its "
+        "list;\n"
+        "  count=N serves N requests. A fault suppresses what it claims has failed, unless \"after\" is given: then it "
+        "is\n"
+        "  done and only the answer lies.\n"
         "  Kinds:\n";
     for (const auto& row : kKinds) {
         help += std::string("    ") + row.kind +

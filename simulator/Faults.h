@@ -18,6 +18,8 @@ struct Fault {
     bool Is(const char* name) const { return kind == name; }
     int Number(int standard) const;
     std::string Text() const { return value.empty() ? kind : kind + ":" + value; }
+    /// Whether what the client gets says that the request was not carried out, and it was not.
+    bool ClaimsFailure() const;
 };
 
 class Faults {

@@ -21,43 +21,31 @@ std::string Lower(std::string text)
 const char* Reason(int status)
 {
     switch (status) {
+        case 100:
+            return "Continue";
         case 200:
             return "OK";
         case 302:
             return "Found";
         case 304:
             return "Not Modified";
+        case 400:
+            return "Bad Request";
+        case 403:
+            return "Forbidden";
         case 404:
             return "Not Found";
+        case 407:
+            return "Proxy Authentication Required";
         case 500:
             return "Internal Server Error";
+        case 502:
+            return "Bad Gateway";
         case 503:
             return "Service Unavailable";
         default:
             return "Status";
     }
-}
-
-bool ParseHead(const std::string& head, HttpRequest& request)
-{
-    size_t end = head.find("\r\n");
-    const std::string first = head.substr(0, end);
-    const size_t blank = first.find(' ');
-    const size_t second = first.find(' ', blank + 1);
-    if (blank == std::string::npos || second == std::string::npos) return false;
-    request.method = first.substr(0, blank);
-    request.target = first.substr(blank + 1, second - blank - 1);
-    while (end != std::string::npos && end + 2 < head.size()) {
-        const size_t start = end + 2;
-        end = head.find("\r\n", start);
-        const std::string line = head.substr(start, end == std::string::npos ? end : end - start);
-        const size_t colon = line.find(':');
-        if (colon == std::string::npos) return false;
-        const size_t value = line.find_first_not_of(' ', colon + 1);
-        request.headers.emplace_back(Lower(line.substr(0, colon)),
-                                     value == std::string::npos ? std::string() : line.substr(value));
-    }
-    return true;
 }
 
 bool ReadMore(Channel& channel, std::string& text)
@@ -70,12 +58,39 @@ bool ReadMore(Channel& channel, std::string& text)
 
 }  // namespace
 
-std::string HttpRequest::Header(const std::string& name) const
+std::string HeaderOf(const Headers& headers, const std::string& name)
 {
     for (const auto& header : headers) {
         if (header.first == name) return header.second;
     }
     return std::string();
+}
+
+bool ReadHead(const std::string& head, std::string& first, Headers& headers)
+{
+    size_t end = head.find("\r\n");
+    first = head.substr(0, end);
+    while (end != std::string::npos && end + 2 < head.size()) {
+        const size_t start = end + 2;
+        end = head.find("\r\n", start);
+        const std::string line = head.substr(start, end == std::string::npos ? end : end - start);
+        const size_t colon = line.find(':');
+        if (colon == std::string::npos) return false;
+        const size_t value = line.find_first_not_of(' ', colon + 1);
+        headers.emplace_back(Lower(line.substr(0, colon)),
+                             value == std::string::npos ? std::string() : line.substr(value));
+    }
+    return true;
+}
+
+std::string HttpRequest::Local() const
+{
+    for (const std::string scheme : {"http://", "https://"}) {
+        if (target.compare(0, scheme.size(), scheme) != 0) continue;
+        const size_t slash = target.find('/', scheme.size());
+        return slash == std::string::npos ? "/" : target.substr(slash);
+    }
+    return target;
 }
 
 std::string HttpRequest::Parameter(const std::string& name) const
@@ -100,14 +115,17 @@ bool HttpRequest::KeepAlive() const
 
 std::string HttpResponse::Head(const Framing& framing) const
 {
-    std::string head = "HTTP/1.1 " + std::to_string(status) + " " + Reason(status) + "\r\n";
-    head += "Server: storefront-simulator\r\nContent-Type: " + contentType + "\r\n";
+    std::string head = "HTTP/1.1 " + std::to_string(status) + " ";
+    head += opensTunnel ? "Connection established" : Reason(status);
+    head += "\r\nServer: storefront-simulator\r\n";
+    if (!opensTunnel) head += "Content-Type: " + contentType + "\r\n";
     for (const auto& header : headers)
         head += header.first + ": " + header.second + "\r\n";
     if (framing.length == Framing::Announced) {
         head += "Content-Length: " + std::to_string(framing.announced) + "\r\n";
     }
-    return head + "Connection: " + (framing.keepAlive ? "keep-alive" : "close") + "\r\n\r\n";
+    if (!opensTunnel) head += std::string("Connection: ") + (framing.keepAlive ? "keep-alive" : "close") + "\r\n";
+    return head + "\r\n";
 }
 
 bool ReadRequest(Channel& channel, std::string& rest, HttpRequest& request)
@@ -116,7 +134,13 @@ bool ReadRequest(Channel& channel, std::string& rest, HttpRequest& request)
     while ((headEnd = rest.find("\r\n\r\n")) == std::string::npos) {
         if (!ReadMore(channel, rest)) return false;
     }
-    if (!ParseHead(rest.substr(0, headEnd), request)) return false;
+    std::string first;
+    if (!ReadHead(rest.substr(0, headEnd), first, request.headers)) return false;
+    const size_t blank = first.find(' ');
+    const size_t second = first.find(' ', blank + 1);
+    if (blank == std::string::npos || second == std::string::npos) return false;
+    request.method = first.substr(0, blank);
+    request.target = first.substr(blank + 1, second - blank - 1);
     rest.erase(0, headEnd + 4);
     const size_t length = strtoul(request.Header("content-length").c_str(), nullptr, 10);
     if (length > kLargestRequest) return false;

@@ -9,14 +9,22 @@ class Channel;
 
 using Headers = std::vector<std::pair<std::string, std::string>>;
 
+/// The value of the first header of the name, which is in lower case; empty when there is none.
+std::string HeaderOf(const Headers& headers, const std::string& name);
+
+/// The first line of a head, and its headers with their names in lower case. False when it is no head.
+bool ReadHead(const std::string& head, std::string& first, Headers& headers);
+
 struct HttpRequest {
     std::string method;
-    std::string target;  ///< Path and query.
+    std::string target;  ///< As it stands: path and query, a whole address, or host and port.
     Headers headers;     ///< Names in lower case.
     std::string body;
 
-    std::string Header(const std::string& name) const;
-    std::string Path() const { return target.substr(0, target.find('?')); }
+    std::string Header(const std::string& name) const { return HeaderOf(headers, name); }
+    std::string Path() const { return Local().substr(0, Local().find('?')); }
+    /// The target as a server that is no proxy takes it: without "http://host".
+    std::string Local() const;
     /// A parameter of the query, decoded; empty when there is none.
     std::string Parameter(const std::string& name) const;
     bool KeepAlive() const;
@@ -34,6 +42,7 @@ struct HttpResponse {
     Headers headers;
     std::string body;
     std::string contentType = "text/plain; charset=utf-8";
+    bool opensTunnel = false;  ///< Not an answer with a body: bytes of a tunnel follow.
 
     /// The lines before the body.
     std::string Head(const Framing& framing) const;

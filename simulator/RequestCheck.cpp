@@ -9,6 +9,7 @@
 #include <ctime>
 #include <memory>
 
+#include "Base64.h"
 #include "Tokens.h"
 
 namespace {
@@ -82,31 +83,12 @@ private:
     xmlNodePtr m_Node;
 };
 
-std::string Base64(const unsigned char* bytes, size_t length)
-{
-    std::string text(4 * ((length + 2) / 3) + 1, '\0');
-    text.resize(EVP_EncodeBlock(reinterpret_cast<unsigned char*>(&text[0]), bytes, static_cast<int>(length)));
-    return text;
-}
-
-std::string Unbase64(const std::string& text)
-{
-    std::string bytes(text.size() + 1, '\0');
-    const int length =
-        EVP_DecodeBlock(reinterpret_cast<unsigned char*>(&bytes[0]),
-                        reinterpret_cast<const unsigned char*>(text.data()), static_cast<int>(text.size()));
-    const auto padding = std::count(text.begin(), text.end(), '=');
-    if (length < padding || padding > 2) return "";
-    bytes.resize(static_cast<size_t>(length - padding));
-    return bytes;
-}
-
 std::string Sha1(const std::string& text)
 {
     unsigned char digest[EVP_MAX_MD_SIZE];
     unsigned int length = 0;
     EVP_Digest(text.data(), text.size(), digest, &length, EVP_sha1(), nullptr);
-    return Base64(digest, length);
+    return Base64(std::string(digest, digest + length));
 }
 
 bool IsInt(const std::string& text)
@@ -279,8 +261,17 @@ bool RequestCheck::IsNewNonce(const std::string& nonce)
     return m_Nonces.insert(nonce).second;
 }
 
-std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& service, const std::string& endpoint,
-                                CheckedRequest& checked, LoggedRequest& log)
+// Whether the text is the address of the services with that path, under whatever name of theirs.
+bool RequestCheck::IsEndpoint(const std::string& text, const std::string& path) const
+{
+    const std::string scheme = "https://";
+    const size_t slash = text.find('/', scheme.size());
+    return text.compare(0, scheme.size(), scheme) == 0 && slash != std::string::npos && text.substr(slash) == path &&
+           m_Hosts.IsService(text.substr(scheme.size(), slash - scheme.size()));
+}
+
+std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& service, CheckedRequest& checked,
+                                LoggedRequest& log)
 {
     const std::unique_ptr<xmlDoc, void (*)(xmlDocPtr)> document(
         xmlReadMemory(request.body.data(), static_cast<int>(request.body.size()), nullptr, nullptr,
@@ -319,7 +310,8 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     if (blocks[2].Child(kAddressing, "Address").Content() != std::string(kAddressing) + "/role/anonymous") {
         return "wsa:ReplyTo is not anonymous";
     }
-    if (blocks[3].Content() != endpoint) return "wsa:To is not " + endpoint;
+    if (!IsEndpoint(blocks[3].Content(), request.Path()))
+        return "wsa:To is not https://" + m_Hosts.Https() + request.Path();
     if (blocks[4].Content() != action) return "wsa:Action is not " + action;
 
     wrong = CheckToken(blocks[0]);

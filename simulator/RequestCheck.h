@@ -5,6 +5,7 @@
 #include <set>
 #include <string>
 
+#include "Hosts.h"
 #include "Http.h"
 #include "Service.h"
 #include "Storefront.h"
@@ -19,17 +20,19 @@ struct CheckedRequest {
 
 class RequestCheck {
 public:
-    explicit RequestCheck(Database& database) : m_Database(database) {}
+    RequestCheck(Database& database, const Hosts& hosts) : m_Database(database), m_Hosts(hosts) {}
 
-    /// Checks a request to the service whose endpoint is `endpoint`. Empty when it is right, else what is wrong with
-    /// it. `log` gets the operation, its children and the token's standing either way, as far as they were found.
-    std::string Check(const HttpRequest& request, const ServiceRow& service, const std::string& endpoint,
-                      CheckedRequest& checked, LoggedRequest& log);
+    /// Checks a request to the service. Empty when it is right, else what is wrong with it. `log` gets the operation,
+    /// its children and the token's standing either way, as far as they were found.
+    std::string Check(const HttpRequest& request, const ServiceRow& service, CheckedRequest& checked,
+                      LoggedRequest& log);
 
 private:
+    bool IsEndpoint(const std::string& text, const std::string& path) const;
     bool IsNewNonce(const std::string& nonce);
 
     Database& m_Database;
+    const Hosts& m_Hosts;
     std::mutex m_Mutex;
     std::set<std::string> m_Nonces;
 };

@@ -37,7 +37,9 @@ std::string Line(const LoggedRequest& request)
     snprintf(numbers, sizeof numbers, "\"connection\": %lu, \"tls\": %s, \"resumed\": %s, \"time\": %.3f",
              request.connection, request.tls ? "true" : "false", request.resumed ? "true" : "false", request.time);
     return "{\"number\": " + std::to_string(request.number) + ", \"service\": " + Quoted(request.service) +
-           ", \"operation\": " + Quoted(request.operation) + ", " + numbers +
+           ", \"operation\": " + Quoted(request.operation) + ", \"method\": " + Quoted(request.method) +
+           ", \"target\": " + Quoted(request.target) + ", " + numbers +
+           ", \"proxy\": " + std::to_string(request.proxy) + ", \"credentials\": " + Quoted(request.credentials) +
            ", \"headers\": " + Pairs(request.headers) + ", \"soap\": " + Pairs(request.soap) +
            ", \"children\": " + Pairs(request.children) + ", \"fault\": " + Quoted(request.fault) +
            ", \"violation\": " + Quoted(request.violation) + "}\n";

@@ -1,6 +1,7 @@
 // What was asked, in order.
 #pragma once
 
+#include <chrono>
 #include <condition_variable>
 #include <mutex>
 
@@ -8,6 +9,8 @@
 
 class RequestLog {
 public:
+    /// Seconds since the start.
+    double Now() const { return std::chrono::duration<double>(Clock::now() - m_Start).count(); }
     void Add(LoggedRequest request);
     std::vector<LoggedRequest> All() const;
     void Clear();
@@ -18,6 +21,8 @@ public:
     std::string Json() const;
 
 private:
+    using Clock = std::chrono::steady_clock;
+    const Clock::time_point m_Start = Clock::now();
     mutable std::mutex m_Mutex;
     mutable std::condition_variable m_Changed;
     std::vector<LoggedRequest> m_Requests;

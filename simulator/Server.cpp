@@ -63,10 +63,25 @@ bool Server::Pause(int milliseconds)
     return !m_Ending.wait_for(lock, std::chrono::milliseconds(milliseconds), [this] { return m_Ended; });
 }
 
+void Server::Watch(int descriptor)
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    m_Open.insert(descriptor);
+    if (m_Ended) shutdown(descriptor, SHUT_RDWR);
+}
+
+void Server::Forget(int descriptor)
+{
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    m_Open.erase(descriptor);
+}
+
 void Server::Accept(const Port& port)
 {
     for (;;) {
-        const int descriptor = accept4(port.listener, nullptr, nullptr, SOCK_CLOEXEC);
+        sockaddr_in peer = {};
+        socklen_t size = sizeof peer;
+        const int descriptor = accept4(port.listener, reinterpret_cast<sockaddr*>(&peer), &size, SOCK_CLOEXEC);
         const std::lock_guard<std::mutex> lock(m_Mutex);
         if (m_Ended || (descriptor < 0 && errno != EINTR && errno != ECONNABORTED && errno != EMFILE)) {
             if (descriptor >= 0) close(descriptor);
@@ -80,26 +95,25 @@ void Server::Accept(const Port& port)
         m_Open.insert(descriptor);
         Reap();
         Worker& worker = m_Workers.emplace_back();
-        worker.thread = std::thread([this, &port, &worker, descriptor, number] {
-            Serve(port, descriptor, number);
+        worker.thread = std::thread([this, &port, &worker, descriptor, number, peer] {
+            Serve(port, descriptor, number, ntohs(peer.sin_port));
             const std::lock_guard<std::mutex> ending(m_Mutex);
             worker.done = true;
         });
     }
 }
 
-void Server::Serve(const Port& port, int descriptor, unsigned long number)
+void Server::Serve(const Port& port, int descriptor, unsigned long number, int peer)
 {
     // A peer that goes away must not end the process.
     sigset_t broken;
     sigemptyset(&broken);
     sigaddset(&broken, SIGPIPE);
     pthread_sigmask(SIG_BLOCK, &broken, nullptr);
-    Connection connection{Channel(descriptor), number};
+    Connection connection{Channel(descriptor), number, peer};
     port.handler(connection);
-    // Not open any more before the descriptor is closed and its number given out again.
-    const std::lock_guard<std::mutex> lock(m_Mutex);
-    m_Open.erase(descriptor);
+    // Before the descriptor is closed and its number given out again.
+    Forget(descriptor);
 }
 
 // Joins the threads whose connections have ended; with the mutex held.

@@ -13,7 +13,9 @@
 
 struct Connection {
     Channel channel;
-    unsigned long number;  ///< From 1, over all ports.
+    unsigned long number;     ///< From 1, over all ports.
+    int peer;                 ///< The port at the other end.
+    unsigned long proxy = 0;  ///< The connection to the proxy that this one continues.
 };
 
 class Server {
@@ -36,6 +38,10 @@ public:
     /// False when the end comes meanwhile.
     bool Pause(int milliseconds);
 
+    /// The end breaks off a descriptor of the caller's as well, until it is forgotten.
+    void Watch(int descriptor);
+    void Forget(int descriptor);
+
 private:
     struct Port {
         int listener;
@@ -48,7 +54,7 @@ private:
     };
 
     void Accept(const Port& port);
-    void Serve(const Port& port, int descriptor, unsigned long number);
+    void Serve(const Port& port, int descriptor, unsigned long number, int peer);
     void Reap();
 
     std::list<Port> m_Ports;
@@ -56,7 +62,7 @@ private:
     std::mutex m_Mutex;
     std::condition_variable m_Ending;
     bool m_Ended = false;
-    std::set<int> m_Open;  // descriptors of the connections being served
+    std::set<int> m_Open;  // descriptors that the end breaks off
     std::list<Worker> m_Workers;
     unsigned long m_Connections = 0;
 };

@@ -1,7 +1,5 @@
 #include "SoapService.h"
 
-#include <array>
-
 namespace {
 
 const char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
@@ -22,17 +20,6 @@ std::string WithUnknownEnum(std::string xml)
         if (at != std::string::npos) return xml.insert(at + std::string(element).size(), "New_");
     }
     return xml;
-}
-
-// Whether the fault says that the request was not carried out.
-bool ClaimsFailure(const Fault& fault)
-{
-    static const std::array<const char*, 10> kHarmless = {
-        "", "soap12", "drip", "split", "long", "must-understand", "extra-header", "unknown-enum", "stall-body", "hold"};
-    for (const char* kind : kHarmless) {
-        if (fault.Is(kind)) return false;
-    }
-    return !fault.afterEffect;
 }
 
 }  // namespace
@@ -115,7 +102,7 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
     };
     Call call = into(xml);
     const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
-    if (ClaimsFailure(fault)) {
+    if (fault.ClaimsFailure()) {
         m_Database.Run("SAVEPOINT request");
         checked.operation->handle(call);
         m_Database.Run("ROLLBACK TO request");

@@ -6,8 +6,8 @@
 
 class SoapService {
 public:
-    SoapService(Database& database, std::string plainAddress, int largestPage)
-        : m_Database(database), m_Check(database), m_PlainAddress(std::move(plainAddress)), m_LargestPage(largestPage)
+    SoapService(Database& database, const Hosts& hosts, int largestPage)
+        : m_Database(database), m_Check(database, hosts), m_PlainAddress(hosts.Http()), m_LargestPage(largestPage)
     {}
 
     /// The service behind a path, or null.
@@ -15,12 +15,11 @@ public:
 
     /// `takeFault(operation)` gives the fault to apply.
     template <class TakeFault>
-    HttpResponse Answer(const HttpRequest& request, const ServiceRow& service, const std::string& endpoint,
-                        LoggedRequest& log, TakeFault takeFault)
+    HttpResponse Answer(const HttpRequest& request, const ServiceRow& service, LoggedRequest& log, TakeFault takeFault)
     {
         CheckedRequest checked;
         log.service = service.name;
-        log.violation = m_Check.Check(request, service, endpoint, checked, log);
+        log.violation = m_Check.Check(request, service, checked, log);
         const Fault fault = takeFault(log.operation);
         return log.violation.empty() ? Respond(checked, fault) : Refuse("Client", log.violation, false);
     }

@@ -5,7 +5,6 @@
 
 #include <atomic>
 #include <cerrno>
-#include <chrono>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
@@ -14,14 +13,14 @@
 #include "Catalogue.h"
 #include "Certificates.h"
 #include "Control.h"
+#include "Hosts.h"
 #include "PlainService.h"
-#include "RequestLog.h"
+#include "Proxy.h"
+#include "RequestLoop.h"
 #include "Server.h"
 #include "SoapService.h"
 
 namespace {
-
-using Clock = std::chrono::steady_clock;
 
 class Simulator final : public Storefront {
 public:
@@ -34,8 +33,10 @@ public:
 
     int HttpsPort() const override { return m_HttpsPort; }
     int HttpPort() const override { return m_HttpPort; }
+    int ProxyPort() const override { return m_ProxyPort; }
     std::string DataFolder() const override { return m_Folder; }
     std::string DeploymentFile() const override { return m_Folder + "/deployment.conf"; }
+    std::string ProxyDeploymentFile() const override { return m_Folder + "/behind-proxy.conf"; }
     bool AddFault(const std::string& text, std::string& error) override { return m_Faults.Add(text, error); }
     void ClearFaults() override { m_Faults.Clear(); }
     std::vector<LoggedRequest> Log() const override { return m_Log.All(); }
@@ -50,11 +51,9 @@ private:
     bool OpenFolder(std::string& error);
     bool OpenPorts(std::string& error);
     bool WriteFiles(std::string& error);
+    bool WriteDeployment(const std::string& name, bool behindProxy) const;
     bool Handshake(Connection& connection);
-    void NoteMalformed(const Connection& connection);
-    void NoteConnection(const Connection& connection, const std::string& fault);
-    double Now() const { return std::chrono::duration<double>(Clock::now() - m_Start).count(); }
-    void ServeRequests(Connection& connection);
+    void Serve(Connection& connection, bool tls);
     bool ServeOne(Connection& connection, const HttpRequest& request);
     HttpResponse Answer(const HttpRequest& request, const Connection& connection, LoggedRequest& log, Fault& fault);
 
@@ -63,9 +62,10 @@ private:
     bool m_FolderIsTemporary = false;
     int m_HttpsPort = 0;
     int m_HttpPort = 0;
+    int m_ProxyPort = -1;
     std::atomic<int> m_Latency;
-    const Clock::time_point m_Start = Clock::now();
 
+    std::unique_ptr<Hosts> m_Hosts;
     std::unique_ptr<Certificates> m_Certificates;
     std::unique_ptr<Database> m_Database;
     std::unique_ptr<SoapService> m_Soap;
@@ -74,6 +74,7 @@ private:
 
     Server m_Server;
     AnswerWriter m_Writer;
+    std::unique_ptr<Proxy> m_Proxy;  // null when there is none
 
     std::mutex m_Mutex;
     SSL_CTX* m_Tls = nullptr;  // with the mutex held
@@ -119,17 +120,22 @@ bool Simulator::OpenPorts(std::string& error)
         const char* option;
         Server::Handler handler;
     } rows[] = {
-        {m_Options.httpsPort, m_HttpsPort, "--https-port",
-         [this](Connection& connection) {
-             if (Handshake(connection)) ServeRequests(connection);
-         }},
-        {m_Options.httpPort, m_HttpPort, "--http-port", [this](Connection& connection) { ServeRequests(connection); }}};
+        {m_Options.httpsPort, m_HttpsPort, "--https-port", [this](Connection& c) { Serve(c, true); }},
+        {m_Options.httpPort, m_HttpPort, "--http-port", [this](Connection& c) { Serve(c, false); }},
+        {m_Options.proxyPort, m_ProxyPort, "--proxy-port", [this](Connection& c) { m_Proxy->Serve(c); }},
+    };
     for (const auto& row : rows) {
+        if (row.wanted < 0) continue;
         row.port = m_Server.Open(row.wanted, row.handler);
         if (row.port >= 0) continue;
         error = "port " + std::to_string(row.wanted) + ": " + strerror(errno) + "; choose another one with " +
                 row.option + " (0 takes a free one)";
         return false;
+    }
+    m_Hosts = std::make_unique<Hosts>(m_HttpsPort, m_HttpPort);
+    if (m_ProxyPort >= 0) {
+        m_Proxy = std::make_unique<Proxy>(m_Server, m_Writer, m_Faults, m_Log, *m_Hosts, m_Options.proxyUser,
+                                          m_Options.proxyPassword);
     }
     return true;
 }
@@ -141,20 +147,24 @@ bool Simulator::WriteFiles(std::string& error)
             << "\napi key = " << StorefrontAccount::kApiKey
             << "\nactivation PIN = " << StorefrontAccount::kActivationPin
             << "\nsecond activation PIN = " << StorefrontAccount::kSecondActivationPin << "\n";
-    std::ofstream file(DeploymentFile());
-    file << "# Written by the storefront simulator when it starts.\n";
-    for (const char* key : {"production_host", "api_staging_host", "internal_staging_host", "adult_production_host",
-                            "adult_staging_host"}) {
-        file << key << " = localhost:" << m_HttpsPort << "\n";
+    if (account && WriteDeployment(DeploymentFile(), false) && WriteDeployment(ProxyDeploymentFile(), true))
+        return true;
+    error = DeploymentFile() + ": cannot write the deployment file; name a folder that can be written with --data";
+    return false;
+}
+
+bool Simulator::WriteDeployment(const std::string& name, bool behindProxy) const
+{
+    std::ofstream file(name);
+    file << "# Written by the storefront simulator when it starts"
+         << (behindProxy ? ", for clients of its proxy, which knows these hosts.\n" : ".\n");
+    for (const HostRow& row : kHosts) {
+        file << row.key << " = " << (behindProxy ? row.name : row.tls ? m_Hosts->Https() : m_Hosts->Http()) << "\n";
     }
-    for (const char* key : {"image_host", "web_host"})
-        file << key << " = localhost:" << m_HttpPort << "\n";
     file << "ca_file = " << m_Certificates->AuthorityFile() << "\n";
     file << "device_key_file = " << m_Folder << "/device.key\n";
     file.flush();
-    if (file && account) return true;
-    error = DeploymentFile() + ": cannot write the deployment file; name a folder that can be written with --data";
-    return false;
+    return bool(file);
 }
 
 bool Simulator::Begin(std::string& error)
@@ -168,8 +178,7 @@ bool Simulator::Begin(std::string& error)
     m_Database = Database::Open(m_Folder + "/storefront.db", error);
     if (!m_Database || !FillCatalogue(*m_Database, error)) return false;
     xmlInitParser();
-    m_Soap =
-        std::make_unique<SoapService>(*m_Database, "localhost:" + std::to_string(m_HttpPort), m_Options.largestPage);
+    m_Soap = std::make_unique<SoapService>(*m_Database, *m_Hosts, m_Options.largestPage);
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.oldTls);
     if (!WriteFiles(error)) return false;
     m_Server.Begin();
@@ -197,12 +206,26 @@ std::vector<std::vector<std::string>> Simulator::Rows(const std::string& sql) co
 
 // ---- Connections
 
+void Simulator::Serve(Connection& connection, bool tls)
+{
+    if (m_Proxy) connection.proxy = m_Proxy->Behind(connection.peer);
+    if (tls && !Handshake(connection)) return;
+    ServeRequests(connection, m_Log,
+                  [&](const HttpRequest& request, const std::string&) { return ServeOne(connection, request); });
+}
+
 // False when the connection has come to its end.
 bool Simulator::Handshake(Connection& connection)
 {
     const Fault fault = m_Faults.Take("connect");
     Channel& channel = connection.channel;
-    if (!fault.kind.empty() || fault.delay) NoteConnection(connection, fault.Text());
+    if (!fault.kind.empty() || fault.delay) {
+        LoggedRequest log = BeginEntry(connection, m_Log);
+        log.service = log.operation = "connect";
+        log.tls = true;
+        log.fault = fault.Text();
+        m_Log.Add(std::move(log));
+    }
     if (!m_Server.Pause(fault.delay)) return false;
     if (!fault.kind.empty()) {
         // A handshake record of 74 bytes, of which the first two come.
@@ -223,51 +246,12 @@ bool Simulator::Handshake(Connection& connection)
     return done;
 }
 
-void Simulator::NoteConnection(const Connection& connection, const std::string& fault)
-{
-    LoggedRequest log;
-    log.service = log.operation = "connect";
-    log.connection = connection.number;
-    log.tls = true;
-    log.time = Now();
-    log.fault = fault;
-    m_Log.Add(std::move(log));
-}
-
-void Simulator::ServeRequests(Connection& connection)
-{
-    std::string rest;
-    HttpRequest request;
-    while (ReadRequest(connection.channel, rest, request)) {
-        if (!ServeOne(connection, request)) return;
-        request = HttpRequest();
-    }
-    if (!rest.empty()) NoteMalformed(connection);
-    connection.channel.Close();
-}
-
-// What came is no request, or not all of one.
-void Simulator::NoteMalformed(const Connection& connection)
-{
-    LoggedRequest log;
-    log.connection = connection.number;
-    log.tls = connection.channel.IsTls();
-    log.time = Now();
-    log.violation = "no whole HTTP request";
-    m_Log.Add(std::move(log));
-}
-
 bool Simulator::ServeOne(Connection& connection, const HttpRequest& request)
 {
     if (!connection.channel.IsTls() && request.Path().rfind("/control/", 0) == 0) {
         return m_Writer.Send(connection.channel, request, AnswerControl(request, m_Faults, m_Log), Fault());
     }
-    LoggedRequest log;
-    log.headers = request.headers;
-    log.connection = connection.number;
-    log.tls = connection.channel.IsTls();
-    log.resumed = connection.channel.IsResumed();
-    log.time = Now();
+    LoggedRequest log = BeginEntry(connection, m_Log, request);
     Fault fault;
     HttpResponse response = Answer(request, connection, log, fault);
     log.fault = fault.Text();
@@ -282,10 +266,7 @@ HttpResponse Simulator::Answer(const HttpRequest& request, const Connection& con
     const auto take = [&](const std::string& operation) { return fault = m_Faults.Take(operation); };
     const std::string path = request.Path();
     const ServiceRow* service = connection.channel.IsTls() ? SoapService::Find(path) : nullptr;
-    if (service) {
-        const std::string endpoint = "https://localhost:" + std::to_string(m_HttpsPort) + path;
-        return m_Soap->Answer(request, *service, endpoint, log, take);
-    }
+    if (service) return m_Soap->Answer(request, *service, log, take);
     const std::string plain = PlainServiceName(path);
     if (!plain.empty() && (plain == "bandwidth" || connection.channel.IsTls() == (plain == "discovery"))) {
         return AnswerPlain(plain, request, m_Options.environment, take(plain), log);

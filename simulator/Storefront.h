@@ -26,7 +26,10 @@ struct StorefrontOptions {
     std::string dataFolder;  ///< Database, certificates and deployment file; made when absent. Empty: a temporary one.
     int httpsPort = 0;       ///< 0: a free one.
     int httpPort = 0;
-    int latency = 0;  ///< Milliseconds before every answer.
+    int proxyPort = -1;         ///< 0: a free one; -1: there is no proxy.
+    std::string proxyUser;      ///< Whom the proxy lets through (Basic); empty: everyone.
+    std::string proxyPassword;  ///< Of that user.
+    int latency = 0;            ///< Milliseconds before every answer.
     CertificateKind certificate = CertificateKind::Good;
     bool oldTls = false;  ///< At most TLS 1.1.
     bool gzip = true;     ///< Compress answers for clients that accept it.
@@ -37,9 +40,13 @@ struct StorefrontOptions {
 
 struct LoggedRequest {
     unsigned long number = 0;
-    std::string service;  ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart" or "connect".
+    std::string service;  ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart", "connect" or
+                          ///< "proxy".
     std::string operation;  ///< SOAP operation; the service's name for the others; the prefix for box art.
-    std::vector<std::pair<std::string, std::string>> headers;  ///< HTTP headers, names in lower case.
+    std::string method;     ///< HTTP's.
+    std::string target;     ///< What stands behind it: a path and a query, a whole address, or host and port.
+    std::vector<std::pair<std::string, std::string>>
+        headers;  ///< HTTP headers, names in lower case; of Proxy-Authorization only the scheme.
     std::vector<std::pair<std::string, std::string>>
         soap;  ///< The SOAP header's: user, messageID, to, settings (the block's name), the settings' children,
                ///< AuthToken as "***", and token: "none", "current" (the one that its device was given last),
@@ -47,6 +54,8 @@ struct LoggedRequest {
     std::vector<std::pair<std::string, std::string>>
         children;  ///< The request's, in order; passwords and PINs as "***".
     unsigned long connection = 0;
+    unsigned long proxy = 0;  ///< The connection to the proxy through which it came; 0: none, it came directly.
+    std::string credentials;  ///< Those for the proxy: "right", "wrong" or "none"; empty when it asks for none.
     bool tls = false;
     bool resumed = false;   ///< TLS session resumed.
     double time = 0;        ///< Seconds since the start.
@@ -62,8 +71,12 @@ public:
 
     virtual int HttpsPort() const = 0;
     virtual int HttpPort() const = 0;
+    /// -1 when there is no proxy.
+    virtual int ProxyPort() const = 0;
     virtual std::string DataFolder() const = 0;
     virtual std::string DeploymentFile() const = 0;
+    /// One whose hosts have the client's own names, which only the proxy can find.
+    virtual std::string ProxyDeploymentFile() const = 0;
 
     /// Adds a fault in the form that HelpOnFaults tells. False, with the reason, when it is not one.
     virtual bool AddFault(const std::string& text, std::string& error) = 0;

@@ -38,6 +38,15 @@ bool ReadCertificate(const char* text, StorefrontOptions& options)
     return false;
 }
 
+bool ReadProxyUser(const char* text, StorefrontOptions& options)
+{
+    const char* colon = strchr(text, ':');
+    if (!colon || colon == text) return false;
+    options.proxyUser.assign(text, colon);
+    options.proxyPassword = colon + 1;
+    return true;
+}
+
 struct Option {
     const char* name;
     const char* argument;  // null: a switch
@@ -52,6 +61,10 @@ const Option kOptions[] = {
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.httpsPort); }},
     {"--http-port", "N", "port of box art, clock, bandwidth file and control (default 0: a free one)",
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.httpPort); }},
+    {"--proxy-port", "N", "also a proxy on that port, 0: a free one (default: none)",
+     [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.proxyPort); }},
+    {"--proxy-user", "USER:PASSWORD", "whom the proxy lets through, by Basic credentials (default: everyone)",
+     ReadProxyUser},
     {"--latency", "MS", "wait before every answer",
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 600000, o.latency); }},
     {"--environment", "N", "what discovery answers, 0 to 9 (default 2: production)",
@@ -71,9 +84,9 @@ void PrintHelp()
 {
     printf("zv_storefront: the storefront's services on this machine.\n\nOptions:\n");
     for (const Option& option : kOptions) {
-        printf("  %-14s %-5s %s\n", option.name, option.argument ? option.argument : "", option.help);
+        printf("  %-14s %-14s %s\n", option.name, option.argument ? option.argument : "", option.help);
     }
-    printf("  %-14s %-5s %s\n\n", "--help", "", "this text");
+    printf("  %-14s %-14s %s\n\n", "--help", "", "this text");
     printf(
         "Account: user \"%s\", password \"%s\", API key \"%s\", adult PIN %s, activation PIN %s (000000 locks out), "
         "gift\n"
@@ -86,6 +99,14 @@ void PrintHelp()
         "deactivated, it is answered for the first. How the token stands is in the log, the token is not.\n\n",
         StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey,
         StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin, StorefrontAccount::kSecondActivationPin);
+    printf(
+        "The proxy tunnels (CONNECT) to every host and port, and takes plain requests with their whole address. It "
+        "finds\n"
+        "the services under the client's own names for them: \"behind-proxy.conf\" in the data folder is a deployment "
+        "that\n"
+        "works through it alone. Its requests are in the log with their method, target and how their credentials "
+        "stand;\n"
+        "every other request with the proxy's connection that it came through, 0 when it came directly.\n\n");
     printf("%s\n", Storefront::HelpOnFaults().c_str());
     printf(
         "Control, on the plain HTTP port: POST /control/faults (a fault a line), GET and DELETE /control/faults,\n"
@@ -142,8 +163,13 @@ int main(int argc, char** argv)
         fprintf(stderr, "zv_storefront: %s\n", error.c_str());
         return 1;
     }
-    printf("https port %d\nhttp port %d\ndeployment file %s\nready\n", storefront->HttpsPort(), storefront->HttpPort(),
+    printf("https port %d\nhttp port %d\ndeployment file %s\n", storefront->HttpsPort(), storefront->HttpPort(),
            storefront->DeploymentFile().c_str());
+    if (storefront->ProxyPort() >= 0) {
+        printf("proxy port %d\nproxy deployment file %s\n", storefront->ProxyPort(),
+               storefront->ProxyDeploymentFile().c_str());
+    }
+    printf("ready\n");
     fflush(stdout);
     int received;
     sigwait(&ends, &received);

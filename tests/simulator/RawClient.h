@@ -56,9 +56,34 @@ public:
     RawClient(const RawClient&) = delete;
     RawClient& operator=(const RawClient&) = delete;
 
+    /// A TLS handshake on the connection as it is, whose certificate must be the authority's and for the name.
+    bool StartTls(const std::string& name, const std::string& authorityFile)
+    {
+        SSL_CTX_load_verify_locations(m_Context, authorityFile.c_str(), nullptr);
+        SSL_CTX_set_verify(m_Context, SSL_VERIFY_PEER, nullptr);
+        BIO* tls = BIO_new_ssl(m_Context, 1);
+        SSL* ssl = nullptr;
+        BIO_get_ssl(tls, &ssl);
+        SSL_set1_host(ssl, name.c_str());
+        m_Bio = BIO_push(tls, m_Bio);
+        return BIO_do_handshake(m_Bio) == 1;
+    }
     bool Send(const std::string& bytes)
     {
         return BIO_write(m_Bio, bytes.data(), static_cast<int>(bytes.size())) == static_cast<int>(bytes.size());
+    }
+    /// One answer with a length, or without a body (`head`); what comes behind it stays. Status 0 when it is not whole.
+    Reply ReceiveOne(bool head = false)
+    {
+        Reply reply;
+        while (reply.head.size() < 4 || reply.head.compare(reply.head.size() - 4, 4, "\r\n\r\n") != 0) {
+            if (!Append(reply.head, 1)) return {0, reply.head};
+        }
+        reply.head.resize(reply.head.size() - 2);
+        const size_t length = head ? 0 : strtoul(reply.Header("Content-Length").c_str(), nullptr, 10);
+        if (!Append(reply.body, length)) return {0, reply.head, reply.body};
+        reply.status = atoi(reply.head.c_str() + strlen("HTTP/1.1 "));
+        return reply;
     }
     /// All that comes; requests ask for the connection's end.
     Reply Receive()
@@ -73,6 +98,19 @@ public:
     }
 
 private:
+    // False when the connection ends before `count` bytes have come.
+    bool Append(std::string& text, size_t count)
+    {
+        const size_t before = text.size();
+        text.resize(before + count);
+        for (size_t at = before; at < text.size();) {
+            const int size = BIO_read(m_Bio, &text[at], static_cast<int>(text.size() - at));
+            if (size <= 0) return text.resize(at), false;
+            at += static_cast<size_t>(size);
+        }
+        return true;
+    }
+
     SSL_CTX* m_Context = SSL_CTX_new(TLS_client_method());
     BIO* m_Bio = nullptr;
 };
@@ -97,7 +135,9 @@ struct SoapRequest {
     std::string nonce = {};        ///< of one's own; else a fresh one
     std::string token = {};        ///< from "authorizeDevice"
     std::string device = "desktop-player";
+    std::string host = {};  ///< of the address, and its port; else that of this machine
 
+    std::string Authority(int port) const { return host.empty() ? "localhost:" + std::to_string(port) : host; }
     std::string Envelope(int port) const
     {
         static int s_Count;
@@ -126,10 +166,9 @@ struct SoapRequest {
                Base64(bytes) + "</s:Nonce><u:Created>" + created +
                "</u:Created></s:UsernameToken></s:Security><a:MessageID>uuid:" + operation +
                R"(</a:MessageID><a:ReplyTo e:mustUnderstand="1"><a:Address>)" + addressing +
-               R"(/role/anonymous</a:Address></a:ReplyTo><a:To e:mustUnderstand="true">https://localhost:)" +
-               std::to_string(port) + base + service +
-               R"(.asmx</a:To><a:Action e:mustUnderstand="1">http://api.zorvane.example/api/)" + operation +
-               "</a:Action><z:" + block +
+               R"(/role/anonymous</a:Address></a:ReplyTo><a:To e:mustUnderstand="true">https://)" + Authority(port) +
+               base + service + R"(.asmx</a:To><a:Action e:mustUnderstand="1">http://api.zorvane.example/api/)" +
+               operation + "</a:Action><z:" + block +
                R"( e:mustUnderstand="1"><z:APIKey>desktop</z:APIKey><z:DestinationUniqueID>)" + device +
                "</z:DestinationUniqueID><z:DestinationTypeID>48</z:DestinationTypeID>" +
                (token.empty() ? "" : "<z:AuthToken>" + token + "</z:AuthToken>") + "</z:" + block +
@@ -137,7 +176,7 @@ struct SoapRequest {
     }
     std::string Head(int port, size_t length) const
     {
-        return "POST " + base + service + ".asmx HTTP/1.1\r\nHost: localhost:" + std::to_string(port) +
+        return "POST " + base + service + ".asmx HTTP/1.1\r\nHost: " + Authority(port) +
                "\r\nConnection: close\r\nUser-Agent: raw\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " +
                std::to_string(length) + "\r\nSOAPAction: \"http://api.zorvane.example/api/" + operation + "\"\r\n\r\n";
     }

@@ -104,9 +104,11 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
                 {{"--latency", "soon"}, 2, "--latency needs MS"},
                 {{"--https-port", "65536"}, 2, "--https-port needs N"},
                 {{"--largest-page", "-1"}, 2, "--largest-page needs N"},
+                {{"--proxy-user", ":secret"}, 2, "--proxy-user needs USER:PASSWORD"},
                 {{"--certificate", "bad"}, 2, "--certificate needs KIND"},
                 {{"--fault", "getConfig=sever"}, 1, "sever"},
                 {{"--http-port", taken}, 1, "port " + taken},
+                {{"--proxy-port", taken}, 1, "port " + taken},
                 {{"--data", "/proc/storefront"}, 1, "/proc/storefront"},
                 {{"--data", old / ""}, 1, "storefront.db: has tables of version 1"}};
     for (const auto& row : rows) {

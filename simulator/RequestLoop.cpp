@@ -1,0 +1,40 @@
+#include "RequestLoop.h"
+
+void ServeRequests(Connection& connection, RequestLog& log, const ServeRequest& serve)
+{
+    std::string rest;
+    HttpRequest request;
+    while (ReadRequest(connection.channel, rest, request)) {
+        if (!serve(request, rest)) return;
+        request = HttpRequest();
+    }
+    if (!rest.empty()) {
+        LoggedRequest entry = BeginEntry(connection, log);
+        entry.violation = "no whole HTTP request";
+        log.Add(std::move(entry));
+    }
+    connection.channel.Close();
+}
+
+LoggedRequest BeginEntry(const Connection& connection, const RequestLog& log)
+{
+    LoggedRequest entry;
+    entry.connection = connection.number;
+    entry.proxy = connection.proxy;
+    entry.tls = connection.channel.IsTls();
+    entry.resumed = connection.channel.IsResumed();
+    entry.time = log.Now();
+    return entry;
+}
+
+LoggedRequest BeginEntry(const Connection& connection, const RequestLog& log, const HttpRequest& request)
+{
+    LoggedRequest entry = BeginEntry(connection, log);
+    entry.method = request.method;
+    entry.target = request.target;
+    entry.headers = request.headers;
+    for (auto& [name, value] : entry.headers) {
+        if (name == "proxy-authorization") value = value.substr(0, value.find(' ') + 1) + "***";
+    }
+    return entry;
+}
