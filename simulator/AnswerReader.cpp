@@ -5,6 +5,8 @@
 #include <algorithm>
 #include <cstdlib>
 
+namespace simulator {
+
 void AnswerReader::Take(const std::string& bytes)
 {
     m_Bytes += bytes;
@@ -69,3 +71,5 @@ void AnswerReader::TakeBody()
     }
     m_Bytes.clear();
 }
+
+}  // namespace simulator

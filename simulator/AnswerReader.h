@@ -4,6 +4,8 @@
 #include "Chunked.h"
 #include "Http.h"
 
+namespace simulator {
+
 class AnswerReader {
 public:
     /// `bodiless`: of a request whose answer has no body (HEAD).
@@ -37,3 +39,5 @@ private:
     ChunkReader m_Chunks;
     HttpResponse m_Response;
 };
+
+}  // namespace simulator

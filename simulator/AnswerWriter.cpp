@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+namespace simulator {
+
 namespace {
 
 // A header line of 1 KiB that means nothing.
@@ -151,3 +153,5 @@ bool AnswerWriter::Drip(Channel& channel, const std::string& bytes, int pause)
     }
     return true;
 }
+
+}  // namespace simulator

@@ -6,6 +6,8 @@
 #include "Http.h"
 #include "Server.h"
 
+namespace simulator {
+
 class AnswerWriter {
 public:
     /// `gzip`: answers are compressed for clients that accept it.
@@ -26,3 +28,5 @@ private:
     Faults& m_Faults;
     const bool m_Gzip;
 };
+
+}  // namespace simulator

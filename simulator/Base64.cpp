@@ -4,6 +4,8 @@
 
 #include <algorithm>
 
+namespace simulator {
+
 std::string Base64(const std::string& bytes)
 {
     std::string text(4 * ((bytes.size() + 2) / 3) + 1, '\0');
@@ -24,3 +26,5 @@ std::string Unbase64(const std::string& text)
     bytes.resize(static_cast<size_t>(length - padding));
     return bytes;
 }
+
+}  // namespace simulator

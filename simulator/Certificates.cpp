@@ -8,6 +8,8 @@
 
 #include "Hosts.h"
 
+namespace simulator {
+
 namespace {
 
 constexpr long kDay = 24 * 60 * 60;
@@ -151,3 +153,5 @@ SSL_CTX* Certificates::Context(CertificateKind kind, bool oldTls) const
     }
     return context;
 }
+
+}  // namespace simulator

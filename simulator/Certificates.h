@@ -8,6 +8,8 @@
 
 #include "Storefront.h"
 
+namespace simulator {
+
 class Certificates {
 public:
     /// Loads the authority of the folder, or makes one and writes "ca.pem" and "ca-key.pem" there.
@@ -27,3 +29,5 @@ private:
     EVP_PKEY* m_Key = nullptr;
     X509* m_Authority = nullptr;
 };
+
+}  // namespace simulator

@@ -8,6 +8,8 @@
 #include <algorithm>
 #include <cerrno>
 
+namespace simulator {
+
 Channel::~Channel()
 {
     m_Tls.reset();
@@ -80,3 +82,5 @@ void Channel::Reset()
     setsockopt(m_Descriptor, SOL_SOCKET, SO_LINGER, &now, sizeof now);
     m_Tls.reset();
 }
+
+}  // namespace simulator

@@ -6,6 +6,8 @@
 #include <memory>
 #include <string>
 
+namespace simulator {
+
 class Channel {
 public:
     /// Owns the descriptor.
@@ -42,3 +44,5 @@ private:
     int m_Descriptor;
     std::unique_ptr<SSL, TlsFree> m_Tls;
 };
+
+}  // namespace simulator

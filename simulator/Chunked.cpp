@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <cstdlib>
 
+namespace simulator {
+
 namespace {
 
 constexpr size_t kLongestLine = 8192;
@@ -64,3 +66,5 @@ std::string Chunked(const std::string& content, size_t size)
     }
     return body + "0\r\n\r\n";
 }
+
+}  // namespace simulator

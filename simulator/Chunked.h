@@ -3,6 +3,8 @@
 
 #include <string>
 
+namespace simulator {
+
 /// Follows one, wherever its bytes are cut.
 class ChunkReader {
 public:
@@ -23,3 +25,5 @@ private:
 
 /// The content as such a body, `size` bytes a chunk.
 std::string Chunked(const std::string& content, size_t size);
+
+}  // namespace simulator

@@ -2,6 +2,8 @@
 
 #include <sstream>
 
+namespace simulator {
+
 HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log)
 {
     HttpResponse response;
@@ -28,3 +30,5 @@ HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLo
     }
     return response;
 }
+
+}  // namespace simulator

@@ -5,4 +5,8 @@
 #include "Http.h"
 #include "RequestLog.h"
 
+namespace simulator {
+
 HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log);
+
+}  // namespace simulator

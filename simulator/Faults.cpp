@@ -7,6 +7,8 @@
 
 #include "Service.h"
 
+namespace simulator {
+
 namespace {
 
 // Where a kind makes sense.
@@ -246,3 +248,5 @@ std::string Faults::Help()
     }
     return help;
 }
+
+}  // namespace simulator

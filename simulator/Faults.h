@@ -7,6 +7,8 @@
 #include <mutex>
 #include <string>
 
+namespace simulator {
+
 struct Fault {
     std::string kind;  ///< Empty: none.
     std::string value;
@@ -46,3 +48,5 @@ private:
     bool m_Ended = false;
     std::map<std::string, std::deque<Fault>> m_Lists;
 };
+
+}  // namespace simulator

@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <cstdlib>
 
+namespace simulator {
+
 Address ReadAddress(const std::string& text, int port)
 {
     const size_t close = text.rfind('[', 0) == 0 ? text.find(']') : 0;
@@ -34,3 +36,5 @@ bool Hosts::IsService(const std::string& authority) const
 {
     return Resolve(ReadAddress(authority, 443)) == Address{"127.0.0.1", m_HttpsPort};
 }
+
+}  // namespace simulator

@@ -3,6 +3,8 @@
 
 #include <string>
 
+namespace simulator {
+
 struct HostRow {
     const char* key;   ///< In the deployment file.
     const char* name;  ///< The client's own, for the key.
@@ -45,3 +47,5 @@ private:
     int m_HttpsPort;
     int m_HttpPort;
 };
+
+}  // namespace simulator

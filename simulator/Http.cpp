@@ -8,6 +8,8 @@
 
 #include "Channel.h"
 
+namespace simulator {
+
 namespace {
 
 constexpr size_t kLargestRequest = 1 << 20;
@@ -180,3 +182,5 @@ std::string Gzip(const std::string& text)
     deflateEnd(&stream);
     return packed;
 }
+
+}  // namespace simulator

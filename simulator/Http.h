@@ -5,6 +5,8 @@
 #include <utility>
 #include <vector>
 
+namespace simulator {
+
 class Channel;
 
 using Headers = std::vector<std::pair<std::string, std::string>>;
@@ -54,3 +56,5 @@ bool ReadRequest(Channel& channel, std::string& rest, HttpRequest& request);
 
 std::string UrlDecode(const std::string& text);
 std::string Gzip(const std::string& text);
+
+}  // namespace simulator

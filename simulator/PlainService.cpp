@@ -3,6 +3,8 @@
 #include <cctype>
 #include <ctime>
 
+namespace simulator {
+
 namespace {
 
 const char kBoxArt[] = "/images/boxart/";
@@ -108,3 +110,5 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
     }
     return response;
 }
+
+}  // namespace simulator

@@ -7,6 +7,8 @@
 #include "Http.h"
 #include "RequestLog.h"
 
+namespace simulator {
+
 /// The name under which a path's faults and log entries stand; empty for a path that is none of these.
 std::string PlainServiceName(const std::string& path);
 
@@ -16,3 +18,5 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
 
 /// A picture of that many pixels' width for the title; the same one every time.
 std::string MakeBoxArt(const std::string& prefix, int width);
+
+}  // namespace simulator

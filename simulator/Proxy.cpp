@@ -13,6 +13,8 @@
 
 #include "Base64.h"
 
+namespace simulator {
+
 namespace {
 
 constexpr size_t kPiece = 16384;
@@ -326,3 +328,5 @@ bool Proxy::Fetch(Channel& client, Channel& far, AnswerReader& answer, bool pass
     }
     return true;
 }
+
+}  // namespace simulator

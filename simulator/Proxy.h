@@ -10,6 +10,8 @@
 #include "Hosts.h"
 #include "RequestLoop.h"
 
+namespace simulator {
+
 class Proxy {
 public:
     /// What a request asks for.
@@ -52,3 +54,5 @@ private:
     mutable std::mutex m_Mutex;
     std::map<int, unsigned long> m_Ports;  // of the far sides: the client's connection
 };
+
+}  // namespace simulator

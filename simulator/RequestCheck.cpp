@@ -12,6 +12,8 @@
 #include "Base64.h"
 #include "Tokens.h"
 
+namespace simulator {
+
 namespace {
 
 const char kEnvelope[] = "http://schemas.xmlsoap.org/soap/envelope/";
@@ -328,3 +330,5 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     wrong = CheckSettings(blocks[5], m_Database.Text("SELECT api_key FROM service"));
     return wrong.empty() ? CheckChildren(body, *checked.operation, checked.arguments) : wrong;
 }
+
+}  // namespace simulator

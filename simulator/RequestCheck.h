@@ -10,6 +10,8 @@
 #include "Service.h"
 #include "Storefront.h"
 
+namespace simulator {
+
 /// A request that passed.
 struct CheckedRequest {
     const OperationRow* operation = nullptr;
@@ -36,3 +38,5 @@ private:
     std::mutex m_Mutex;
     std::set<std::string> m_Nonces;
 };
+
+}  // namespace simulator

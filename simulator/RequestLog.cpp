@@ -2,6 +2,8 @@
 
 #include <cstdio>
 
+namespace simulator {
+
 namespace {
 
 std::string Quoted(const std::string& text)
@@ -88,3 +90,5 @@ std::string RequestLog::Json() const
         text += Line(request);
     return text;
 }
+
+}  // namespace simulator

@@ -7,6 +7,8 @@
 
 #include "Storefront.h"
 
+namespace simulator {
+
 class RequestLog {
 public:
     /// Seconds since the start.
@@ -29,3 +31,5 @@ private:
     unsigned long m_Count = 0;
     bool m_Ended = false;
 };
+
+}  // namespace simulator

@@ -1,5 +1,7 @@
 #include "RequestLoop.h"
 
+namespace simulator {
+
 void ServeRequests(Connection& connection, RequestLog& log, const ServeRequest& serve)
 {
     std::string rest;
@@ -38,3 +40,5 @@ LoggedRequest BeginEntry(const Connection& connection, const RequestLog& log, co
     }
     return entry;
 }
+
+}  // namespace simulator

@@ -8,6 +8,8 @@
 #include "RequestLog.h"
 #include "Server.h"
 
+namespace simulator {
+
 /// Answers a request. `rest` is what has come behind it already. False when no further request may follow.
 using ServeRequest = std::function<bool(const HttpRequest& request, std::string& rest)>;
 
@@ -17,3 +19,5 @@ void ServeRequests(Connection& connection, RequestLog& log, const ServeRequest& 
 /// An entry with what is known of a request before it is looked at.
 LoggedRequest BeginEntry(const Connection& connection, const RequestLog& log);
 LoggedRequest BeginEntry(const Connection& connection, const RequestLog& log, const HttpRequest& request);
+
+}  // namespace simulator

@@ -9,6 +9,8 @@
 #include <cerrno>
 #include <chrono>
 
+namespace simulator {
+
 int Server::Open(int port, Handler handler)
 {
     const int listener = socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
@@ -124,3 +126,5 @@ void Server::Reap()
         worker = worker->done ? m_Workers.erase(worker) : std::next(worker);
     }
 }
+
+}  // namespace simulator

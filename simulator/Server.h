@@ -11,6 +11,8 @@
 
 #include "Channel.h"
 
+namespace simulator {
+
 struct Connection {
     Channel channel;
     unsigned long number;     ///< From 1, over all ports.
@@ -66,3 +68,5 @@ private:
     std::list<Worker> m_Workers;
     unsigned long m_Connections = 0;
 };
+
+}  // namespace simulator

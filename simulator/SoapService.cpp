@@ -1,5 +1,7 @@
 #include "SoapService.h"
 
+namespace simulator {
+
 namespace {
 
 const char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
@@ -150,3 +152,5 @@ HttpResponse SoapService::Refuse(const std::string& code, const std::string& tex
     response.body = Envelope("", fault, soap12);
     return response;
 }
+
+}  // namespace simulator

@@ -4,6 +4,8 @@
 #include "Faults.h"
 #include "RequestCheck.h"
 
+namespace simulator {
+
 class SoapService {
 public:
     SoapService(Database& database, const Hosts& hosts, int largestPage)
@@ -34,3 +36,5 @@ private:
     std::string m_PlainAddress;
     int m_LargestPage;
 };
+
+}  // namespace simulator

@@ -20,6 +20,8 @@
 #include "Server.h"
 #include "SoapService.h"
 
+using namespace simulator;
+
 namespace {
 
 class Simulator final : public Storefront {

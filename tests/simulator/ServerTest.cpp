@@ -91,7 +91,7 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
     const TempFolder old;
     const auto tables = [&] {
         std::string error;
-        return Database::Open(old / "storefront.db", error);
+        return simulator::Database::Open(old / "storefront.db", error);
     };
     tables()->Run("CREATE TABLE account (user TEXT)");
     tables()->Run("PRAGMA user_version = 1");
