@@ -42,7 +42,7 @@ bool AnswerReader::TakeHead()
             m_KeepAlive = strcasecmp(value.c_str(), "close") != 0;
         } else if (name == "content-type") {
             m_Response.contentType = value;
-        } else if (name != "transfer-encoding" && name != "server") {
+        } else if (name != "transfer-encoding" && name != "server" && name != "date") {
             m_Response.headers.emplace_back(name, value);
         }
     }

@@ -106,7 +106,6 @@ bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpRespon
         response.status = fault.Number(503);
         response.body.clear();
         response.opensTunnel = false;
-        if (response.status == 302) response.headers.emplace_back("Location", "https://localhost/elsewhere");
     } else if (fault.Is("body")) {
         response.body = fault.value;
     } else if (fault.Is("garbage")) {
@@ -116,8 +115,7 @@ bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpRespon
     } else {
         Encode(response, request.Header("accept-encoding").find("gzip") != std::string::npos, fault);
     }
-    for (int i = 0; fault.Is("headers") && i < fault.Number(64); ++i)
-        response.headers.emplace_back("X-Filler", std::string(1012, 'x'));
+    AddHeaders(response, fault);
     const bool keepAlive = response.opensTunnel || request.KeepAlive();
     const size_t length = response.status == 304 ? 0 : response.body.size();
     Answer answer = {*this,
@@ -129,6 +127,22 @@ bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpRespon
     if (!(way == std::end(kWays) ? channel.Write(answer.Whole()) : way->write(answer))) return false;
     if (!keepAlive) channel.Close();
     return keepAlive;
+}
+
+void AnswerWriter::AddHeaders(HttpResponse& response, const Fault& fault) const
+{
+    if (fault.Is("bad-date")) {
+        response.headers.emplace_back("Date", "the day before yesterday");
+    } else if (!fault.Is("no-date")) {
+        const long long wrong = fault.Is("date") ? fault.Seconds(3600) : 0;
+        response.headers.emplace_back("Date", HttpDate(m_Clock.Now() + static_cast<time_t>(wrong)));
+    }
+    if (fault.Is("age")) response.headers.emplace_back("Age", std::to_string(fault.Number(60)));
+    if (fault.Is("http") && response.status == 302) {
+        response.headers.emplace_back("Location", "https://localhost/elsewhere");
+    }
+    for (int i = 0; fault.Is("headers") && i < fault.Number(64); ++i)
+        response.headers.emplace_back("X-Filler", std::string(1012, 'x'));
 }
 
 void AnswerWriter::Encode(HttpResponse& response, bool accepted, const Fault& fault) const

@@ -30,8 +30,8 @@ void AddExtension(X509* certificate, X509* issuer, int kind, const std::string& 
     X509_EXTENSION_free(extension);
 }
 
-// A certificate for the key from `first` to `last` seconds from now, not signed yet.
-X509* NewCertificate(EVP_PKEY* key, const std::string& commonName, long first, long last)
+// A certificate for the key, not signed yet.
+X509* NewCertificate(EVP_PKEY* key, const std::string& commonName, const CertificateDates& dates)
 {
     X509* certificate = X509_new();
     X509_set_version(certificate, 2);
@@ -41,17 +41,24 @@ X509* NewCertificate(EVP_PKEY* key, const std::string& commonName, long first, l
     BIGNUM* number = BN_bin2bn(serial, sizeof serial, nullptr);
     BN_to_ASN1_INTEGER(number, X509_get_serialNumber(certificate));
     BN_free(number);
-    X509_gmtime_adj(X509_getm_notBefore(certificate), first);
-    X509_gmtime_adj(X509_getm_notAfter(certificate), last);
+    ASN1_TIME_set(X509_getm_notBefore(certificate), dates.from);
+    ASN1_TIME_set(X509_getm_notAfter(certificate), dates.until);
     X509_NAME_add_entry_by_txt(X509_get_subject_name(certificate), "CN", MBSTRING_UTF8,
                                reinterpret_cast<const unsigned char*>(commonName.c_str()), -1, -1, 0);
     X509_set_pubkey(certificate, key);
     return certificate;
 }
 
+CertificateDates DatesFromNow(long firstDay, long lastDay)
+{
+    const time_t now = time(nullptr);
+    return {now + firstDay * kDay, now + lastDay * kDay};
+}
+
 X509* NewAuthority(EVP_PKEY* key)
 {
-    X509* authority = NewCertificate(key, "Storefront simulator CA", -kDay, 3650 * kDay);
+    // Older than its certificates may pretend to be.
+    X509* authority = NewCertificate(key, "Storefront simulator CA", DatesFromNow(-20 * 365, 10 * 365));
     X509_set_issuer_name(authority, X509_get_subject_name(authority));
     AddExtension(authority, authority, NID_basic_constraints, "critical,CA:TRUE");
     AddExtension(authority, authority, NID_key_usage, "critical,keyCertSign,cRLSign");
@@ -117,7 +124,7 @@ bool Certificates::Make()
            PEM_write_X509(authority.get(), m_Authority) == 1;
 }
 
-SSL_CTX* Certificates::Context(CertificateKind kind, bool oldTls) const
+SSL_CTX* Certificates::Context(CertificateKind kind, const CertificateDates& dates, bool oldTls) const
 {
     EVP_PKEY* key = EVP_EC_gen("P-256");
     EVP_PKEY* signer = m_Key;
@@ -126,9 +133,12 @@ SSL_CTX* Certificates::Context(CertificateKind kind, bool oldTls) const
         signer = EVP_EC_gen("P-256");
         issuer = NewAuthority(signer);
     }
-    const bool expired = kind == CertificateKind::Expired;
-    X509* certificate =
-        NewCertificate(key, "localhost", expired ? -20 * kDay : -kDay, expired ? -10 * kDay : 365 * kDay);
+    CertificateDates valid = kind == CertificateKind::Expired       ? DatesFromNow(-20, -10)
+                             : kind == CertificateKind::NotYetValid ? DatesFromNow(10, 20)
+                                                                    : DatesFromNow(-1, 365);
+    if (dates.from) valid.from = dates.from;
+    if (dates.until) valid.until = dates.until;
+    X509* certificate = NewCertificate(key, "localhost", valid);
     X509_set_issuer_name(certificate, X509_get_subject_name(issuer));
     const std::string names = NamesOf(kind);
     if (!names.empty()) AddExtension(certificate, issuer, NID_subject_alt_name, names);

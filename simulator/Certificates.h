@@ -19,7 +19,7 @@ public:
     std::string AuthorityFile() const { return m_Folder + "/ca.pem"; }
 
     /// A server context with a fresh key and a certificate of that kind. The caller frees it.
-    SSL_CTX* Context(CertificateKind kind, bool oldTls) const;
+    SSL_CTX* Context(CertificateKind kind, const CertificateDates& dates, bool oldTls) const;
 
 private:
     bool Load();

@@ -4,7 +4,7 @@
 
 namespace simulator {
 
-HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log)
+HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log, SimulatedClock& clock)
 {
     HttpResponse response;
     const std::string what = request.method + " " + request.Path();
@@ -24,6 +24,16 @@ HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLo
         response.body = log.Json();
     } else if (what == "DELETE /control/log") {
         log.Clear();
+    } else if (what == "GET /control/clock") {
+        response.body = std::to_string(clock.Offset()) + "\n";
+    } else if (what == "POST /control/clock") {
+        long long seconds = 0;
+        if (ReadSeconds(request.body, seconds)) {
+            clock.SetOffset(seconds);
+        } else {
+            response.status = 400;
+            response.body = "\"" + request.body + "\" is no number of seconds\n";
+        }
     } else {
         response.status = 404;
         response.body = "not found";

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "Service.h"
+#include "SimulatedClock.h"
 
 namespace simulator {
 
@@ -20,7 +21,7 @@ constexpr unsigned kAll = kAnswers | kConnect | kProxy;
 enum Effect { kDone, kUndone };
 
 const struct KindRow {
-    const char* kind;  // ":N" behind it takes a number, ":TEXT" any text
+    const char* kind;  // ":N" behind it takes a number, ":SECONDS" one with a sign, ":TEXT" any text
     unsigned places;
     Effect effect;
     const char* help;
@@ -52,6 +53,10 @@ const struct KindRow {
     {"endless", kAnswers | kProxy, kUndone, "a body that never ends"},
     {"endless-header", kAnswers | kProxy, kUndone, "header lines that never end"},
     {"headers:N", kAnswers | kProxy, kDone, "N KiB (64) of further header lines"},
+    {"date:SECONDS", kAnswers | kProxy, kDone, "a Date that is SECONDS (3600) ahead of the clock"},
+    {"bad-date", kAnswers | kProxy, kDone, "a Date that is none"},
+    {"no-date", kAnswers | kProxy, kDone, "no Date"},
+    {"age:N", kAnswers | kProxy, kDone, "an Age of N seconds (60), as of an answer that was kept somewhere"},
     {"bomb:N", kAnswers, kUndone, "a compressed body of N MiB (256) of blanks"},
     {"damaged-gzip", kAnswers, kUndone, "a compressed body with wrong bytes in it"},
     {"wrong-checksum", kAnswers, kUndone, "a compressed body whose checksum is wrong"},
@@ -121,7 +126,10 @@ std::string ReadKind(const std::string& operation, unsigned places, const std::s
     const std::string shape = row->kind;
     int number = 0;
     if (shape == fault.kind && !fault.value.empty()) return fault.kind + " takes no value";
-    if (shape.back() == 'N' && !fault.value.empty() && !ReadNumber(fault.value, 0, number)) {
+    const std::string wanted = shape.substr(std::min(Name(shape).size() + 1, shape.size()));
+    long long seconds = 0;
+    if (!fault.value.empty() && ((wanted == "N" && !ReadNumber(fault.value, 0, number)) ||
+                                 (wanted == "SECONDS" && !ReadSeconds(fault.value, seconds)))) {
         return "\"" + fault.value + "\" is no number";
     }
     if (fault.kind == "http" && !fault.value.empty() && (number < 200 || number > 599)) {
@@ -150,6 +158,11 @@ bool Fault::ClaimsFailure() const
 int Fault::Number(int standard) const
 {
     return value.empty() ? standard : atoi(value.c_str());
+}
+
+long long Fault::Seconds(long long standard) const
+{
+    return value.empty() ? standard : atoll(value.c_str());
 }
 
 bool Faults::Add(const std::string& text, std::string& error)

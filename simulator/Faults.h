@@ -19,6 +19,7 @@ struct Fault {
 
     bool Is(const char* name) const { return kind == name; }
     int Number(int standard) const;
+    long long Seconds(long long standard) const;
     std::string Text() const { return value.empty() ? kind : kind + ":" + value; }
     /// Whether what the client gets says that the request was not carried out, and it was not.
     bool ClaimsFailure() const;

@@ -13,9 +13,8 @@ const char kLastModified[] = "Mon, 02 Nov 2026 06:00:00 GMT";
 const char kLaterModified[] = "Tue, 03 Nov 2026 06:00:00 GMT";
 
 // "11/21/2026 6:30:05 AM"; the service's clock is UTC.
-std::string Clock()
+std::string Clock(time_t now)
 {
-    const time_t now = time(nullptr);
     tm parts;
     gmtime_r(&now, &parts);
     // 13 to 23 hours become 1 to 11 PM; 12 stays, as "12 PM" would be read as midnight.
@@ -94,8 +93,8 @@ std::string PlainServiceName(const std::string& path)
     return "";
 }
 
-HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, const Fault& fault,
-                         LoggedRequest& log)
+HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, time_t now,
+                         const Fault& fault, LoggedRequest& log)
 {
     log.service = service;
     log.operation = service;
@@ -103,7 +102,7 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
     if (service == "boxart") return BoxArt(request, fault, log);
     HttpResponse response;
     if (service == "clock") {
-        response.body = Clock();
+        response.body = Clock(now);
     } else {
         response.contentType = "application/octet-stream";
         response.body.assign(kBandwidthFile, 'b');

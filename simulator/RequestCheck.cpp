@@ -142,11 +142,10 @@ std::string CheckSettings(const Node& settings, const std::string& apiKey)
     return "";
 }
 
-bool IsFresh(const std::string& created)
+bool IsFresh(const std::string& created, time_t now)
 {
-    tm parts = {};
-    const char* end = strptime(created.c_str(), "%Y-%m-%dT%H:%M:%SZ", &parts);
-    return end && *end == '\0' && std::llabs(static_cast<long long>(timegm(&parts)) - time(nullptr)) <= kFreshSeconds;
+    time_t when;
+    return ReadDateTime(created, when) && std::llabs(static_cast<long long>(when) - now) <= kFreshSeconds;
 }
 
 // ---- Body
@@ -226,7 +225,7 @@ void NoteHeader(const Node& header, Database& database, CheckedRequest& checked,
     }
 }
 
-std::string CheckToken(const Node& security)
+std::string CheckToken(const Node& security, time_t now)
 {
     static const std::pair<const char*, const char*> kOrder[] = {
         {kSecurity, "Username"}, {kSecurity, "Password"}, {kSecurity, "Nonce"}, {kUtility, "Created"}};
@@ -242,7 +241,7 @@ std::string CheckToken(const Node& security)
     if (children[1].Attribute("Type", nullptr) != kDigestType) return "the password is no digest";
     if (children[2].Attribute("EncodingType", nullptr) != kNonceType) return "the nonce is no Base64Binary";
     if (Unbase64(children[2].Content()).empty()) return "the nonce is no base64 text";
-    if (!IsFresh(children[3].Content())) return "the token is not fresh";
+    if (!IsFresh(children[3].Content(), now)) return "the token is not fresh";
     return "";
 }
 
@@ -316,7 +315,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
         return "wsa:To is not https://" + m_Hosts.Https() + request.Path();
     if (blocks[4].Content() != action) return "wsa:Action is not " + action;
 
-    wrong = CheckToken(blocks[0]);
+    wrong = CheckToken(blocks[0], m_Clock.Now());
     if (!wrong.empty()) return wrong;
     const Node token = blocks[0].Child(kSecurity, "UsernameToken");
     const Node password = token.Child(kSecurity, "Password");

@@ -8,6 +8,7 @@
 #include "Hosts.h"
 #include "Http.h"
 #include "Service.h"
+#include "SimulatedClock.h"
 #include "Storefront.h"
 
 namespace simulator {
@@ -22,7 +23,9 @@ struct CheckedRequest {
 
 class RequestCheck {
 public:
-    RequestCheck(Database& database, const Hosts& hosts) : m_Database(database), m_Hosts(hosts) {}
+    RequestCheck(Database& database, const Hosts& hosts, const SimulatedClock& clock)
+        : m_Database(database), m_Hosts(hosts), m_Clock(clock)
+    {}
 
     /// Checks a request to the service. Empty when it is right, else what is wrong with it. `log` gets the operation,
     /// its children and the token's standing either way, as far as they were found.
@@ -35,6 +38,7 @@ private:
 
     Database& m_Database;
     const Hosts& m_Hosts;
+    const SimulatedClock& m_Clock;
     std::mutex m_Mutex;
     std::set<std::string> m_Nonces;
 };

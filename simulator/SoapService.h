@@ -8,8 +8,11 @@ namespace simulator {
 
 class SoapService {
 public:
-    SoapService(Database& database, const Hosts& hosts, int largestPage)
-        : m_Database(database), m_Check(database, hosts), m_PlainAddress(hosts.Http()), m_LargestPage(largestPage)
+    SoapService(Database& database, const Hosts& hosts, const SimulatedClock& clock, int largestPage)
+        : m_Database(database),
+          m_Check(database, hosts, clock),
+          m_PlainAddress(hosts.Http()),
+          m_LargestPage(largestPage)
     {}
 
     /// The service behind a path, or null.

@@ -27,7 +27,10 @@ namespace {
 class Simulator final : public Storefront {
 public:
     explicit Simulator(const StorefrontOptions& options)
-        : m_Options(options), m_Latency(options.latency), m_Writer(m_Server, m_Faults, options.gzip)
+        : m_Options(options),
+          m_Latency(options.latency),
+          m_Clock(options.clock),
+          m_Writer(m_Server, m_Faults, m_Clock, options.gzip)
     {}
     ~Simulator() override;
 
@@ -45,7 +48,8 @@ public:
     void ClearLog() override { m_Log.Clear(); }
     bool WaitForRequests(size_t count) const override { return m_Log.WaitFor(count); }
     void SetLatency(int milliseconds) override { m_Latency = milliseconds; }
-    void SetCertificate(CertificateKind kind) override;
+    void SetClock(long long seconds) override { m_Clock.SetOffset(seconds); }
+    void SetCertificate(CertificateKind kind, const CertificateDates& dates) override;
     std::string Query(const std::string& sql) const override { return m_Database->Text(sql); }
     std::vector<std::vector<std::string>> Rows(const std::string& sql) const override;
 
@@ -66,6 +70,7 @@ private:
     int m_HttpPort = 0;
     int m_ProxyPort = -1;
     std::atomic<int> m_Latency;
+    SimulatedClock m_Clock;
 
     std::unique_ptr<Hosts> m_Hosts;
     std::unique_ptr<Certificates> m_Certificates;
@@ -180,16 +185,16 @@ bool Simulator::Begin(std::string& error)
     m_Database = Database::Open(m_Folder + "/storefront.db", error);
     if (!m_Database || !FillCatalogue(*m_Database, error)) return false;
     xmlInitParser();
-    m_Soap = std::make_unique<SoapService>(*m_Database, *m_Hosts, m_Options.largestPage);
-    m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.oldTls);
+    m_Soap = std::make_unique<SoapService>(*m_Database, *m_Hosts, m_Clock, m_Options.largestPage);
+    m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.certificateDates, m_Options.oldTls);
     if (!WriteFiles(error)) return false;
     m_Server.Begin();
     return true;
 }
 
-void Simulator::SetCertificate(CertificateKind kind)
+void Simulator::SetCertificate(CertificateKind kind, const CertificateDates& dates)
 {
-    SSL_CTX* context = m_Certificates->Context(kind, m_Options.oldTls);
+    SSL_CTX* context = m_Certificates->Context(kind, dates, m_Options.oldTls);
     const std::lock_guard<std::mutex> lock(m_Mutex);
     SSL_CTX_free(m_Tls);
     m_Tls = context;
@@ -251,7 +256,7 @@ bool Simulator::Handshake(Connection& connection)
 bool Simulator::ServeOne(Connection& connection, const HttpRequest& request)
 {
     if (!connection.channel.IsTls() && request.Path().rfind("/control/", 0) == 0) {
-        return m_Writer.Send(connection.channel, request, AnswerControl(request, m_Faults, m_Log), Fault());
+        return m_Writer.Send(connection.channel, request, AnswerControl(request, m_Faults, m_Log, m_Clock), Fault());
     }
     LoggedRequest log = BeginEntry(connection, m_Log, request);
     Fault fault;
@@ -271,7 +276,7 @@ HttpResponse Simulator::Answer(const HttpRequest& request, const Connection& con
     if (service) return m_Soap->Answer(request, *service, log, take);
     const std::string plain = PlainServiceName(path);
     if (!plain.empty() && (plain == "bandwidth" || connection.channel.IsTls() == (plain == "discovery"))) {
-        return AnswerPlain(plain, request, m_Options.environment, take(plain), log);
+        return AnswerPlain(plain, request, m_Options.environment, m_Clock.Now(), take(plain), log);
     }
     log.violation = "nothing is at " + path;
     HttpResponse response;

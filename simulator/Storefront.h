@@ -4,13 +4,20 @@
 // It runs on threads of its own from Start to destruction. Every member may be called from any thread.
 #pragma once
 
+#include <ctime>
 #include <map>
 #include <memory>
 #include <string>
 #include <vector>
 
 /// What the server certificate is like. All but Good must make a careful client refuse.
-enum class CertificateKind { Good, Untrusted, Expired, WrongName, WideWildcard, NameOnly };
+enum class CertificateKind { Good, Untrusted, Expired, NotYetValid, WrongName, WideWildcard, NameOnly };
+
+/// When a certificate is valid, by the real clock. 0: as its kind has it.
+struct CertificateDates {
+    time_t from = 0;
+    time_t until = 0;
+};
 
 /// What the simulator accepts and knows without being told; also written to "account.txt" beside the deployment file.
 struct StorefrontAccount {
@@ -30,7 +37,9 @@ struct StorefrontOptions {
     std::string proxyUser;      ///< Whom the proxy lets through (Basic); empty: everyone.
     std::string proxyPassword;  ///< Of that user.
     int latency = 0;            ///< Milliseconds before every answer.
+    long long clock = 0;        ///< Seconds by which the simulator's clock is ahead of the real one.
     CertificateKind certificate = CertificateKind::Good;
+    CertificateDates certificateDates;
     bool oldTls = false;  ///< At most TLS 1.1.
     bool gzip = true;     ///< Compress answers for clients that accept it.
     int environment = 2;  ///< What discovery answers.
@@ -88,8 +97,11 @@ public:
     virtual bool WaitForRequests(size_t count) const = 0;
 
     virtual void SetLatency(int milliseconds) = 0;
+    /// Seconds by which the clock is ahead of the real one, also negative: that of Date, of the clock service and of
+    /// how fresh a token is. Certificates stay as they are.
+    virtual void SetClock(long long seconds) = 0;
     /// Changes what the next connections see.
-    virtual void SetCertificate(CertificateKind kind) = 0;
+    virtual void SetCertificate(CertificateKind kind, const CertificateDates& dates = {}) = 0;
 
     /// The one value of a query on the database, as text: what tests compare results with.
     virtual std::string Query(const std::string& sql) const = 0;

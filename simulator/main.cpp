@@ -6,7 +6,11 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "SimulatedClock.h"
 #include "Storefront.h"
+
+using simulator::ReadDateTime;
+using simulator::ReadSeconds;
 
 namespace {
 
@@ -16,6 +20,7 @@ const struct {
 } kCertificates[] = {{"good", CertificateKind::Good},
                      {"untrusted", CertificateKind::Untrusted},
                      {"expired", CertificateKind::Expired},
+                     {"not-yet-valid", CertificateKind::NotYetValid},
                      {"wrong-name", CertificateKind::WrongName},
                      {"wide-wildcard", CertificateKind::WideWildcard},
                      {"name-only", CertificateKind::NameOnly}};
@@ -72,7 +77,14 @@ const Option kOptions[] = {
     {"--largest-page", "N",
      "items that a page holds at most, whatever is asked for (default 0: only the catalogue has one, 200)",
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 32767, o.largestPage); }},
-    {"--certificate", "KIND", "good, untrusted, expired, wrong-name, wide-wildcard or name-only", ReadCertificate},
+    {"--clock", "SECONDS", "pretend a clock that is ahead of the real one by so many, or behind by -SECONDS",
+     [](const char* text, StorefrontOptions& o) { return ReadSeconds(text, o.clock); }},
+    {"--certificate", "KIND", "good, untrusted, expired, not-yet-valid, wrong-name, wide-wildcard or name-only",
+     ReadCertificate},
+    {"--valid-from", "TIME", "when the certificate begins to be valid, such as 2026-11-22T06:30:00Z",
+     [](const char* text, StorefrontOptions& o) { return ReadDateTime(text, o.certificateDates.from); }},
+    {"--valid-until", "TIME", "when it ends to be valid",
+     [](const char* text, StorefrontOptions& o) { return ReadDateTime(text, o.certificateDates.until); }},
     {"--old-tls", nullptr, "TLS 1.1 at most", [](const char*, StorefrontOptions& o) { return o.oldTls = true; }},
     {"--no-gzip", nullptr, "never compress answers",
      [](const char*, StorefrontOptions& o) { return !(o.gzip = false); }},
@@ -110,7 +122,8 @@ void PrintHelp()
     printf("%s\n", Storefront::HelpOnFaults().c_str());
     printf(
         "Control, on the plain HTTP port: POST /control/faults (a fault a line), GET and DELETE /control/faults,\n"
-        "GET /control/log (a JSON object a line), DELETE /control/log.\n\n"
+        "GET /control/log (a JSON object a line), DELETE /control/log, GET and POST /control/clock (seconds, as with\n"
+        "--clock). Date, the clock service and how fresh a token is follow the clock; certificates do not.\n\n"
         "Not checked: which device asks (any DestinationUniqueID and type will do), whether it is activated before it "
         "buys,\n"
         "which device a token was given to, the user agent's text, unused namespace declarations, and anything behind\n"

@@ -56,8 +56,9 @@ public:
     RawClient(const RawClient&) = delete;
     RawClient& operator=(const RawClient&) = delete;
 
-    /// A TLS handshake on the connection as it is, whose certificate must be the authority's and for the name.
-    bool StartTls(const std::string& name, const std::string& authorityFile)
+    /// A TLS handshake on the connection as it is, whose certificate must be the authority's, for the name, and valid
+    /// at that time (0: now).
+    bool StartTls(const std::string& name, const std::string& authorityFile, time_t when = 0)
     {
         SSL_CTX_load_verify_locations(m_Context, authorityFile.c_str(), nullptr);
         SSL_CTX_set_verify(m_Context, SSL_VERIFY_PEER, nullptr);
@@ -65,6 +66,7 @@ public:
         SSL* ssl = nullptr;
         BIO_get_ssl(tls, &ssl);
         SSL_set1_host(ssl, name.c_str());
+        if (when) X509_VERIFY_PARAM_set_time(SSL_get0_param(ssl), when);
         m_Bio = BIO_push(tls, m_Bio);
         return BIO_do_handshake(m_Bio) == 1;
     }

@@ -106,6 +106,8 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
                 {{"--largest-page", "-1"}, 2, "--largest-page needs N"},
                 {{"--proxy-user", ":secret"}, 2, "--proxy-user needs USER:PASSWORD"},
                 {{"--certificate", "bad"}, 2, "--certificate needs KIND"},
+                {{"--clock", "1h"}, 2, "--clock needs SECONDS"},
+                {{"--valid-from", "2026-02-29T00:00:00Z"}, 2, "--valid-from needs TIME"},
                 {{"--fault", "getConfig=sever"}, 1, "sever"},
                 {{"--http-port", taken}, 1, "port " + taken},
                 {{"--proxy-port", taken}, 1, "port " + taken},
