@@ -113,11 +113,12 @@ bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpRespon
     } else if (fault.Is("empty")) {
         response.body.clear();
     } else {
-        Encode(response, request.Header("accept-encoding").find("gzip") != std::string::npos, fault);
+        Encode(response, request.AcceptsGzip(), fault);
     }
     AddHeaders(response, fault);
     const bool keepAlive = response.opensTunnel || request.KeepAlive();
     const size_t length = response.status == 304 ? 0 : response.body.size();
+    if (request.method == "HEAD") response.body.clear();
     Answer answer = {*this,
                      channel,
                      response,

@@ -1,24 +1,18 @@
 #include "Http.h"
 
-#include <strings.h>
 #include <zlib.h>
 
 #include <algorithm>
 #include <cstdlib>
 
 #include "Channel.h"
+#include "Chunked.h"
 
 namespace simulator {
 
 namespace {
 
 constexpr size_t kLargestRequest = 1 << 20;
-
-std::string Lower(std::string text)
-{
-    std::transform(text.begin(), text.end(), text.begin(), [](unsigned char c) { return tolower(c); });
-    return text;
-}
 
 const char* Reason(int status)
 {
@@ -58,7 +52,69 @@ bool ReadMore(Channel& channel, std::string& text)
     return count > 0 && text.size() <= kLargestRequest;
 }
 
+bool ReadFirstLine(const std::string& line, HttpRequest& request)
+{
+    const std::vector<std::string> words = Split(line, ' ');
+    if (words.size() != 3 || (words[2] != "HTTP/1.1" && words[2] != "HTTP/1.0")) return false;
+    request.method = words[0];
+    request.target = words[1];
+    request.version = words[2];
+    return true;
+}
+
+bool ReadChunkedBody(Channel& channel, std::string& rest, std::string& body)
+{
+    ChunkReader chunks;
+    for (;;) {
+        rest.erase(0, chunks.Take(rest, body));
+        if (chunks.Done()) return true;
+        if (chunks.Failed() || body.size() > kLargestRequest || !ReadMore(channel, rest)) return false;
+    }
+}
+
+bool ReadBody(Channel& channel, std::string& rest, HttpRequest& request)
+{
+    const std::string coding = request.Header("transfer-encoding");
+    const std::string length = request.Header("content-length");
+    if (coding.empty() && length.empty()) return true;
+    const bool expects = Lower(request.Header("expect")) == "100-continue" && request.version == "HTTP/1.1";
+    if (expects && rest.empty() && !channel.Write("HTTP/1.1 100 Continue\r\n\r\n")) return false;
+    if (!coding.empty()) return Lower(coding) == "chunked" && ReadChunkedBody(channel, rest, request.body);
+    const size_t size = strtoul(length.c_str(), nullptr, 10);
+    if (length.find_first_not_of("0123456789") != std::string::npos || size > kLargestRequest) return false;
+    while (rest.size() < size) {
+        if (!ReadMore(channel, rest)) return false;
+    }
+    request.body = rest.substr(0, size);
+    rest.erase(0, size);
+    return true;
+}
+
 }  // namespace
+
+std::string Lower(std::string text)
+{
+    std::transform(text.begin(), text.end(), text.begin(), [](unsigned char c) { return tolower(c); });
+    return text;
+}
+
+std::string Trimmed(const std::string& text)
+{
+    const char* const blanks = " \t\r\n";
+    const size_t first = text.find_first_not_of(blanks);
+    return first == std::string::npos ? "" : text.substr(first, text.find_last_not_of(blanks) - first + 1);
+}
+
+std::vector<std::string> Split(const std::string& text, char separator)
+{
+    std::vector<std::string> parts;
+    for (size_t start = 0; start <= text.size();) {
+        const size_t end = std::min(text.find(separator, start), text.size());
+        parts.push_back(Trimmed(text.substr(start, end - start)));
+        start = end + 1;
+    }
+    return parts;
+}
 
 std::string HeaderOf(const Headers& headers, const std::string& name)
 {
@@ -78,9 +134,7 @@ bool ReadHead(const std::string& head, std::string& first, Headers& headers)
         const std::string line = head.substr(start, end == std::string::npos ? end : end - start);
         const size_t colon = line.find(':');
         if (colon == std::string::npos) return false;
-        const size_t value = line.find_first_not_of(' ', colon + 1);
-        headers.emplace_back(Lower(line.substr(0, colon)),
-                             value == std::string::npos ? std::string() : line.substr(value));
+        headers.emplace_back(Lower(line.substr(0, colon)), Trimmed(line.substr(colon + 1)));
     }
     return true;
 }
@@ -112,7 +166,23 @@ std::string HttpRequest::Parameter(const std::string& name) const
 
 bool HttpRequest::KeepAlive() const
 {
-    return strcasecmp(Header("connection").c_str(), "close") != 0;
+    bool keeps = version != "HTTP/1.0";
+    for (const auto& [name, value] : headers) {
+        if (name != "connection") continue;
+        for (const std::string& option : Split(Lower(value), ','))
+            keeps = option != "close" && (keeps || option == "keep-alive");
+    }
+    return keeps;
+}
+
+bool HttpRequest::AcceptsGzip() const
+{
+    for (const std::string& coding : Split(Lower(Header("accept-encoding")), ',')) {
+        const std::vector<std::string> parts = Split(coding, ';');
+        if (parts[0] != "gzip" && parts[0] != "*") continue;
+        return parts.size() < 2 || parts[1].rfind("q=", 0) != 0 || atof(parts[1].c_str() + 2) > 0;
+    }
+    return false;
 }
 
 std::string HttpResponse::Head(const Framing& framing) const
@@ -130,28 +200,21 @@ std::string HttpResponse::Head(const Framing& framing) const
     return head + "\r\n";
 }
 
-bool ReadRequest(Channel& channel, std::string& rest, HttpRequest& request)
+Incoming ReadRequest(Channel& channel, std::string& rest, HttpRequest& request)
 {
-    size_t headEnd;
-    while ((headEnd = rest.find("\r\n\r\n")) == std::string::npos) {
-        if (!ReadMore(channel, rest)) return false;
+    size_t headEnd = std::string::npos;
+    while (headEnd == std::string::npos) {
+        // Empty lines before a request mean nothing.
+        rest.erase(0, std::min(rest.find_first_not_of("\r\n"), rest.size()));
+        headEnd = rest.find("\r\n\r\n");
+        if (headEnd == std::string::npos && !ReadMore(channel, rest)) {
+            return rest.empty() ? Incoming::End : Incoming::Malformed;
+        }
     }
     std::string first;
-    if (!ReadHead(rest.substr(0, headEnd), first, request.headers)) return false;
-    const size_t blank = first.find(' ');
-    const size_t second = first.find(' ', blank + 1);
-    if (blank == std::string::npos || second == std::string::npos) return false;
-    request.method = first.substr(0, blank);
-    request.target = first.substr(blank + 1, second - blank - 1);
+    const bool good = ReadHead(rest.substr(0, headEnd), first, request.headers) && ReadFirstLine(first, request);
     rest.erase(0, headEnd + 4);
-    const size_t length = strtoul(request.Header("content-length").c_str(), nullptr, 10);
-    if (length > kLargestRequest) return false;
-    while (rest.size() < length) {
-        if (!ReadMore(channel, rest)) return false;
-    }
-    request.body = rest.substr(0, length);
-    rest.erase(0, length);
-    return true;
+    return good && ReadBody(channel, rest, request) ? Incoming::Request : Incoming::Malformed;
 }
 
 std::string UrlDecode(const std::string& text)

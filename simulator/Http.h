@@ -11,6 +11,13 @@ class Channel;
 
 using Headers = std::vector<std::pair<std::string, std::string>>;
 
+/// The text in lower case; without white space around it.
+std::string Lower(std::string text);
+std::string Trimmed(const std::string& text);
+
+/// The parts between the separators, trimmed.
+std::vector<std::string> Split(const std::string& text, char separator);
+
 /// The value of the first header of the name, which is in lower case; empty when there is none.
 std::string HeaderOf(const Headers& headers, const std::string& name);
 
@@ -19,9 +26,10 @@ bool ReadHead(const std::string& head, std::string& first, Headers& headers);
 
 struct HttpRequest {
     std::string method;
-    std::string target;  ///< As it stands: path and query, a whole address, or host and port.
-    Headers headers;     ///< Names in lower case.
-    std::string body;
+    std::string target;   ///< As it stands: path and query, a whole address, or host and port.
+    std::string version;  ///< "HTTP/1.1" or "HTTP/1.0".
+    Headers headers;      ///< Names in lower case.
+    std::string body;     ///< Without its chunks.
 
     std::string Header(const std::string& name) const { return HeaderOf(headers, name); }
     std::string Path() const { return Local().substr(0, Local().find('?')); }
@@ -30,6 +38,7 @@ struct HttpRequest {
     /// A parameter of the query, decoded; empty when there is none.
     std::string Parameter(const std::string& name) const;
     bool KeepAlive() const;
+    bool AcceptsGzip() const;
 };
 
 /// What an answer's head tells of its body's end and of the connection's.
@@ -50,9 +59,14 @@ struct HttpResponse {
     std::string Head(const Framing& framing) const;
 };
 
-/// Reads one request; `rest` holds what came too early. False when the connection ends, or the request is none or
-/// larger than 1 MiB.
-bool ReadRequest(Channel& channel, std::string& rest, HttpRequest& request);
+enum class Incoming {
+    Request,
+    End,        ///< Of the connection, between two requests.
+    Malformed,  ///< No request, not all of one, or one of more than 1 MiB.
+};
+
+/// Reads one request, and says that it may go on when it asks; `rest` holds what came too early.
+Incoming ReadRequest(Channel& channel, std::string& rest, HttpRequest& request);
 
 std::string UrlDecode(const std::string& text);
 std::string Gzip(const std::string& text);

@@ -4,6 +4,7 @@
 #include <openssl/evp.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
@@ -57,6 +58,8 @@ public:
         }
         return Node();
     }
+    // Without the white space around it, which means nothing in numbers, addresses and times.
+    std::string Value() const { return Trimmed(Content()); }
     std::string Content() const
     {
         if (!m_Node) return "";
@@ -95,10 +98,20 @@ std::string Sha1(const std::string& text)
 
 bool IsInt(const std::string& text)
 {
-    if (text.empty()) return false;
-    char* end = nullptr;
-    const long long number = strtoll(text.c_str(), &end, 10);
-    return *end == '\0' && number >= INT32_MIN && number <= INT32_MAX && !isspace(static_cast<unsigned char>(text[0]));
+    const std::string digits = Trimmed(text);
+    const size_t first = digits.find_first_of("0123456789");
+    if (first > 1 || digits.find_first_not_of("0123456789", first) != std::string::npos) return false;
+    if (first == 1 && digits[0] != '-' && digits[0] != '+') return false;
+    errno = 0;
+    const long long number = strtoll(digits.c_str(), nullptr, 10);
+    return errno == 0 && number >= INT32_MIN && number <= INT32_MAX;
+}
+
+// A base64 text may be written on several lines.
+std::string Joined(std::string text)
+{
+    text.erase(std::remove_if(text.begin(), text.end(), [](unsigned char c) { return isspace(c); }), text.end());
+    return text;
 }
 
 // ---- Header
@@ -225,13 +238,29 @@ void NoteHeader(const Node& header, Database& database, CheckedRequest& checked,
     }
 }
 
+// How long the message may be used; empty when that is not over.
+std::string CheckTimestamp(const Node& timestamp, time_t now)
+{
+    time_t created = now, expires = now;
+    const Node first = timestamp.Child(kUtility, "Created");
+    const Node last = timestamp.Child(kUtility, "Expires");
+    if ((first && !ReadDateTime(first.Value(), created)) || (last && !ReadDateTime(last.Value(), expires))) {
+        return "the message's timestamp holds no time";
+    }
+    if (created - now > kFreshSeconds) return "the message was made later than now";
+    return expires < now ? "the message has expired" : "";
+}
+
 std::string CheckToken(const Node& security, time_t now)
 {
     static const std::pair<const char*, const char*> kOrder[] = {
         {kSecurity, "Username"}, {kSecurity, "Password"}, {kSecurity, "Nonce"}, {kUtility, "Created"}};
     const Node token = security.Child(kSecurity, "UsernameToken");
+    const Node timestamp = security.Child(kUtility, "Timestamp");
     const std::vector<Node> children = token.Children();
-    if (security.Children().size() != 1 || children.size() != 4) return "no complete user-name token";
+    if (security.Children().size() != (timestamp ? 2 : 1) || children.size() != 4) return "no complete user-name token";
+    const std::string wrong = CheckTimestamp(timestamp, now);
+    if (!wrong.empty()) return wrong;
     for (size_t i = 0; i < 4; ++i) {
         if (!children[i].Is(kOrder[i].first, kOrder[i].second)) {
             return std::string("the token has no ") + kOrder[i].second + " in its place";
@@ -240,16 +269,29 @@ std::string CheckToken(const Node& security, time_t now)
     if (token.Attribute("Id", kUtility) != "User") return "wsu:Id of the token is not User";
     if (children[1].Attribute("Type", nullptr) != kDigestType) return "the password is no digest";
     if (children[2].Attribute("EncodingType", nullptr) != kNonceType) return "the nonce is no Base64Binary";
-    if (Unbase64(children[2].Content()).empty()) return "the nonce is no base64 text";
-    if (!IsFresh(children[3].Content(), now)) return "the token is not fresh";
+    if (Unbase64(Joined(children[2].Content())).empty()) return "the nonce is no base64 text";
+    if (!IsFresh(children[3].Value(), now)) return "the token is not fresh";
     return "";
+}
+
+// The charset that the content type names, in lower case; "utf-8" when it names none, and "" when it is no text/xml.
+std::string CharsetOf(const HttpRequest& request)
+{
+    const std::vector<std::string> parts = Split(Lower(request.Header("content-type")), ';');
+    if (parts[0] != "text/xml") return "";
+    for (const std::string& part : parts) {
+        if (part.rfind("charset=", 0) != 0) continue;
+        const std::string charset = part.substr(strlen("charset="));
+        const bool quoted = charset.size() > 2 && charset.front() == '"' && charset.back() == '"';
+        return quoted ? charset.substr(1, charset.size() - 2) : charset;
+    }
+    return "utf-8";
 }
 
 std::string CheckHttp(const HttpRequest& request)
 {
     if (request.method != "POST") return "the method is not POST";
-    if (request.Header("content-type") != "text/xml; charset=utf-8")
-        return "the content type is not text/xml; charset=utf-8";
+    if (CharsetOf(request) != "utf-8") return "the content type is not text/xml; charset=utf-8";
     if (request.Header("user-agent").empty()) return "no user agent";
     return "";
 }
@@ -274,8 +316,10 @@ bool RequestCheck::IsEndpoint(const std::string& text, const std::string& path) 
 std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& service, CheckedRequest& checked,
                                 LoggedRequest& log)
 {
+    // A charset of HTTP's goes before what the XML declaration says.
+    const bool named = Lower(request.Header("content-type")).find("charset") != std::string::npos;
     const std::unique_ptr<xmlDoc, void (*)(xmlDocPtr)> document(
-        xmlReadMemory(request.body.data(), static_cast<int>(request.body.size()), nullptr, nullptr,
+        xmlReadMemory(request.body.data(), static_cast<int>(request.body.size()), nullptr, named ? "UTF-8" : nullptr,
                       XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING),
         xmlFreeDoc);
     const Node envelope(document ? xmlDocGetRootElement(document.get()) : nullptr);
@@ -307,23 +351,23 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
                                  {kAddressing, "Action", true},
                                  {kService, service.settingsBlock, true}});
     if (!wrong.empty()) return wrong;
-    if (blocks[1].Content() != "uuid:" + body.Name()) return "wsa:MessageID is not uuid:" + body.Name();
-    if (blocks[2].Child(kAddressing, "Address").Content() != std::string(kAddressing) + "/role/anonymous") {
+    if (blocks[1].Value() != "uuid:" + body.Name()) return "wsa:MessageID is not uuid:" + body.Name();
+    if (blocks[2].Child(kAddressing, "Address").Value() != std::string(kAddressing) + "/role/anonymous") {
         return "wsa:ReplyTo is not anonymous";
     }
-    if (!IsEndpoint(blocks[3].Content(), request.Path()))
+    if (!IsEndpoint(blocks[3].Value(), request.Path()))
         return "wsa:To is not https://" + m_Hosts.Https() + request.Path();
-    if (blocks[4].Content() != action) return "wsa:Action is not " + action;
+    if (blocks[4].Value() != action) return "wsa:Action is not " + action;
 
     wrong = CheckToken(blocks[0], m_Clock.Now());
     if (!wrong.empty()) return wrong;
     const Node token = blocks[0].Child(kSecurity, "UsernameToken");
     const Node password = token.Child(kSecurity, "Password");
-    const std::string nonce = Unbase64(token.Child(kSecurity, "Nonce").Content());
-    const std::string created = token.Child(kUtility, "Created").Content();
+    const std::string nonce = Unbase64(Joined(token.Child(kSecurity, "Nonce").Content()));
+    const std::string created = token.Child(kUtility, "Created").Value();
     const std::string secret =
         m_Database.Text("SELECT password FROM service WHERE user = ?", {token.Child(kSecurity, "Username").Content()});
-    if (secret.empty() || password.Content() != Sha1(nonce + created + secret)) return "authentication failed";
+    if (secret.empty() || password.Value() != Sha1(nonce + created + secret)) return "authentication failed";
     if (!IsNewNonce(nonce)) return "the nonce was used before";
 
     wrong = CheckSettings(blocks[5], m_Database.Text("SELECT api_key FROM service"));

@@ -5,12 +5,14 @@ namespace simulator {
 void ServeRequests(Connection& connection, RequestLog& log, const ServeRequest& serve)
 {
     std::string rest;
-    HttpRequest request;
-    while (ReadRequest(connection.channel, rest, request)) {
+    Incoming incoming;
+    for (;;) {
+        HttpRequest request;
+        incoming = ReadRequest(connection.channel, rest, request);
+        if (incoming != Incoming::Request) break;
         if (!serve(request, rest)) return;
-        request = HttpRequest();
     }
-    if (!rest.empty()) {
+    if (incoming == Incoming::Malformed) {
         LoggedRequest entry = BeginEntry(connection, log);
         entry.violation = "no whole HTTP request";
         log.Add(std::move(entry));

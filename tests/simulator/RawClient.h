@@ -134,8 +134,10 @@ struct SoapRequest {
     std::string base = "/api/";  ///< what the path begins with
     std::string password = "secret";
     long long created_offset = 0;  ///< seconds from now
-    std::string nonce = {};        ///< of one's own; else a fresh one
-    std::string token = {};        ///< from "authorizeDevice"
+    long long created_zone = 0;    ///< seconds by which the time is ahead of UTC, which `created_end` then says
+    std::string created_end = "Z";
+    std::string nonce = {};  ///< of one's own; else a fresh one
+    std::string token = {};  ///< from "authorizeDevice"
     std::string device = "desktop-player";
     std::string host = {};  ///< of the address, and its port; else that of this machine
 
@@ -144,10 +146,11 @@ struct SoapRequest {
     {
         static int s_Count;
         const std::string bytes = nonce.empty() ? "number " + std::to_string(++s_Count) : nonce;
-        const time_t when = time(nullptr) + created_offset;
+        const time_t when = time(nullptr) + created_offset + created_zone;
         tm parts{};
-        char created[32];
-        strftime(created, sizeof created, "%Y-%m-%dT%H:%M:%SZ", gmtime_r(&when, &parts));
+        char seconds[32];
+        strftime(seconds, sizeof seconds, "%Y-%m-%dT%H:%M:%S", gmtime_r(&when, &parts));
+        const std::string created = seconds + created_end;
         const std::string digested = bytes + created + password;
         std::string digest(SHA_DIGEST_LENGTH, '\0');
         SHA1(reinterpret_cast<const unsigned char*>(digested.data()), digested.size(),
