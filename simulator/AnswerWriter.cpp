@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "Chunked.h"
+
 namespace simulator {
 
 namespace {
@@ -20,6 +22,7 @@ struct AnswerWriter::Answer {
     const HttpResponse& response;
     const Fault& fault;
     Framing framing;
+    bool hasBody;
 
     std::string Head() const { return response.Head(framing); }
     std::string Whole() const { return Head() + response.body; }
@@ -81,6 +84,23 @@ const AnswerWriter::Way AnswerWriter::kWays[] = {
          a.framing.announced = 0;
          return a.channel.Write(a.Whole());
      }},
+    {"chunked",
+     [](Answer& a) {
+         a.framing.length = Framing::Chunks;
+         const auto size = static_cast<size_t>(std::max(a.fault.Number(1000), 1));
+         return a.channel.Write(a.Head() + (a.hasBody ? Chunked(a.response.body, size) : ""));
+     }},
+    {"connection-close",
+     [](Answer& a) {
+         a.framing.keepAlive = false;
+         return a.Last(a.Whole());
+     }},
+    {"http10",
+     [](Answer& a) {
+         a.framing = {Framing::Unannounced, 0, false, "HTTP/1.0"};
+         return a.response.opensTunnel ? a.channel.Write(a.Head()) : a.Last(a.Whole());
+     }},
+    {"continue", [](Answer& a) { return a.channel.Write("HTTP/1.1 100 Continue\r\n\r\n" + a.Whole()); }},
     // Half of the right body, and text from there on.
     {"endless",
      [](Answer& a) {
@@ -118,12 +138,10 @@ bool AnswerWriter::Send(Channel& channel, const HttpRequest& request, HttpRespon
     AddHeaders(response, fault);
     const bool keepAlive = response.opensTunnel || request.KeepAlive();
     const size_t length = response.status == 304 ? 0 : response.body.size();
-    if (request.method == "HEAD") response.body.clear();
-    Answer answer = {*this,
-                     channel,
-                     response,
-                     fault,
-                     {response.opensTunnel ? Framing::Unannounced : Framing::Announced, length, keepAlive}};
+    const bool hasBody = request.method != "HEAD" && response.status != 304;
+    if (!hasBody) response.body.clear();
+    const Framing framing = {response.opensTunnel ? Framing::Unannounced : Framing::Announced, length, keepAlive};
+    Answer answer = {*this, channel, response, fault, framing, hasBody && !response.opensTunnel};
     const auto way = std::find_if(std::begin(kWays), std::end(kWays), [&](const Way& w) { return fault.Is(w.kind); });
     if (!(way == std::end(kWays) ? channel.Write(answer.Whole()) : way->write(answer))) return false;
     if (!keepAlive) channel.Close();

@@ -187,7 +187,7 @@ bool HttpRequest::AcceptsGzip() const
 
 std::string HttpResponse::Head(const Framing& framing) const
 {
-    std::string head = "HTTP/1.1 " + std::to_string(status) + " ";
+    std::string head = framing.version + (" " + std::to_string(status)) + " ";
     head += opensTunnel ? "Connection established" : Reason(status);
     head += "\r\nServer: storefront-simulator\r\n";
     if (!opensTunnel) head += "Content-Type: " + contentType + "\r\n";
@@ -195,6 +195,8 @@ std::string HttpResponse::Head(const Framing& framing) const
         head += header.first + ": " + header.second + "\r\n";
     if (framing.length == Framing::Announced) {
         head += "Content-Length: " + std::to_string(framing.announced) + "\r\n";
+    } else if (framing.length == Framing::Chunks) {
+        head += "Transfer-Encoding: chunked\r\n";
     }
     if (!opensTunnel) head += std::string("Connection: ") + (framing.keepAlive ? "keep-alive" : "close") + "\r\n";
     return head + "\r\n";

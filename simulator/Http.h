@@ -43,9 +43,10 @@ struct HttpRequest {
 
 /// What an answer's head tells of its body's end and of the connection's.
 struct Framing {
-    enum Length { Announced, Unannounced } length = Announced;
+    enum Length { Announced, Chunks, Unannounced } length = Announced;
     size_t announced = 0;
     bool keepAlive = true;
+    const char* version = "HTTP/1.1";
 };
 
 struct HttpResponse {

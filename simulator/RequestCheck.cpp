@@ -1,6 +1,5 @@
 #include "RequestCheck.h"
 
-#include <libxml/parser.h>
 #include <openssl/evp.h>
 
 #include <algorithm>
@@ -11,82 +10,22 @@
 #include <memory>
 
 #include "Base64.h"
+#include "Namespaces.h"
 #include "Tokens.h"
+#include "XmlNode.h"
 
 namespace simulator {
 
 namespace {
 
-const char kEnvelope[] = "http://schemas.xmlsoap.org/soap/envelope/";
 const char kAddressing[] = "http://schemas.xmlsoap.org/ws/2004/08/addressing";
 const char kSecurity[] = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-secext-1.0.xsd";
 const char kUtility[] = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-utility-1.0.xsd";
-const char kService[] = "http://api.zorvane.example/api/";
 const char kDigestType[] =
     "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-username-token-profile-1.0#PasswordDigest";
 const char kNonceType[] =
     "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-soap-message-security-1.0#Base64Binary";
 constexpr int kFreshSeconds = 300;
-
-const char* Text(const xmlChar* text)
-{
-    return reinterpret_cast<const char*>(text);
-}
-
-// An element, as this file looks at one. Copies are cheap; the document must live.
-class Node {
-public:
-    explicit Node(xmlNodePtr node = nullptr) : m_Node(node) {}
-    explicit operator bool() const { return m_Node != nullptr; }
-
-    std::string Name() const { return m_Node ? Text(m_Node->name) : ""; }
-    std::string Namespace() const { return m_Node && m_Node->ns ? Text(m_Node->ns->href) : ""; }
-    bool Is(const char* space, const std::string& name) const { return Name() == name && Namespace() == space; }
-
-    std::vector<Node> Children() const
-    {
-        std::vector<Node> children;
-        for (xmlNodePtr child = m_Node ? m_Node->children : nullptr; child; child = child->next) {
-            if (child->type == XML_ELEMENT_NODE) children.emplace_back(child);
-        }
-        return children;
-    }
-    Node Child(const char* space, const char* name) const
-    {
-        for (const Node& child : Children()) {
-            if (child.Is(space, name)) return child;
-        }
-        return Node();
-    }
-    // Without the white space around it, which means nothing in numbers, addresses and times.
-    std::string Value() const { return Trimmed(Content()); }
-    std::string Content() const
-    {
-        if (!m_Node) return "";
-        const std::unique_ptr<xmlChar, void (*)(void*)> content(xmlNodeGetContent(m_Node), xmlFree);
-        return content ? Text(content.get()) : "";
-    }
-    // Text of its own beside its elements.
-    bool HasText() const
-    {
-        for (xmlNodePtr child = m_Node ? m_Node->children : nullptr; child; child = child->next) {
-            if (child->type != XML_ELEMENT_NODE && child->type != XML_COMMENT_NODE && !xmlIsBlankNode(child))
-                return true;
-        }
-        return false;
-    }
-    std::string Attribute(const char* name, const char* space) const
-    {
-        const auto* n = reinterpret_cast<const xmlChar*>(name);
-        const std::unique_ptr<xmlChar, void (*)(void*)> value(
-            space ? xmlGetNsProp(m_Node, n, reinterpret_cast<const xmlChar*>(space)) : xmlGetNoNsProp(m_Node, n),
-            xmlFree);
-        return value ? Text(value.get()) : "";
-    }
-
-private:
-    xmlNodePtr m_Node;
-};
 
 std::string Sha1(const std::string& text)
 {
@@ -130,7 +69,7 @@ std::string CheckBlocks(const std::vector<Node>& blocks, const std::vector<Block
         if (i >= blocks.size() || !blocks[i].Is(wanted[i].space, wanted[i].name)) {
             return "header block " + std::to_string(i + 1) + " must be " + wanted[i].name;
         }
-        const std::string marked = blocks[i].Attribute("mustUnderstand", kEnvelope);
+        const std::string marked = blocks[i].Attribute("mustUnderstand", kSoap11);
         if (wanted[i].mustUnderstand != (marked == "1" || marked == "true")) {
             return "mustUnderstand of " + wanted[i].name + " is wrong";
         }
@@ -318,13 +257,10 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
 {
     // A charset of HTTP's goes before what the XML declaration says.
     const bool named = Lower(request.Header("content-type")).find("charset") != std::string::npos;
-    const std::unique_ptr<xmlDoc, void (*)(xmlDocPtr)> document(
-        xmlReadMemory(request.body.data(), static_cast<int>(request.body.size()), nullptr, named ? "UTF-8" : nullptr,
-                      XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING),
-        xmlFreeDoc);
-    const Node envelope(document ? xmlDocGetRootElement(document.get()) : nullptr);
-    NoteHeader(envelope.Child(kEnvelope, "Header"), m_Database, checked, log);
-    const std::vector<Node> bodies = envelope.Child(kEnvelope, "Body").Children();
+    const Document document = ReadXml(request.body, named ? "UTF-8" : nullptr);
+    const Node envelope(document);
+    NoteHeader(envelope.Child(kSoap11, "Header"), m_Database, checked, log);
+    const std::vector<Node> bodies = envelope.Child(kSoap11, "Body").Children();
     const Node body = bodies.empty() ? Node() : bodies[0];
     log.operation = body.Name();
     for (const Node& child : body.Children()) {
@@ -335,7 +271,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     if (!wrong.empty()) return wrong;
     if (!document) return "the body is no XML";
     if (document->intSubset) return "the body has a document type declaration";
-    if (!envelope.Is(kEnvelope, "Envelope")) return "the body is no SOAP 1.1 envelope";
+    if (!envelope.Is(kSoap11, "Envelope")) return "the body is no SOAP 1.1 envelope";
     if (bodies.size() != 1 || body.Namespace() != kService)
         return "the SOAP body holds no single element of the service";
     checked.operation = FindOperation(service, body.Name());
@@ -343,7 +279,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     const std::string action = kService + body.Name();
     if (request.Header("soapaction") != "\"" + action + "\"") return "SOAPAction is not " + action;
 
-    const std::vector<Node> blocks = envelope.Child(kEnvelope, "Header").Children();
+    const std::vector<Node> blocks = envelope.Child(kSoap11, "Header").Children();
     wrong = CheckBlocks(blocks, {{kSecurity, "Security", true},
                                  {kAddressing, "MessageID", false},
                                  {kAddressing, "ReplyTo", true},

@@ -1,11 +1,12 @@
 #include "SoapService.h"
 
+#include "AnswerShape.h"
+#include "Namespaces.h"
+
 namespace simulator {
 
 namespace {
 
-const char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
-const char kSoap12[] = "http://www.w3.org/2003/05/soap-envelope";
 const char kXmlType[] = "text/xml; charset=utf-8";
 
 std::string Envelope(const std::string& header, const std::string& body, bool soap12)
@@ -124,7 +125,7 @@ HttpResponse SoapService::Respond(const CheckedRequest& checked, const Fault& fa
     if (fault.Is("fault11") || fault.Is("fault12")) return Refuse("Server", "the shop is closed", fault.Is("fault12"));
     if (fault.Is("unknown-enum")) result = WithUnknownEnum(result);
 
-    std::string body = "<" + name + "Response xmlns=\"http://api.zorvane.example/api/\">";
+    std::string body = "<" + name + "Response xmlns=\"" + kService + "\">";
     if (!fault.Is("missing-result")) body += "<" + name + "Result>" + result + "</" + name + "Result>";
     body += "</" + name + "Response>";
     std::string header;
@@ -135,7 +136,7 @@ HttpResponse SoapService::Respond(const CheckedRequest& checked, const Fault& fa
     HttpResponse response;
     response.contentType = fault.Is("soap12") ? "application/soap+xml; charset=utf-8" : kXmlType;
     response.body = Envelope(header, body, fault.Is("soap12"));
-    return response;
+    return Reshaped(std::move(response), fault);
 }
 
 HttpResponse SoapService::Refuse(const std::string& code, const std::string& text, bool soap12)

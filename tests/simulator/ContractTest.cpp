@@ -8,6 +8,7 @@
 #include <sstream>
 
 #include "RawClient.h"
+#include "Records.h"
 
 namespace {
 
@@ -210,6 +211,29 @@ TEST_F(ContractTest, EveryAnswerIsOneOfTheContract)
             if (row.service == kBoth ? service != kBrowse : row.service == service) CheckRow(service, row);
         }
     }
+}
+
+// The simulator's own table of the records, from which it makes other forms of its answers.
+TEST(RecordsTest, AreTheContracts)
+{
+    const std::map<std::string, std::string> kTypes = {
+        {"char", "string"}, {"bool", "boolean"}, {"_XML", "anyType"}, {"xsd__decimal", "decimal"}};
+    for (const auto& [name, fields] : simulator::Records()) {
+        SCOPED_TRACE(name);
+        const auto record = Contract().find(name);
+        ASSERT_NE(Contract().end(), record);
+        std::string own, contract;
+        for (const auto& field : fields) {
+            if (field.occurs != '@') own += field.type + " " + field.name + (field.occurs == '?' ? '0' : field.occurs);
+        }
+        for (const Child& child : record->second) {
+            const auto type = kTypes.find(child.type);
+            contract += (type == kTypes.end() ? child.type : type->second) + " " + child.name + child.occurs;
+        }
+        EXPECT_EQ(contract, own);
+    }
+    for (const Row& row : kRows)
+        EXPECT_TRUE(simulator::FindRecord("_" + std::string(row.operation) + "Response")) << row.operation;
 }
 
 // Whatever was asked for: the answer says what it holds, and the pages join.
