@@ -73,6 +73,7 @@ const AnswerWriter::Way AnswerWriter::kWays[] = {
          return a.Last(a.Whole());
      }},
     {"long", [](Answer& a) { return a.channel.Write(a.Whole() + "left over"); }},
+    {"stray", [](Answer& a) { return a.channel.Write(a.Whole() + kTimeoutAnswer); }},
     {"no-length",
      [](Answer& a) {
          a.framing.length = Framing::Unannounced;

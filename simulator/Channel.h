@@ -25,6 +25,10 @@ public:
     size_t Read(char* buffer, size_t size);
     /// False when the peer is gone.
     bool Write(const std::string& bytes);
+    /// Waits until something has come, the end included.
+    void WaitForBytes();
+    /// A further session ticket (TLS 1.3). False when it cannot be sent.
+    bool SendTicket();
     /// Past TLS; for a few bytes.
     bool WriteBare(const std::string& bytes);
 
@@ -38,6 +42,8 @@ public:
     int Descriptor() const { return m_Descriptor; }
 
 private:
+    void WaitFor(short events);
+
     struct TlsFree {
         void operator()(SSL* tls) const { SSL_free(tls); }
     };

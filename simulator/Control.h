@@ -1,13 +1,21 @@
-// "/control/...": faults, log and clock, for people and scripts.
+// "/control/...": faults, log, clock and kept connections, for people and scripts.
 #pragma once
 
 #include "Faults.h"
 #include "Http.h"
 #include "RequestLog.h"
+#include "Server.h"
 #include "SimulatedClock.h"
 
 namespace simulator {
 
-HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log, SimulatedClock& clock);
+/// What is controlled.
+struct Controls {
+    Faults& faults;
+    RequestLog& log;
+    SimulatedClock& clock;
+    Server& server;
+};
+HttpResponse AnswerControl(const HttpRequest& request, const Controls& controls);
 
 }  // namespace simulator

@@ -47,6 +47,7 @@ const struct KindRow {
     {"no-http", kAll, kUndone, "bytes that are no HTTP (connect: no TLS)"},
     {"short", kAnswers, kUndone, "less body than its length announces"},
     {"long", kAnswers | kProxy, kDone, "bytes left over behind the announced length"},
+    {"stray", kAnswers, kDone, "a whole answer of 408 behind the right one, which nobody has asked for"},
     {"no-length", kAnswers, kUndone, "no Content-Length"},
     {"zero-length", kAnswers | kProxy, kUndone, "Content-Length 0"},
     {"chunked:N", kAnswers | kProxy, kDone, "in chunks of N (1000) bytes"},

@@ -197,7 +197,7 @@ unsigned long Proxy::Behind(int port) const
 void Proxy::Serve(Connection& client)
 {
     std::unique_ptr<FarSide> kept;
-    ServeRequests(client, m_Log, [&](const HttpRequest& request, const std::string& early) {
+    ServeRequests(m_Server, client, m_Log, [&](const HttpRequest& request, const std::string& early) {
         return ServeOne(client, request, early, kept);
     });
 }

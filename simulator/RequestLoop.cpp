@@ -2,12 +2,13 @@
 
 namespace simulator {
 
-void ServeRequests(Connection& connection, RequestLog& log, const ServeRequest& serve)
+void ServeRequests(Server& server, Connection& connection, RequestLog& log, const ServeRequest& serve)
 {
     std::string rest;
     Incoming incoming;
-    for (;;) {
+    for (bool first = true;; first = false) {
         HttpRequest request;
+        if (rest.empty() && !server.WaitForRequest(connection, first)) return;
         incoming = ReadRequest(connection.channel, rest, request);
         if (incoming != Incoming::Request) break;
         if (!serve(request, rest)) return;

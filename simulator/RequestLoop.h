@@ -14,7 +14,7 @@ namespace simulator {
 using ServeRequest = std::function<bool(const HttpRequest& request, std::string& rest)>;
 
 /// Serves them to the connection's end. What is no request is noted in the log.
-void ServeRequests(Connection& connection, RequestLog& log, const ServeRequest& serve);
+void ServeRequests(Server& server, Connection& connection, RequestLog& log, const ServeRequest& serve);
 
 /// An entry with what is known of a request before it is looked at.
 LoggedRequest BeginEntry(const Connection& connection, const RequestLog& log);

@@ -6,6 +6,7 @@
 #include <sys/socket.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <chrono>
 
@@ -44,6 +45,7 @@ void Server::End()
         const std::lock_guard<std::mutex> lock(m_Mutex);
         m_Ended = true;
         m_Ending.notify_all();
+        m_Changed.notify_all();
         for (const int descriptor : m_Open)
             shutdown(descriptor, SHUT_RDWR);
     }
@@ -93,29 +95,35 @@ void Server::Accept(const Port& port)
         // An answer would wait up to 40 ms for the peer's word that it has the session tickets sent before.
         const int on = 1;
         setsockopt(descriptor, IPPROTO_TCP, TCP_NODELAY, &on, sizeof on);
-        const unsigned long number = ++m_Connections;
         m_Open.insert(descriptor);
         Reap();
-        Worker& worker = m_Workers.emplace_back();
-        worker.thread = std::thread([this, &port, &worker, descriptor, number, peer] {
-            Serve(port, descriptor, number, ntohs(peer.sin_port));
+        Worker& worker = m_Workers.emplace_back(Worker{++m_Connections});
+        worker.thread = std::thread([this, &port, &worker, descriptor, peer] {
+            Serve(port, descriptor, ntohs(peer.sin_port), worker);
             const std::lock_guard<std::mutex> ending(m_Mutex);
             worker.done = true;
+            m_Changed.notify_all();
         });
     }
 }
 
-void Server::Serve(const Port& port, int descriptor, unsigned long number, int peer)
+void Server::Serve(const Port& port, int descriptor, int peer, Worker& worker)
 {
     // A peer that goes away must not end the process.
     sigset_t broken;
     sigemptyset(&broken);
     sigaddset(&broken, SIGPIPE);
     pthread_sigmask(SIG_BLOCK, &broken, nullptr);
-    Connection connection{Channel(descriptor), number, peer};
+    Connection connection{Channel(descriptor), worker.number, peer};
+    {
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        worker.connection = &connection;
+    }
     port.handler(connection);
     // Before the descriptor is closed and its number given out again.
-    Forget(descriptor);
+    const std::lock_guard<std::mutex> lock(m_Mutex);
+    worker.connection = nullptr;
+    m_Open.erase(descriptor);
 }
 
 // Joins the threads whose connections have ended; with the mutex held.
@@ -125,6 +133,87 @@ void Server::Reap()
         if (worker->done) worker->thread.join();
         worker = worker->done ? m_Workers.erase(worker) : std::next(worker);
     }
+}
+
+// ---- Kept connections
+
+bool Server::WaitForRequest(Connection& connection, bool first)
+{
+    {
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        connection.waits = !first;
+        m_Changed.notify_all();
+    }
+    connection.channel.WaitForBytes();
+    std::unique_lock<std::mutex> lock(m_Mutex);
+    connection.waits = false;
+    if (!connection.silent && !connection.broken) return true;
+    lock.unlock();
+    if (connection.broken) {
+        connection.channel.Reset();
+    } else {
+        connection.channel.Stall();
+    }
+    return false;
+}
+
+// With the mutex held, as the next one.
+size_t Server::CountIdle() const
+{
+    return static_cast<size_t>(std::count_if(m_Workers.begin(), m_Workers.end(), [](const Worker& worker) {
+        return worker.connection && worker.connection->waits && !worker.connection->silent;
+    }));
+}
+
+bool Server::IsServed(unsigned long number) const
+{
+    return std::any_of(m_Workers.begin(), m_Workers.end(),
+                       [&](const Worker& worker) { return worker.number == number && !worker.done; });
+}
+
+bool Server::WaitForIdle(size_t count)
+{
+    std::unique_lock<std::mutex> lock(m_Mutex);
+    m_Changed.wait(lock, [&] { return m_Ended || CountIdle() >= count; });
+    return CountIdle() >= count;
+}
+
+size_t Server::ActOnIdle(IdleAction action, const std::string& bytes)
+{
+    std::unique_lock<std::mutex> lock(m_Mutex);
+    std::vector<unsigned long> reached;
+    for (const Worker& worker : m_Workers) {
+        Connection* const connection = worker.connection;
+        // Its thread waits, so that the channel is free.
+        if (!connection || !connection->waits || connection->silent) continue;
+        bool done = true;
+        switch (action) {
+            case IdleAction::Write:
+                done = connection->channel.Write(bytes);
+                break;
+            case IdleAction::Ticket:
+                done = connection->channel.SendTicket();
+                break;
+            case IdleAction::Silence:
+                connection->silent = true;
+                break;
+            case IdleAction::Reset:
+                connection->broken = true;
+                shutdown(connection->channel.Descriptor(), SHUT_RD);
+                break;
+            case IdleAction::Close:
+                connection->channel.Close();
+                break;
+        }
+        if (done) reached.push_back(worker.number);
+    }
+    if (action == IdleAction::Reset || action == IdleAction::Close) {
+        m_Changed.wait(lock, [&] {
+            return std::none_of(reached.begin(), reached.end(),
+                                [this](unsigned long number) { return IsServed(number); });
+        });
+    }
+    return reached.size();
 }
 
 }  // namespace simulator

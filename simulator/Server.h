@@ -10,14 +10,21 @@
 #include <thread>
 
 #include "Channel.h"
+#include "Storefront.h"
 
 namespace simulator {
 
+/// One that the server has accepted.
 struct Connection {
     Channel channel;
     unsigned long number;     ///< From 1, over all ports.
     int peer;                 ///< The port at the other end.
     unsigned long proxy = 0;  ///< The connection to the proxy that this one continues.
+
+    // The server's, with its mutex held.
+    bool waits = false;   // for a request that is not its first
+    bool silent = false;  // ordered to answer nothing any more
+    bool broken = false;  // ordered to be reset
 };
 
 class Server {
@@ -40,6 +47,12 @@ public:
     /// False when the end comes meanwhile.
     bool Pause(int milliseconds);
 
+    /// Waits until a request comes on the connection; `first`: it is the first one. False when none is to be answered.
+    bool WaitForRequest(Connection& connection, bool first);
+    /// As Storefront's.
+    size_t ActOnIdle(IdleAction action, const std::string& bytes);
+    bool WaitForIdle(size_t count);
+
     /// The end breaks off a descriptor of the caller's as well, until it is forgotten.
     void Watch(int descriptor);
     void Forget(int descriptor);
@@ -51,18 +64,23 @@ private:
         std::thread acceptor;
     };
     struct Worker {
-        std::thread thread;
+        unsigned long number;
+        std::thread thread = {};
         bool done = false;
+        Connection* connection = nullptr;  // as long as it is served
     };
 
     void Accept(const Port& port);
-    void Serve(const Port& port, int descriptor, unsigned long number, int peer);
+    void Serve(const Port& port, int descriptor, int peer, Worker& worker);
     void Reap();
+    size_t CountIdle() const;
+    bool IsServed(unsigned long number) const;
 
     std::list<Port> m_Ports;
 
     std::mutex m_Mutex;
     std::condition_variable m_Ending;
+    std::condition_variable m_Changed;  // what connections do
     bool m_Ended = false;
     std::set<int> m_Open;  // descriptors that the end breaks off
     std::list<Worker> m_Workers;

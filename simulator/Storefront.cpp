@@ -47,6 +47,8 @@ public:
     std::vector<LoggedRequest> Log() const override { return m_Log.All(); }
     void ClearLog() override { m_Log.Clear(); }
     bool WaitForRequests(size_t count) const override { return m_Log.WaitFor(count); }
+    bool WaitForIdle(size_t count) override { return m_Server.WaitForIdle(count); }
+    size_t ActOnIdle(IdleAction action, const std::string& bytes) override { return m_Server.ActOnIdle(action, bytes); }
     void SetLatency(int milliseconds) override { m_Latency = milliseconds; }
     void SetClock(long long seconds) override { m_Clock.SetOffset(seconds); }
     void SetCertificate(CertificateKind kind, const CertificateDates& dates) override;
@@ -217,7 +219,7 @@ void Simulator::Serve(Connection& connection, bool tls)
 {
     if (m_Proxy) connection.proxy = m_Proxy->Behind(connection.peer);
     if (tls && !Handshake(connection)) return;
-    ServeRequests(connection, m_Log,
+    ServeRequests(m_Server, connection, m_Log,
                   [&](const HttpRequest& request, const std::string&) { return ServeOne(connection, request); });
 }
 
@@ -256,7 +258,8 @@ bool Simulator::Handshake(Connection& connection)
 bool Simulator::ServeOne(Connection& connection, const HttpRequest& request)
 {
     if (!connection.channel.IsTls() && request.Path().rfind("/control/", 0) == 0) {
-        return m_Writer.Send(connection.channel, request, AnswerControl(request, m_Faults, m_Log, m_Clock), Fault());
+        return m_Writer.Send(connection.channel, request, AnswerControl(request, {m_Faults, m_Log, m_Clock, m_Server}),
+                             Fault());
     }
     LoggedRequest log = BeginEntry(connection, m_Log, request);
     Fault fault;

@@ -13,6 +13,18 @@
 /// What the server certificate is like. All but Good must make a careful client refuse.
 enum class CertificateKind { Good, Untrusted, Expired, NotYetValid, WrongName, WideWildcard, NameOnly };
 
+/// What can be done to a kept connection while it waits for its next request.
+enum class IdleAction {
+    Write,    ///< Bytes that nobody has asked for.
+    Close,    ///< In order, with TLS's own goodbye.
+    Reset,    ///< The peer sees a broken connection.
+    Silence,  ///< Nothing more is read, so that requests are never answered.
+    Ticket,   ///< A further TLS session ticket.
+};
+/// An answer without a request, as servers send it when they have waited long enough.
+inline constexpr char kTimeoutAnswer[] =
+    "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
+
 /// When a certificate is valid, by the real clock. 0: as its kind has it.
 struct CertificateDates {
     time_t from = 0;
@@ -95,6 +107,13 @@ public:
     virtual void ClearLog() = 0;
     /// Waits until the log holds that many requests; false when the simulator ends first.
     virtual bool WaitForRequests(size_t count) const = 0;
+
+    /// Waits until that many connections have been answered and wait for their next request; false when the simulator
+    /// ends first.
+    virtual bool WaitForIdle(size_t count) = 0;
+    /// Does it now to each of these, on whatever port, and returns when it is done: how many they were. `bytes` are
+    /// what Write writes.
+    virtual size_t ActOnIdle(IdleAction action, const std::string& bytes = kTimeoutAnswer) = 0;
 
     virtual void SetLatency(int milliseconds) = 0;
     /// Seconds by which the clock is ahead of the real one, also negative: that of Date, of the clock service and of

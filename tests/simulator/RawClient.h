@@ -6,6 +6,7 @@
 #include <openssl/evp.h>
 #include <openssl/sha.h>
 #include <openssl/ssl.h>
+#include <poll.h>
 
 #include <csignal>
 #include <cstring>
@@ -87,6 +88,28 @@ public:
         reply.status = atoi(reply.head.c_str() + strlen("HTTP/1.1 "));
         return reply;
     }
+    /// Waits for the end, before which nothing may come: false when it is a broken connection.
+    bool EndsInOrder()
+    {
+        char byte;
+        const bool ended = BIO_read(m_Bio, &byte, 1) <= 0;
+        SSL* const ssl = Tls();
+        return ended && (ssl ? (SSL_get_shutdown(ssl) & SSL_RECEIVED_SHUTDOWN) != 0 : BIO_eof(m_Bio) != 0);
+    }
+    /// Whether anything has come and waits, the end included.
+    bool HasBytes()
+    {
+        pollfd entry = {static_cast<int>(BIO_get_fd(m_Bio, nullptr)), POLLIN, 0};
+        return BIO_pending(m_Bio) > 0 || poll(&entry, 1, 0) > 0;
+    }
+    /// The TLS session ticket that came last.
+    std::string Ticket()
+    {
+        const unsigned char* ticket = nullptr;
+        size_t size = 0;
+        SSL_SESSION_get0_ticket(SSL_get0_session(Tls()), &ticket, &size);
+        return std::string(ticket, ticket + size);
+    }
     /// All that comes; requests ask for the connection's end.
     Reply Receive()
     {
@@ -100,6 +123,12 @@ public:
     }
 
 private:
+    SSL* Tls()
+    {
+        SSL* ssl = nullptr;
+        BIO_get_ssl(m_Bio, &ssl);
+        return ssl;
+    }
     // False when the connection ends before `count` bytes have come.
     bool Append(std::string& text, size_t count)
     {
