@@ -161,6 +161,7 @@ void AnswerWriter::AddHeaders(HttpResponse& response, const Fault& fault) const
     if (fault.Is("http") && response.status == 302) {
         response.headers.emplace_back("Location", "https://localhost/elsewhere");
     }
+    if (fault.retryAfter >= 0) response.headers.emplace_back("Retry-After", std::to_string(fault.retryAfter));
     for (int i = 0; fault.Is("headers") && i < fault.Number(64); ++i)
         response.headers.emplace_back("X-Filler", std::string(1012, 'x'));
 }

@@ -155,11 +155,12 @@ std::string ReadKind(const std::string& operation, unsigned places, const std::s
     return "";
 }
 
-// One of "after", "delay=MS", "count=N".
+// One of "after", "delay=MS", "count=N", "retry=SECONDS".
 bool ReadCondition(const std::string& text, Fault& fault)
 {
     if (text == "after") return fault.afterEffect = true;
     if (text.rfind("delay=", 0) == 0) return ReadNumber(text.substr(6), 0, fault.delay);
+    if (text.rfind("retry=", 0) == 0) return fault.Is("http") && ReadNumber(text.substr(6), 0, fault.retryAfter);
     return text.rfind("count=", 0) == 0 && ReadNumber(text.substr(6), 1, fault.count);
 }
 
@@ -190,7 +191,8 @@ bool Faults::Add(const std::string& text, std::string& error)
     std::istringstream rest(equals == std::string::npos ? std::string() : text.substr(equals + 1));
     for (std::string part; std::getline(rest, part, ',');)
         parts.push_back(part);
-    error = "\"" + text + "\" is no fault: OPERATION=KIND[:VALUE][,delay=MS][,count=N][,after] expected";
+    error =
+        "\"" + text + "\" is no fault: OPERATION=KIND[:VALUE][,delay=MS][,count=N][,retry=SECONDS][,after] expected";
     if (parts.empty()) return false;
     if (places == 0) {
         error = "\"" + text + "\": there is no operation " + operation + "; --help names what is none of a service's";
@@ -262,14 +264,14 @@ std::string Faults::Pending() const
 std::string Faults::Help()
 {
     std::string help =
-        "Faults: OPERATION=KIND[:VALUE][,delay=MS][,count=N][,after]\n"
+        "Faults: OPERATION=KIND[:VALUE][,delay=MS][,count=N][,retry=SECONDS][,after]\n"
         "  OPERATION is a SOAP operation (getTitleListing), discovery, clock, bandwidth, boxart, any (of these), "
         "connect\n"
         "  (before a TLS handshake) or proxy (a request to the proxy). Each request takes the first fault of its "
         "list;\n"
         "  count=N serves N requests. A fault suppresses what it claims has failed, unless \"after\" is given: then it "
         "is\n"
-        "  done and only the answer lies.\n"
+        "  done and only the answer lies. With http, retry=SECONDS adds a Retry-After.\n"
         "  Kinds:\n";
     for (const auto& row : kKinds) {
         help += std::string("    ") + row.kind +

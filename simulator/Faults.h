@@ -12,7 +12,8 @@ namespace simulator {
 struct Fault {
     std::string kind;  ///< Empty: none.
     std::string value;
-    int delay = 0;  ///< Milliseconds before the answer.
+    int delay = 0;        ///< Milliseconds before the answer.
+    int retryAfter = -1;  ///< Seconds after which the client may try again; -1: it is not told.
     int count = 1;
     bool afterEffect = false;  ///< What the request asks for is done although the answer claims otherwise.
     unsigned long clears = 0;  ///< How often the lists had been cleared when it was taken.
@@ -27,7 +28,8 @@ struct Fault {
 
 class Faults {
 public:
-    /// Reads "OPERATION=KIND[:VALUE][,delay=MS][,count=N][,after]" and appends it to the operation's list.
+    /// Reads "OPERATION=KIND[:VALUE][,delay=MS][,count=N][,retry=SECONDS][,after]" and appends it to the operation's
+    /// list.
     bool Add(const std::string& text, std::string& error);
     /// The next fault for the operation, taken off its list; the list "any" counts for every request without an own
     /// one.

@@ -240,7 +240,13 @@ std::string CheckHttp(const HttpRequest& request)
 bool RequestCheck::IsNewNonce(const std::string& nonce)
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    return m_Nonces.insert(nonce).second;
+    const auto [place, isNew] = m_Nonces.insert(nonce);
+    if (isNew) m_InOrder.push_back(place);
+    if (m_InOrder.size() > m_Remembered) {
+        m_Nonces.erase(m_InOrder.front());
+        m_InOrder.pop_front();
+    }
+    return isNew;
 }
 
 // Whether the text is the address of the services with that path, under whatever name of theirs.

@@ -1,6 +1,7 @@
 // What a strict service refuses: the simulator's own reading of the contract, independent of the client's.
 #pragma once
 
+#include <deque>
 #include <mutex>
 #include <set>
 #include <string>
@@ -23,8 +24,9 @@ struct CheckedRequest {
 
 class RequestCheck {
 public:
-    RequestCheck(Database& database, const Hosts& hosts, const SimulatedClock& clock)
-        : m_Database(database), m_Hosts(hosts), m_Clock(clock)
+    /// The last `remembered` nonces are refused when they come again.
+    RequestCheck(Database& database, const Hosts& hosts, const SimulatedClock& clock, size_t remembered)
+        : m_Database(database), m_Hosts(hosts), m_Clock(clock), m_Remembered(remembered)
     {}
 
     /// Checks a request to the service. Empty when it is right, else what is wrong with it. `log` gets the operation,
@@ -40,7 +42,9 @@ private:
     const Hosts& m_Hosts;
     const SimulatedClock& m_Clock;
     std::mutex m_Mutex;
+    const size_t m_Remembered;
     std::set<std::string> m_Nonces;
+    std::deque<std::set<std::string>::iterator> m_InOrder;  // the oldest first
 };
 
 }  // namespace simulator

@@ -54,26 +54,28 @@ void RequestLog::Add(LoggedRequest request)
     const std::lock_guard<std::mutex> lock(m_Mutex);
     request.number = ++m_Count;
     m_Requests.push_back(std::move(request));
+    if (m_Requests.size() > m_Most) m_Requests.pop_front();
     m_Changed.notify_all();
 }
 
 std::vector<LoggedRequest> RequestLog::All() const
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    return m_Requests;
+    return {m_Requests.begin(), m_Requests.end()};
 }
 
 void RequestLog::Clear()
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
     m_Requests.clear();
+    m_Cleared = m_Count;
 }
 
 bool RequestLog::WaitFor(size_t count) const
 {
     std::unique_lock<std::mutex> lock(m_Mutex);
-    m_Changed.wait(lock, [&] { return m_Ended || m_Requests.size() >= count; });
-    return m_Requests.size() >= count;
+    m_Changed.wait(lock, [&] { return m_Ended || m_Count - m_Cleared >= count; });
+    return m_Count - m_Cleared >= count;
 }
 
 void RequestLog::End()

@@ -8,11 +8,11 @@ namespace simulator {
 
 class SoapService {
 public:
-    SoapService(Database& database, const Hosts& hosts, const SimulatedClock& clock, int largestPage)
+    SoapService(Database& database, const Hosts& hosts, const SimulatedClock& clock, const StorefrontOptions& options)
         : m_Database(database),
-          m_Check(database, hosts, clock),
+          m_Check(database, hosts, clock, static_cast<size_t>(options.remembered)),
           m_PlainAddress(hosts.Http()),
-          m_LargestPage(largestPage)
+          m_LargestPage(options.largestPage)
     {}
 
     /// The service behind a path, or null.

@@ -30,6 +30,7 @@ public:
         : m_Options(options),
           m_Latency(options.latency),
           m_Clock(options.clock),
+          m_Log(static_cast<size_t>(options.remembered)),
           m_Writer(m_Server, m_Faults, m_Clock, options.gzip)
     {}
     ~Simulator() override;
@@ -187,7 +188,7 @@ bool Simulator::Begin(std::string& error)
     m_Database = Database::Open(m_Folder + "/storefront.db", error);
     if (!m_Database || !FillCatalogue(*m_Database, error)) return false;
     xmlInitParser();
-    m_Soap = std::make_unique<SoapService>(*m_Database, *m_Hosts, m_Clock, m_Options.largestPage);
+    m_Soap = std::make_unique<SoapService>(*m_Database, *m_Hosts, m_Clock, m_Options);
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.certificateDates, m_Options.oldTls);
     if (!WriteFiles(error)) return false;
     m_Server.Begin();

@@ -52,10 +52,11 @@ struct StorefrontOptions {
     long long clock = 0;        ///< Seconds by which the simulator's clock is ahead of the real one.
     CertificateKind certificate = CertificateKind::Good;
     CertificateDates certificateDates;
-    bool oldTls = false;  ///< At most TLS 1.1.
-    bool gzip = true;     ///< Compress answers for clients that accept it.
-    int environment = 2;  ///< What discovery answers.
-    int largestPage = 0;  ///< Items that a page holds at most, whatever is asked for; 0: only the catalogue has one.
+    bool oldTls = false;     ///< At most TLS 1.1.
+    bool gzip = true;        ///< Compress answers for clients that accept it.
+    int environment = 2;     ///< What discovery answers.
+    int largestPage = 0;     ///< Items that a page holds at most, whatever is asked for; 0: only the catalogue has one.
+    int remembered = 50000;  ///< Requests whose log entries, and whose nonces, are kept: the last ones.
     std::vector<std::string> faults;
 };
 
@@ -105,7 +106,7 @@ public:
 
     virtual std::vector<LoggedRequest> Log() const = 0;
     virtual void ClearLog() = 0;
-    /// Waits until the log holds that many requests; false when the simulator ends first.
+    /// Waits until that many requests have come since the log was cleared; false when the simulator ends first.
     virtual bool WaitForRequests(size_t count) const = 0;
 
     /// Waits until that many connections have been answered and wait for their next request; false when the simulator

@@ -88,6 +88,11 @@ const Option kOptions[] = {
     {"--old-tls", nullptr, "TLS 1.1 at most", [](const char*, StorefrontOptions& o) { return o.oldTls = true; }},
     {"--no-gzip", nullptr, "never compress answers",
      [](const char*, StorefrontOptions& o) { return !(o.gzip = false); }},
+    {"--remember", "N",
+     "requests that are remembered, the last ones: in the log, and that their nonces do not come again (default 50000)",
+     [](const char* text, StorefrontOptions& o) {
+         return ReadNumber(text, 100000000, o.remembered) && o.remembered > 0;
+     }},
     {"--fault", "SPEC", "a fault, see below; may be given again",
      [](const char* text, StorefrontOptions& o) { return o.faults.emplace_back(text), true; }},
 };

@@ -291,6 +291,33 @@ TEST_F(RequestCheckTest, ATokenIsGoodOnceAndNotForLong)
     }
 }
 
+TEST_F(RequestCheckTest, OnlyTheLastRequestsAreRemembered)
+{
+    StorefrontOptions options;
+    options.remembered = 3;
+    Begin(options);
+    const auto ask = [&](const char* nonce) {
+        SoapRequest request = Titles();
+        request.nonce = nonce;
+        Send(request);
+        return LastLogged().violation;
+    };
+    for (const char* nonce : {"a", "b", "c"})
+        EXPECT_EQ("", ask(nonce));
+    EXPECT_EQ("the nonce was used before", ask("a"));
+    EXPECT_EQ("", ask("d")) << "a is forgotten";
+    EXPECT_EQ("", ask("a"));
+    EXPECT_EQ("the nonce was used before", ask("d"));
+    const auto log = store->Log();
+    ASSERT_EQ(3u, log.size());
+    EXPECT_EQ(5u, log[0].number);
+    EXPECT_TRUE(store->WaitForRequests(7));
+    store->ClearLog();
+    ask("e");
+    EXPECT_TRUE(store->WaitForRequests(1));
+    EXPECT_EQ(8u, store->Log().at(0).number);
+}
+
 TEST_F(RequestCheckTest, OptionalChildrenMayBeLeftOutAndStagingHasAPathOfItsOwn)
 {
     SoapRequest request = Titles();
