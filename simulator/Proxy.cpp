@@ -47,7 +47,7 @@ std::string OwnRequest(const HttpRequest& request, const Proxy::Goal& goal, bool
         bool passes = true;
         for (const char* own : kOfConnection)
             passes = passes && name != own;
-        if (passes) text += name + ": " + value + "\r\n";
+        if (passes) text.append(name).append(": ").append(value).append("\r\n");
     }
     if (!request.body.empty()) text += "Content-Length: " + std::to_string(request.body.size()) + "\r\n";
     text += std::string("Via: 1.1 storefront-proxy\r\nConnection: ") + (keepAlive ? "keep-alive" : "close");

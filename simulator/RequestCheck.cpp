@@ -198,7 +198,7 @@ std::string CheckToken(const Node& security, time_t now)
     const Node timestamp = security.Child(kUtility, "Timestamp");
     const std::vector<Node> children = token.Children();
     if (security.Children().size() != (timestamp ? 2 : 1) || children.size() != 4) return "no complete user-name token";
-    const std::string wrong = CheckTimestamp(timestamp, now);
+    std::string wrong = CheckTimestamp(timestamp, now);
     if (!wrong.empty()) return wrong;
     for (size_t i = 0; i < 4; ++i) {
         if (!children[i].Is(kOrder[i].first, kOrder[i].second)) {
