@@ -5,6 +5,8 @@
 #include "PurchaseList.h"
 #include "Tokens.h"
 
+namespace simulator {
+
 namespace {
 
 // ---- The device
@@ -256,3 +258,5 @@ const Operations& AccountOperations()
     };
     return operations;
 }
+
+}  // namespace simulator

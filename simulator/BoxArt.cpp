@@ -10,6 +10,8 @@
 
 #include "PlainService.h"
 
+namespace simulator {
+
 std::string MakeBoxArt(const std::string& prefix, int width)
 {
     const int height = width * 3 / 2;
@@ -44,3 +46,5 @@ std::string MakeBoxArt(const std::string& prefix, int width)
     const std::unique_ptr<unsigned char, void (*)(void*)> owned(bytes, free);
     return std::string(reinterpret_cast<char*>(bytes), size);
 }
+
+}  // namespace simulator

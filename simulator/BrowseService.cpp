@@ -1,6 +1,8 @@
 // The browse service: the catalogue.
 #include "TitleXml.h"
 
+namespace simulator {
+
 namespace {
 
 constexpr int kMostPerPage = 200;
@@ -217,3 +219,5 @@ const Operations& BrowseOperations()
     };
     return operations;
 }
+
+}  // namespace simulator

@@ -7,6 +7,8 @@
 
 #include "Storefront.h"
 
+namespace simulator {
+
 namespace {
 
 // Counted up with every change of the tables, or of what fills them.
@@ -295,3 +297,5 @@ bool FillCatalogue(Database& database, std::string& error)
     error = database.File() + ": cannot write the database; name a folder that can be written with --data";
     return false;
 }
+
+}  // namespace simulator

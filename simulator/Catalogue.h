@@ -3,6 +3,10 @@
 
 #include "Database.h"
 
+namespace simulator {
+
 /// Makes the tables of a new database and fills them; within a second. False, with the reason and what to do, when the
 /// database has tables of another version, which stay as they are, or cannot be written.
 bool FillCatalogue(Database& database, std::string& error);
+
+}  // namespace simulator

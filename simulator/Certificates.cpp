@@ -6,6 +6,10 @@
 
 #include <cstdio>
 
+#include "Hosts.h"
+
+namespace simulator {
+
 namespace {
 
 constexpr long kDay = 24 * 60 * 60;
@@ -26,8 +30,8 @@ void AddExtension(X509* certificate, X509* issuer, int kind, const std::string& 
     X509_EXTENSION_free(extension);
 }
 
-// A certificate for the key from `first` to `last` seconds from now, not signed yet.
-X509* NewCertificate(EVP_PKEY* key, const std::string& commonName, long first, long last)
+// A certificate for the key, not signed yet.
+X509* NewCertificate(EVP_PKEY* key, const std::string& commonName, const CertificateDates& dates)
 {
     X509* certificate = X509_new();
     X509_set_version(certificate, 2);
@@ -37,17 +41,24 @@ X509* NewCertificate(EVP_PKEY* key, const std::string& commonName, long first, l
     BIGNUM* number = BN_bin2bn(serial, sizeof serial, nullptr);
     BN_to_ASN1_INTEGER(number, X509_get_serialNumber(certificate));
     BN_free(number);
-    X509_gmtime_adj(X509_getm_notBefore(certificate), first);
-    X509_gmtime_adj(X509_getm_notAfter(certificate), last);
+    ASN1_TIME_set(X509_getm_notBefore(certificate), dates.from);
+    ASN1_TIME_set(X509_getm_notAfter(certificate), dates.until);
     X509_NAME_add_entry_by_txt(X509_get_subject_name(certificate), "CN", MBSTRING_UTF8,
                                reinterpret_cast<const unsigned char*>(commonName.c_str()), -1, -1, 0);
     X509_set_pubkey(certificate, key);
     return certificate;
 }
 
+CertificateDates DatesFromNow(long firstDay, long lastDay)
+{
+    const time_t now = time(nullptr);
+    return {now + firstDay * kDay, now + lastDay * kDay};
+}
+
 X509* NewAuthority(EVP_PKEY* key)
 {
-    X509* authority = NewCertificate(key, "Storefront simulator CA", -kDay, 3650 * kDay);
+    // Older than its certificates may pretend to be.
+    X509* authority = NewCertificate(key, "Storefront simulator CA", DatesFromNow(-20 * 365, 10 * 365));
     X509_set_issuer_name(authority, X509_get_subject_name(authority));
     AddExtension(authority, authority, NID_basic_constraints, "critical,CA:TRUE");
     AddExtension(authority, authority, NID_key_usage, "critical,keyCertSign,cRLSign");
@@ -55,17 +66,22 @@ X509* NewAuthority(EVP_PKEY* key)
     return authority;
 }
 
-const char* NamesOf(CertificateKind kind)
+// Those of the subject's alternative names.
+std::string NamesOf(CertificateKind kind)
 {
+    std::string names = "DNS:localhost,IP:127.0.0.1";
+    for (const HostRow& host : kHosts) {
+        if (host.tls) names += std::string(",DNS:") + host.name;
+    }
     switch (kind) {
         case CertificateKind::WrongName:
             return "DNS:other.example";
         case CertificateKind::WideWildcard:
             return "DNS:*";  // must not stand for a host
         case CertificateKind::NameOnly:
-            return nullptr;
+            return "";
         default:
-            return "DNS:localhost,IP:127.0.0.1";
+            return names;
     }
 }
 
@@ -108,7 +124,7 @@ bool Certificates::Make()
            PEM_write_X509(authority.get(), m_Authority) == 1;
 }
 
-SSL_CTX* Certificates::Context(CertificateKind kind, bool oldTls) const
+SSL_CTX* Certificates::Context(CertificateKind kind, const CertificateDates& dates, bool oldTls) const
 {
     EVP_PKEY* key = EVP_EC_gen("P-256");
     EVP_PKEY* signer = m_Key;
@@ -117,11 +133,15 @@ SSL_CTX* Certificates::Context(CertificateKind kind, bool oldTls) const
         signer = EVP_EC_gen("P-256");
         issuer = NewAuthority(signer);
     }
-    const bool expired = kind == CertificateKind::Expired;
-    X509* certificate =
-        NewCertificate(key, "localhost", expired ? -20 * kDay : -kDay, expired ? -10 * kDay : 365 * kDay);
+    CertificateDates valid = kind == CertificateKind::Expired       ? DatesFromNow(-20, -10)
+                             : kind == CertificateKind::NotYetValid ? DatesFromNow(10, 20)
+                                                                    : DatesFromNow(-1, 365);
+    if (dates.from) valid.from = dates.from;
+    if (dates.until) valid.until = dates.until;
+    X509* certificate = NewCertificate(key, "localhost", valid);
     X509_set_issuer_name(certificate, X509_get_subject_name(issuer));
-    if (const char* names = NamesOf(kind)) AddExtension(certificate, issuer, NID_subject_alt_name, names);
+    const std::string names = NamesOf(kind);
+    if (!names.empty()) AddExtension(certificate, issuer, NID_subject_alt_name, names);
     X509_sign(certificate, signer, EVP_sha256());
 
     SSL_CTX* context = SSL_CTX_new(TLS_server_method());
@@ -143,3 +163,5 @@ SSL_CTX* Certificates::Context(CertificateKind kind, bool oldTls) const
     }
     return context;
 }
+
+}  // namespace simulator

@@ -8,6 +8,8 @@
 
 #include "Storefront.h"
 
+namespace simulator {
+
 class Certificates {
 public:
     /// Loads the authority of the folder, or makes one and writes "ca.pem" and "ca-key.pem" there.
@@ -17,7 +19,7 @@ public:
     std::string AuthorityFile() const { return m_Folder + "/ca.pem"; }
 
     /// A server context with a fresh key and a certificate of that kind. The caller frees it.
-    SSL_CTX* Context(CertificateKind kind, bool oldTls) const;
+    SSL_CTX* Context(CertificateKind kind, const CertificateDates& dates, bool oldTls) const;
 
 private:
     bool Load();
@@ -27,3 +29,5 @@ private:
     EVP_PKEY* m_Key = nullptr;
     X509* m_Authority = nullptr;
 };
+
+}  // namespace simulator

@@ -8,6 +8,8 @@
 #include <algorithm>
 #include <cerrno>
 
+namespace simulator {
+
 Channel::~Channel()
 {
     m_Tls.reset();
@@ -54,12 +56,29 @@ bool Channel::Write(const std::string& bytes)
     return true;
 }
 
+void Channel::WaitFor(short events)
+{
+    pollfd entry = {m_Descriptor, events, 0};
+    while (poll(&entry, 1, -1) < 0 && errno == EINTR) {
+    }
+}
+
+void Channel::WaitForBytes()
+{
+    if (!m_Tls || SSL_pending(m_Tls.get()) == 0) WaitFor(POLLIN);
+}
+
 void Channel::Stall()
 {
     // Ends with the peer's close, and with the shutdown that the simulator's end brings.
-    pollfd entry = {m_Descriptor, POLLRDHUP, 0};
-    while (poll(&entry, 1, -1) < 0 && errno == EINTR) {
-    }
+    WaitFor(POLLRDHUP);
+}
+
+bool Channel::SendTicket()
+{
+    const bool sent = m_Tls && SSL_new_session_ticket(m_Tls.get()) == 1 && SSL_do_handshake(m_Tls.get()) == 1;
+    ERR_clear_error();
+    return sent;
 }
 
 bool Channel::WriteBare(const std::string& bytes)
@@ -80,3 +99,5 @@ void Channel::Reset()
     setsockopt(m_Descriptor, SOL_SOCKET, SO_LINGER, &now, sizeof now);
     m_Tls.reset();
 }
+
+}  // namespace simulator

@@ -6,6 +6,8 @@
 #include <memory>
 #include <string>
 
+namespace simulator {
+
 class Channel {
 public:
     /// Owns the descriptor.
@@ -23,6 +25,10 @@ public:
     size_t Read(char* buffer, size_t size);
     /// False when the peer is gone.
     bool Write(const std::string& bytes);
+    /// Waits until something has come, the end included.
+    void WaitForBytes();
+    /// A further session ticket (TLS 1.3). False when it cannot be sent.
+    bool SendTicket();
     /// Past TLS; for a few bytes.
     bool WriteBare(const std::string& bytes);
 
@@ -36,9 +42,13 @@ public:
     int Descriptor() const { return m_Descriptor; }
 
 private:
+    void WaitFor(short events);
+
     struct TlsFree {
         void operator()(SSL* tls) const { SSL_free(tls); }
     };
     int m_Descriptor;
     std::unique_ptr<SSL, TlsFree> m_Tls;
 };
+
+}  // namespace simulator

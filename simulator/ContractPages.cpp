@@ -5,6 +5,8 @@
 #include "ContractFiles.h"
 #include "SoapService.h"
 
+namespace simulator {
+
 namespace {
 
 bool EndsWith(const std::string& text, const std::string& end)
@@ -43,3 +45,5 @@ bool AnswerContract(const HttpRequest& request, const std::string& endpoint, Htt
     response.body = EndsWith(name, ".wsdl") ? WithAddress(file->second, endpoint) : file->second;
     return true;
 }
+
+}  // namespace simulator

@@ -1,5 +1,7 @@
 #include "Database.h"
 
+namespace simulator {
+
 namespace {
 
 // Small letters for capital ones in ASCII, Latin-1, Greek and Cyrillic; SQLite's own lower() knows ASCII alone.
@@ -112,3 +114,5 @@ std::string Database::Text(const std::string& sql, const Values& values)
     });
     return value;
 }
+
+}  // namespace simulator

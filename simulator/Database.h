@@ -9,6 +9,8 @@
 #include <string>
 #include <vector>
 
+namespace simulator {
+
 class Database {
 public:
     /// One row of an answer; null columns read as 0 and "".
@@ -63,3 +65,5 @@ private:
     std::recursive_mutex m_Mutex;
     std::unique_ptr<sqlite3, Closer> m_Database;
 };
+
+}  // namespace simulator

@@ -7,23 +7,29 @@
 #include <mutex>
 #include <string>
 
+namespace simulator {
+
 struct Fault {
     std::string kind;  ///< Empty: none.
     std::string value;
-    int delay = 0;  ///< Milliseconds before the answer.
+    int delay = 0;        ///< Milliseconds before the answer.
+    int retryAfter = -1;  ///< Seconds after which the client may try again; -1: it is not told.
     int count = 1;
-    int retryAfter = 0;        ///< Seconds that an HTTP status comes with; 0: none.
     bool afterEffect = false;  ///< What the request asks for is done although the answer claims otherwise.
     unsigned long clears = 0;  ///< How often the lists had been cleared when it was taken.
 
     bool Is(const char* name) const { return kind == name; }
     int Number(int standard) const;
+    long long Seconds(long long standard) const;
     std::string Text() const { return value.empty() ? kind : kind + ":" + value; }
+    /// Whether what the client gets says that the request was not carried out, and it was not.
+    bool ClaimsFailure() const;
 };
 
 class Faults {
 public:
-    /// Reads "OPERATION=KIND[:VALUE][,delay=MS][,count=N][,after]" and appends it to the operation's list.
+    /// Reads "OPERATION=KIND[:VALUE][,delay=MS][,count=N][,retry=SECONDS][,after]" and appends it to the operation's
+    /// list.
     bool Add(const std::string& text, std::string& error);
     /// The next fault for the operation, taken off its list; the list "any" counts for every request without an own
     /// one.
@@ -45,3 +51,5 @@ private:
     bool m_Ended = false;
     std::map<std::string, std::deque<Fault>> m_Lists;
 };
+
+}  // namespace simulator

@@ -1,63 +1,47 @@
 #include "Http.h"
 
-#include <strings.h>
 #include <zlib.h>
 
 #include <algorithm>
 #include <cstdlib>
 
 #include "Channel.h"
+#include "Chunked.h"
+
+namespace simulator {
 
 namespace {
 
 constexpr size_t kLargestRequest = 1 << 20;
 
-std::string Lower(std::string text)
-{
-    std::transform(text.begin(), text.end(), text.begin(), [](unsigned char c) { return tolower(c); });
-    return text;
-}
-
 const char* Reason(int status)
 {
     switch (status) {
+        case 100:
+            return "Continue";
         case 200:
             return "OK";
         case 302:
             return "Found";
         case 304:
             return "Not Modified";
+        case 400:
+            return "Bad Request";
+        case 403:
+            return "Forbidden";
         case 404:
             return "Not Found";
+        case 407:
+            return "Proxy Authentication Required";
         case 500:
             return "Internal Server Error";
+        case 502:
+            return "Bad Gateway";
         case 503:
             return "Service Unavailable";
         default:
             return "Status";
     }
-}
-
-bool ParseHead(const std::string& head, HttpRequest& request)
-{
-    size_t end = head.find("\r\n");
-    const std::string first = head.substr(0, end);
-    const size_t blank = first.find(' ');
-    const size_t second = first.find(' ', blank + 1);
-    if (blank == std::string::npos || second == std::string::npos) return false;
-    request.method = first.substr(0, blank);
-    request.target = first.substr(blank + 1, second - blank - 1);
-    while (end != std::string::npos && end + 2 < head.size()) {
-        const size_t start = end + 2;
-        end = head.find("\r\n", start);
-        const std::string line = head.substr(start, end == std::string::npos ? end : end - start);
-        const size_t colon = line.find(':');
-        if (colon == std::string::npos) return false;
-        const size_t value = line.find_first_not_of(' ', colon + 1);
-        request.headers.emplace_back(Lower(line.substr(0, colon)),
-                                     value == std::string::npos ? std::string() : line.substr(value));
-    }
-    return true;
 }
 
 bool ReadMore(Channel& channel, std::string& text)
@@ -68,14 +52,101 @@ bool ReadMore(Channel& channel, std::string& text)
     return count > 0 && text.size() <= kLargestRequest;
 }
 
+bool ReadFirstLine(const std::string& line, HttpRequest& request)
+{
+    const std::vector<std::string> words = Split(line, ' ');
+    if (words.size() != 3 || (words[2] != "HTTP/1.1" && words[2] != "HTTP/1.0")) return false;
+    request.method = words[0];
+    request.target = words[1];
+    request.version = words[2];
+    return true;
+}
+
+bool ReadChunkedBody(Channel& channel, std::string& rest, std::string& body)
+{
+    ChunkReader chunks;
+    for (;;) {
+        rest.erase(0, chunks.Take(rest, body));
+        if (chunks.Done()) return true;
+        if (chunks.Failed() || body.size() > kLargestRequest || !ReadMore(channel, rest)) return false;
+    }
+}
+
+bool ReadBody(Channel& channel, std::string& rest, HttpRequest& request)
+{
+    const std::string coding = request.Header("transfer-encoding");
+    const std::string length = request.Header("content-length");
+    if (coding.empty() && length.empty()) return true;
+    const bool expects = Lower(request.Header("expect")) == "100-continue" && request.version == "HTTP/1.1";
+    if (expects && rest.empty() && !channel.Write("HTTP/1.1 100 Continue\r\n\r\n")) return false;
+    if (!coding.empty()) return Lower(coding) == "chunked" && ReadChunkedBody(channel, rest, request.body);
+    const size_t size = strtoul(length.c_str(), nullptr, 10);
+    if (length.find_first_not_of("0123456789") != std::string::npos || size > kLargestRequest) return false;
+    while (rest.size() < size) {
+        if (!ReadMore(channel, rest)) return false;
+    }
+    request.body = rest.substr(0, size);
+    rest.erase(0, size);
+    return true;
+}
+
 }  // namespace
 
-std::string HttpRequest::Header(const std::string& name) const
+std::string Lower(std::string text)
+{
+    std::transform(text.begin(), text.end(), text.begin(), [](unsigned char c) { return tolower(c); });
+    return text;
+}
+
+std::string Trimmed(const std::string& text)
+{
+    const char* const blanks = " \t\r\n";
+    const size_t first = text.find_first_not_of(blanks);
+    return first == std::string::npos ? "" : text.substr(first, text.find_last_not_of(blanks) - first + 1);
+}
+
+std::vector<std::string> Split(const std::string& text, char separator)
+{
+    std::vector<std::string> parts;
+    for (size_t start = 0; start <= text.size();) {
+        const size_t end = std::min(text.find(separator, start), text.size());
+        parts.push_back(Trimmed(text.substr(start, end - start)));
+        start = end + 1;
+    }
+    return parts;
+}
+
+std::string HeaderOf(const Headers& headers, const std::string& name)
 {
     for (const auto& header : headers) {
         if (header.first == name) return header.second;
     }
     return std::string();
+}
+
+bool ReadHead(const std::string& head, std::string& first, Headers& headers)
+{
+    size_t end = head.find("\r\n");
+    first = head.substr(0, end);
+    while (end != std::string::npos && end + 2 < head.size()) {
+        const size_t start = end + 2;
+        end = head.find("\r\n", start);
+        const std::string line = head.substr(start, end == std::string::npos ? end : end - start);
+        const size_t colon = line.find(':');
+        if (colon == std::string::npos) return false;
+        headers.emplace_back(Lower(line.substr(0, colon)), Trimmed(line.substr(colon + 1)));
+    }
+    return true;
+}
+
+std::string HttpRequest::Local() const
+{
+    for (const std::string scheme : {"http://", "https://"}) {
+        if (target.compare(0, scheme.size(), scheme) != 0) continue;
+        const size_t slash = target.find('/', scheme.size());
+        return slash == std::string::npos ? "/" : target.substr(slash);
+    }
+    return target;
 }
 
 std::string HttpRequest::Parameter(const std::string& name) const
@@ -95,35 +166,57 @@ std::string HttpRequest::Parameter(const std::string& name) const
 
 bool HttpRequest::KeepAlive() const
 {
-    return strcasecmp(Header("connection").c_str(), "close") != 0;
+    bool keeps = version != "HTTP/1.0";
+    for (const auto& [name, value] : headers) {
+        if (name != "connection") continue;
+        for (const std::string& option : Split(Lower(value), ','))
+            keeps = option != "close" && (keeps || option == "keep-alive");
+    }
+    return keeps;
 }
 
-std::string HttpResponse::Head(size_t length, bool keepAlive) const
+bool HttpRequest::AcceptsGzip() const
 {
-    std::string head = "HTTP/1.1 " + std::to_string(status) + " " + Reason(status) + "\r\n";
-    head += "Server: storefront-simulator\r\nContent-Type: " + contentType + "\r\n";
+    for (const std::string& coding : Split(Lower(Header("accept-encoding")), ',')) {
+        const std::vector<std::string> parts = Split(coding, ';');
+        if (parts[0] != "gzip" && parts[0] != "*") continue;
+        return parts.size() < 2 || parts[1].rfind("q=", 0) != 0 || atof(parts[1].c_str() + 2) > 0;
+    }
+    return false;
+}
+
+std::string HttpResponse::Head(const Framing& framing) const
+{
+    std::string head = framing.version + (" " + std::to_string(status)) + " ";
+    head += opensTunnel ? "Connection established" : Reason(status);
+    head += "\r\nServer: storefront-simulator\r\n";
+    if (!opensTunnel) head += "Content-Type: " + contentType + "\r\n";
     for (const auto& header : headers)
         head += header.first + ": " + header.second + "\r\n";
-    head += "Content-Length: " + std::to_string(length) + "\r\n";
-    return head + "Connection: " + (keepAlive ? "keep-alive" : "close") + "\r\n\r\n";
+    if (framing.length == Framing::Announced) {
+        head += "Content-Length: " + std::to_string(framing.announced) + "\r\n";
+    } else if (framing.length == Framing::Chunks) {
+        head += "Transfer-Encoding: chunked\r\n";
+    }
+    if (!opensTunnel) head += std::string("Connection: ") + (framing.keepAlive ? "keep-alive" : "close") + "\r\n";
+    return head + "\r\n";
 }
 
-bool ReadRequest(Channel& channel, std::string& rest, HttpRequest& request)
+Incoming ReadRequest(Channel& channel, std::string& rest, HttpRequest& request)
 {
-    size_t headEnd;
-    while ((headEnd = rest.find("\r\n\r\n")) == std::string::npos) {
-        if (!ReadMore(channel, rest)) return false;
+    size_t headEnd = std::string::npos;
+    while (headEnd == std::string::npos) {
+        // Empty lines before a request mean nothing.
+        rest.erase(0, std::min(rest.find_first_not_of("\r\n"), rest.size()));
+        headEnd = rest.find("\r\n\r\n");
+        if (headEnd == std::string::npos && !ReadMore(channel, rest)) {
+            return rest.empty() ? Incoming::End : Incoming::Malformed;
+        }
     }
-    if (!ParseHead(rest.substr(0, headEnd), request)) return false;
+    std::string first;
+    const bool good = ReadHead(rest.substr(0, headEnd), first, request.headers) && ReadFirstLine(first, request);
     rest.erase(0, headEnd + 4);
-    const size_t length = strtoul(request.Header("content-length").c_str(), nullptr, 10);
-    if (length > kLargestRequest) return false;
-    while (rest.size() < length) {
-        if (!ReadMore(channel, rest)) return false;
-    }
-    request.body = rest.substr(0, length);
-    rest.erase(0, length);
-    return true;
+    return good && ReadBody(channel, rest, request) ? Incoming::Request : Incoming::Malformed;
 }
 
 std::string UrlDecode(const std::string& text)
@@ -154,3 +247,5 @@ std::string Gzip(const std::string& text)
     deflateEnd(&stream);
     return packed;
 }
+
+}  // namespace simulator

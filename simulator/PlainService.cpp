@@ -2,7 +2,8 @@
 
 #include <cctype>
 #include <ctime>
-#include <sstream>
+
+namespace simulator {
 
 namespace {
 
@@ -12,9 +13,8 @@ const char kLastModified[] = "Mon, 02 Nov 2026 06:00:00 GMT";
 const char kLaterModified[] = "Tue, 03 Nov 2026 06:00:00 GMT";
 
 // "11/21/2026 6:30:05 AM"; the service's clock is UTC.
-std::string Clock()
+std::string Clock(time_t now)
 {
-    const time_t now = time(nullptr);
     tm parts;
     gmtime_r(&now, &parts);
     // 13 to 23 hours become 1 to 11 PM; 12 stays, as "12 PM" would be read as midnight.
@@ -93,8 +93,8 @@ std::string PlainServiceName(const std::string& path)
     return "";
 }
 
-HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, const Fault& fault,
-                         LoggedRequest& log)
+HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, time_t now,
+                         const Fault& fault, LoggedRequest& log)
 {
     log.service = service;
     log.operation = service;
@@ -102,7 +102,7 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
     if (service == "boxart") return BoxArt(request, fault, log);
     HttpResponse response;
     if (service == "clock") {
-        response.body = Clock();
+        response.body = Clock(now);
     } else {
         response.contentType = "application/octet-stream";
         response.body.assign(kBandwidthFile, 'b');
@@ -110,28 +110,4 @@ HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request,
     return response;
 }
 
-HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log)
-{
-    HttpResponse response;
-    const std::string what = request.method + " " + request.Path();
-    if (what == "POST /control/faults") {
-        std::istringstream lines(request.body);
-        for (std::string line, error; std::getline(lines, line);) {
-            if (line.empty() || faults.Add(line, error)) continue;
-            response.status = 400;
-            response.body += error + "\n";
-        }
-    } else if (what == "GET /control/faults") {
-        response.body = faults.Pending();
-    } else if (what == "DELETE /control/faults") {
-        faults.Clear();
-    } else if (what == "GET /control/log") {
-        response.contentType = "application/x-ndjson";
-        response.body = log.Json();
-    } else if (what == "DELETE /control/log") {
-        log.Clear();
-    } else {
-        return NotFound();
-    }
-    return response;
-}
+}  // namespace simulator

@@ -1,21 +1,23 @@
-// What is asked without SOAP: discovery, box art, clock, bandwidth file, and control.
+// What is asked without SOAP: discovery, box art, clock, bandwidth file.
 #pragma once
 
+#include <ctime>
 #include <string>
 
 #include "Faults.h"
 #include "Http.h"
 #include "RequestLog.h"
 
+namespace simulator {
+
 /// The name under which a path's faults and log entries stand; empty for a path that is none of these.
 std::string PlainServiceName(const std::string& path);
 
-/// Answers one of them. `fault` has already been chosen.
-HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, const Fault& fault,
-                         LoggedRequest& log);
-
-/// "/control/...": faults and log, for people and scripts.
-HttpResponse AnswerControl(const HttpRequest& request, Faults& faults, RequestLog& log);
+/// Answers one of them, at the time given. `fault` has already been chosen.
+HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, time_t now,
+                         const Fault& fault, LoggedRequest& log);
 
 /// A picture of that many pixels' width for the title; the same one every time.
 std::string MakeBoxArt(const std::string& prefix, int width);
+
+}  // namespace simulator

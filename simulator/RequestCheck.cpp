@@ -1,120 +1,56 @@
 #include "RequestCheck.h"
 
-#include <libxml/parser.h>
 #include <openssl/evp.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
 #include <memory>
 
+#include "Base64.h"
+#include "Namespaces.h"
 #include "Tokens.h"
+#include "XmlNode.h"
+
+namespace simulator {
 
 namespace {
 
-const char kEnvelope[] = "http://schemas.xmlsoap.org/soap/envelope/";
 const char kAddressing[] = "http://schemas.xmlsoap.org/ws/2004/08/addressing";
 const char kSecurity[] = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-secext-1.0.xsd";
 const char kUtility[] = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-utility-1.0.xsd";
-const char kService[] = "http://api.zorvane.example/api/";
 const char kDigestType[] =
     "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-username-token-profile-1.0#PasswordDigest";
 const char kNonceType[] =
     "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-soap-message-security-1.0#Base64Binary";
 constexpr int kFreshSeconds = 300;
 
-const char* Text(const xmlChar* text)
-{
-    return reinterpret_cast<const char*>(text);
-}
-
-// An element, as this file looks at one. Copies are cheap; the document must live.
-class Node {
-public:
-    explicit Node(xmlNodePtr node = nullptr) : m_Node(node) {}
-    explicit operator bool() const { return m_Node != nullptr; }
-
-    std::string Name() const { return m_Node ? Text(m_Node->name) : ""; }
-    std::string Namespace() const { return m_Node && m_Node->ns ? Text(m_Node->ns->href) : ""; }
-    bool Is(const char* space, const std::string& name) const { return Name() == name && Namespace() == space; }
-
-    std::vector<Node> Children() const
-    {
-        std::vector<Node> children;
-        for (xmlNodePtr child = m_Node ? m_Node->children : nullptr; child; child = child->next) {
-            if (child->type == XML_ELEMENT_NODE) children.emplace_back(child);
-        }
-        return children;
-    }
-    Node Child(const char* space, const char* name) const
-    {
-        for (const Node& child : Children()) {
-            if (child.Is(space, name)) return child;
-        }
-        return Node();
-    }
-    std::string Content() const
-    {
-        if (!m_Node) return "";
-        const std::unique_ptr<xmlChar, void (*)(void*)> content(xmlNodeGetContent(m_Node), xmlFree);
-        return content ? Text(content.get()) : "";
-    }
-    // Text of its own beside its elements.
-    bool HasText() const
-    {
-        for (xmlNodePtr child = m_Node ? m_Node->children : nullptr; child; child = child->next) {
-            if (child->type != XML_ELEMENT_NODE && child->type != XML_COMMENT_NODE && !xmlIsBlankNode(child))
-                return true;
-        }
-        return false;
-    }
-    std::string Attribute(const char* name, const char* space) const
-    {
-        const auto* n = reinterpret_cast<const xmlChar*>(name);
-        const std::unique_ptr<xmlChar, void (*)(void*)> value(
-            space ? xmlGetNsProp(m_Node, n, reinterpret_cast<const xmlChar*>(space)) : xmlGetNoNsProp(m_Node, n),
-            xmlFree);
-        return value ? Text(value.get()) : "";
-    }
-
-private:
-    xmlNodePtr m_Node;
-};
-
-std::string Base64(const unsigned char* bytes, size_t length)
-{
-    std::string text(4 * ((length + 2) / 3) + 1, '\0');
-    text.resize(EVP_EncodeBlock(reinterpret_cast<unsigned char*>(&text[0]), bytes, static_cast<int>(length)));
-    return text;
-}
-
-std::string Unbase64(const std::string& text)
-{
-    std::string bytes(text.size() + 1, '\0');
-    const int length =
-        EVP_DecodeBlock(reinterpret_cast<unsigned char*>(&bytes[0]),
-                        reinterpret_cast<const unsigned char*>(text.data()), static_cast<int>(text.size()));
-    const auto padding = std::count(text.begin(), text.end(), '=');
-    if (length < padding || padding > 2) return "";
-    bytes.resize(static_cast<size_t>(length - padding));
-    return bytes;
-}
-
 std::string Sha1(const std::string& text)
 {
     unsigned char digest[EVP_MAX_MD_SIZE];
     unsigned int length = 0;
     EVP_Digest(text.data(), text.size(), digest, &length, EVP_sha1(), nullptr);
-    return Base64(digest, length);
+    return Base64(std::string(digest, digest + length));
 }
 
 bool IsInt(const std::string& text)
 {
-    if (text.empty()) return false;
-    char* end = nullptr;
-    const long long number = strtoll(text.c_str(), &end, 10);
-    return *end == '\0' && number >= INT32_MIN && number <= INT32_MAX && !isspace(static_cast<unsigned char>(text[0]));
+    const std::string digits = Trimmed(text);
+    const size_t first = digits.find_first_of("0123456789");
+    if (first > 1 || digits.find_first_not_of("0123456789", first) != std::string::npos) return false;
+    if (first == 1 && digits[0] != '-' && digits[0] != '+') return false;
+    errno = 0;
+    const long long number = strtoll(digits.c_str(), nullptr, 10);
+    return errno == 0 && number >= INT32_MIN && number <= INT32_MAX;
+}
+
+// A base64 text may be written on several lines.
+std::string Joined(std::string text)
+{
+    text.erase(std::remove_if(text.begin(), text.end(), [](unsigned char c) { return isspace(c); }), text.end());
+    return text;
 }
 
 // ---- Header
@@ -133,7 +69,7 @@ std::string CheckBlocks(const std::vector<Node>& blocks, const std::vector<Block
         if (i >= blocks.size() || !blocks[i].Is(wanted[i].space, wanted[i].name)) {
             return "header block " + std::to_string(i + 1) + " must be " + wanted[i].name;
         }
-        const std::string marked = blocks[i].Attribute("mustUnderstand", kEnvelope);
+        const std::string marked = blocks[i].Attribute("mustUnderstand", kSoap11);
         if (wanted[i].mustUnderstand != (marked == "1" || marked == "true")) {
             return "mustUnderstand of " + wanted[i].name + " is wrong";
         }
@@ -158,11 +94,10 @@ std::string CheckSettings(const Node& settings, const std::string& apiKey)
     return "";
 }
 
-bool IsFresh(const std::string& created)
+bool IsFresh(const std::string& created, time_t now)
 {
-    tm parts = {};
-    const char* end = strptime(created.c_str(), "%Y-%m-%dT%H:%M:%SZ", &parts);
-    return end && *end == '\0' && std::llabs(static_cast<long long>(timegm(&parts)) - time(nullptr)) <= kFreshSeconds;
+    time_t when;
+    return ReadDateTime(created, when) && std::llabs(static_cast<long long>(when) - now) <= kFreshSeconds;
 }
 
 // ---- Body
@@ -242,13 +177,29 @@ void NoteHeader(const Node& header, Database& database, CheckedRequest& checked,
     }
 }
 
-std::string CheckToken(const Node& security)
+// How long the message may be used; empty when that is not over.
+std::string CheckTimestamp(const Node& timestamp, time_t now)
+{
+    time_t created = now, expires = now;
+    const Node first = timestamp.Child(kUtility, "Created");
+    const Node last = timestamp.Child(kUtility, "Expires");
+    if ((first && !ReadDateTime(first.Value(), created)) || (last && !ReadDateTime(last.Value(), expires))) {
+        return "the message's timestamp holds no time";
+    }
+    if (created - now > kFreshSeconds) return "the message was made later than now";
+    return expires < now ? "the message has expired" : "";
+}
+
+std::string CheckToken(const Node& security, time_t now)
 {
     static const std::pair<const char*, const char*> kOrder[] = {
         {kSecurity, "Username"}, {kSecurity, "Password"}, {kSecurity, "Nonce"}, {kUtility, "Created"}};
     const Node token = security.Child(kSecurity, "UsernameToken");
+    const Node timestamp = security.Child(kUtility, "Timestamp");
     const std::vector<Node> children = token.Children();
-    if (security.Children().size() != 1 || children.size() != 4) return "no complete user-name token";
+    if (security.Children().size() != (timestamp ? 2 : 1) || children.size() != 4) return "no complete user-name token";
+    std::string wrong = CheckTimestamp(timestamp, now);
+    if (!wrong.empty()) return wrong;
     for (size_t i = 0; i < 4; ++i) {
         if (!children[i].Is(kOrder[i].first, kOrder[i].second)) {
             return std::string("the token has no ") + kOrder[i].second + " in its place";
@@ -257,16 +208,29 @@ std::string CheckToken(const Node& security)
     if (token.Attribute("Id", kUtility) != "User") return "wsu:Id of the token is not User";
     if (children[1].Attribute("Type", nullptr) != kDigestType) return "the password is no digest";
     if (children[2].Attribute("EncodingType", nullptr) != kNonceType) return "the nonce is no Base64Binary";
-    if (Unbase64(children[2].Content()).empty()) return "the nonce is no base64 text";
-    if (!IsFresh(children[3].Content())) return "the token is not fresh";
+    if (Unbase64(Joined(children[2].Content())).empty()) return "the nonce is no base64 text";
+    if (!IsFresh(children[3].Value(), now)) return "the token is not fresh";
     return "";
+}
+
+// The charset that the content type names, in lower case; "utf-8" when it names none, and "" when it is no text/xml.
+std::string CharsetOf(const HttpRequest& request)
+{
+    const std::vector<std::string> parts = Split(Lower(request.Header("content-type")), ';');
+    if (parts[0] != "text/xml") return "";
+    for (const std::string& part : parts) {
+        if (part.rfind("charset=", 0) != 0) continue;
+        const std::string charset = part.substr(strlen("charset="));
+        const bool quoted = charset.size() > 2 && charset.front() == '"' && charset.back() == '"';
+        return quoted ? charset.substr(1, charset.size() - 2) : charset;
+    }
+    return "utf-8";
 }
 
 std::string CheckHttp(const HttpRequest& request)
 {
     if (request.method != "POST") return "the method is not POST";
-    if (request.Header("content-type") != "text/xml; charset=utf-8")
-        return "the content type is not text/xml; charset=utf-8";
+    if (CharsetOf(request) != "utf-8") return "the content type is not text/xml; charset=utf-8";
     if (request.Header("user-agent").empty()) return "no user agent";
     return "";
 }
@@ -276,19 +240,33 @@ std::string CheckHttp(const HttpRequest& request)
 bool RequestCheck::IsNewNonce(const std::string& nonce)
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    return m_Nonces.insert(nonce).second;
+    const auto [place, isNew] = m_Nonces.insert(nonce);
+    if (isNew) m_InOrder.push_back(place);
+    if (m_InOrder.size() > m_Remembered) {
+        m_Nonces.erase(m_InOrder.front());
+        m_InOrder.pop_front();
+    }
+    return isNew;
 }
 
-std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& service, const std::string& endpoint,
-                                CheckedRequest& checked, LoggedRequest& log)
+// Whether the text is the address of the services with that path, under whatever name of theirs.
+bool RequestCheck::IsEndpoint(const std::string& text, const std::string& path) const
 {
-    const std::unique_ptr<xmlDoc, void (*)(xmlDocPtr)> document(
-        xmlReadMemory(request.body.data(), static_cast<int>(request.body.size()), nullptr, nullptr,
-                      XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING),
-        xmlFreeDoc);
-    const Node envelope(document ? xmlDocGetRootElement(document.get()) : nullptr);
-    NoteHeader(envelope.Child(kEnvelope, "Header"), m_Database, checked, log);
-    const std::vector<Node> bodies = envelope.Child(kEnvelope, "Body").Children();
+    const std::string scheme = "https://";
+    const size_t slash = text.find('/', scheme.size());
+    return text.compare(0, scheme.size(), scheme) == 0 && slash != std::string::npos && text.substr(slash) == path &&
+           m_Hosts.IsService(text.substr(scheme.size(), slash - scheme.size()));
+}
+
+std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& service, CheckedRequest& checked,
+                                LoggedRequest& log)
+{
+    // A charset of HTTP's goes before what the XML declaration says.
+    const bool named = Lower(request.Header("content-type")).find("charset") != std::string::npos;
+    const Document document = ReadXml(request.body, named ? "UTF-8" : nullptr);
+    const Node envelope(document);
+    NoteHeader(envelope.Child(kSoap11, "Header"), m_Database, checked, log);
+    const std::vector<Node> bodies = envelope.Child(kSoap11, "Body").Children();
     const Node body = bodies.empty() ? Node() : bodies[0];
     log.operation = body.Name();
     for (const Node& child : body.Children()) {
@@ -299,7 +277,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     if (!wrong.empty()) return wrong;
     if (!document) return "the body is no XML";
     if (document->intSubset) return "the body has a document type declaration";
-    if (!envelope.Is(kEnvelope, "Envelope")) return "the body is no SOAP 1.1 envelope";
+    if (!envelope.Is(kSoap11, "Envelope")) return "the body is no SOAP 1.1 envelope";
     if (bodies.size() != 1 || body.Namespace() != kService)
         return "the SOAP body holds no single element of the service";
     checked.operation = FindOperation(service, body.Name());
@@ -307,7 +285,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     const std::string action = kService + body.Name();
     if (request.Header("soapaction") != "\"" + action + "\"") return "SOAPAction is not " + action;
 
-    const std::vector<Node> blocks = envelope.Child(kEnvelope, "Header").Children();
+    const std::vector<Node> blocks = envelope.Child(kSoap11, "Header").Children();
     wrong = CheckBlocks(blocks, {{kSecurity, "Security", true},
                                  {kAddressing, "MessageID", false},
                                  {kAddressing, "ReplyTo", true},
@@ -315,24 +293,27 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
                                  {kAddressing, "Action", true},
                                  {kService, service.settingsBlock, true}});
     if (!wrong.empty()) return wrong;
-    if (blocks[1].Content() != "uuid:" + body.Name()) return "wsa:MessageID is not uuid:" + body.Name();
-    if (blocks[2].Child(kAddressing, "Address").Content() != std::string(kAddressing) + "/role/anonymous") {
+    if (blocks[1].Value() != "uuid:" + body.Name()) return "wsa:MessageID is not uuid:" + body.Name();
+    if (blocks[2].Child(kAddressing, "Address").Value() != std::string(kAddressing) + "/role/anonymous") {
         return "wsa:ReplyTo is not anonymous";
     }
-    if (blocks[3].Content() != endpoint) return "wsa:To is not " + endpoint;
-    if (blocks[4].Content() != action) return "wsa:Action is not " + action;
+    if (!IsEndpoint(blocks[3].Value(), request.Path()))
+        return "wsa:To is not https://" + m_Hosts.Https() + request.Path();
+    if (blocks[4].Value() != action) return "wsa:Action is not " + action;
 
-    wrong = CheckToken(blocks[0]);
+    wrong = CheckToken(blocks[0], m_Clock.Now());
     if (!wrong.empty()) return wrong;
     const Node token = blocks[0].Child(kSecurity, "UsernameToken");
     const Node password = token.Child(kSecurity, "Password");
-    const std::string nonce = Unbase64(token.Child(kSecurity, "Nonce").Content());
-    const std::string created = token.Child(kUtility, "Created").Content();
+    const std::string nonce = Unbase64(Joined(token.Child(kSecurity, "Nonce").Content()));
+    const std::string created = token.Child(kUtility, "Created").Value();
     const std::string secret =
         m_Database.Text("SELECT password FROM service WHERE user = ?", {token.Child(kSecurity, "Username").Content()});
-    if (secret.empty() || password.Content() != Sha1(nonce + created + secret)) return "authentication failed";
+    if (secret.empty() || password.Value() != Sha1(nonce + created + secret)) return "authentication failed";
     if (!IsNewNonce(nonce)) return "the nonce was used before";
 
     wrong = CheckSettings(blocks[5], m_Database.Text("SELECT api_key FROM service"));
     return wrong.empty() ? CheckChildren(body, *checked.operation, checked.arguments) : wrong;
 }
+
+}  // namespace simulator

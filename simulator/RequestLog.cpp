@@ -2,6 +2,8 @@
 
 #include <cstdio>
 
+namespace simulator {
+
 namespace {
 
 std::string Quoted(const std::string& text)
@@ -37,7 +39,9 @@ std::string Line(const LoggedRequest& request)
     snprintf(numbers, sizeof numbers, "\"connection\": %lu, \"tls\": %s, \"resumed\": %s, \"time\": %.3f",
              request.connection, request.tls ? "true" : "false", request.resumed ? "true" : "false", request.time);
     return "{\"number\": " + std::to_string(request.number) + ", \"service\": " + Quoted(request.service) +
-           ", \"operation\": " + Quoted(request.operation) + ", " + numbers +
+           ", \"operation\": " + Quoted(request.operation) + ", \"method\": " + Quoted(request.method) +
+           ", \"target\": " + Quoted(request.target) + ", " + numbers +
+           ", \"proxy\": " + std::to_string(request.proxy) + ", \"credentials\": " + Quoted(request.credentials) +
            ", \"headers\": " + Pairs(request.headers) + ", \"soap\": " + Pairs(request.soap) +
            ", \"children\": " + Pairs(request.children) + ", \"fault\": " + Quoted(request.fault) +
            ", \"violation\": " + Quoted(request.violation) + "}\n";
@@ -50,26 +54,28 @@ void RequestLog::Add(LoggedRequest request)
     const std::lock_guard<std::mutex> lock(m_Mutex);
     request.number = ++m_Count;
     m_Requests.push_back(std::move(request));
+    if (m_Requests.size() > m_Most) m_Requests.pop_front();
     m_Changed.notify_all();
 }
 
 std::vector<LoggedRequest> RequestLog::All() const
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    return m_Requests;
+    return {m_Requests.begin(), m_Requests.end()};
 }
 
 void RequestLog::Clear()
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
     m_Requests.clear();
+    m_Cleared = m_Count;
 }
 
 bool RequestLog::WaitFor(size_t count) const
 {
     std::unique_lock<std::mutex> lock(m_Mutex);
-    m_Changed.wait(lock, [&] { return m_Ended || m_Requests.size() >= count; });
-    return m_Requests.size() >= count;
+    m_Changed.wait(lock, [&] { return m_Ended || m_Count - m_Cleared >= count; });
+    return m_Count - m_Cleared >= count;
 }
 
 void RequestLog::End()
@@ -86,3 +92,5 @@ std::string RequestLog::Json() const
         text += Line(request);
     return text;
 }
+
+}  // namespace simulator

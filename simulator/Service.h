@@ -9,6 +9,8 @@
 #include "Database.h"
 #include "Xml.h"
 
+namespace simulator {
+
 /// How a child of a request is checked.
 enum class ChildType {
     Int,
@@ -118,3 +120,5 @@ const std::vector<ServiceRow>& Services();
 
 /// The row of the service's operation, or null.
 const OperationRow* FindOperation(const ServiceRow& service, const std::string& name);
+
+}  // namespace simulator

@@ -1,11 +1,12 @@
 #include "SoapService.h"
 
-#include <array>
+#include "AnswerShape.h"
+#include "Namespaces.h"
+
+namespace simulator {
 
 namespace {
 
-const char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
-const char kSoap12[] = "http://www.w3.org/2003/05/soap-envelope";
 const char kXmlType[] = "text/xml; charset=utf-8";
 
 std::string Envelope(const std::string& header, const std::string& body, bool soap12)
@@ -22,17 +23,6 @@ std::string WithUnknownEnum(std::string xml)
         if (at != std::string::npos) return xml.insert(at + std::string(element).size(), "New_");
     }
     return xml;
-}
-
-// Whether the fault says that the request was not carried out.
-bool ClaimsFailure(const Fault& fault)
-{
-    static const std::array<const char*, 10> kHarmless = {
-        "", "soap12", "drip", "split", "long", "must-understand", "extra-header", "unknown-enum", "stall-body", "hold"};
-    for (const char* kind : kHarmless) {
-        if (fault.Is(kind)) return false;
-    }
-    return !fault.afterEffect;
 }
 
 }  // namespace
@@ -115,7 +105,7 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
     };
     Call call = into(xml);
     const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
-    if (ClaimsFailure(fault)) {
+    if (fault.ClaimsFailure()) {
         m_Database.Run("SAVEPOINT request");
         checked.operation->handle(call);
         m_Database.Run("ROLLBACK TO request");
@@ -135,7 +125,7 @@ HttpResponse SoapService::Respond(const CheckedRequest& checked, const Fault& fa
     if (fault.Is("fault11") || fault.Is("fault12")) return Refuse("Server", "the shop is closed", fault.Is("fault12"));
     if (fault.Is("unknown-enum")) result = WithUnknownEnum(result);
 
-    std::string body = "<" + name + "Response xmlns=\"http://api.zorvane.example/api/\">";
+    std::string body = "<" + name + "Response xmlns=\"" + kService + "\">";
     if (!fault.Is("missing-result")) body += "<" + name + "Result>" + result + "</" + name + "Result>";
     body += "</" + name + "Response>";
     std::string header;
@@ -146,7 +136,7 @@ HttpResponse SoapService::Respond(const CheckedRequest& checked, const Fault& fa
     HttpResponse response;
     response.contentType = fault.Is("soap12") ? "application/soap+xml; charset=utf-8" : kXmlType;
     response.body = Envelope(header, body, fault.Is("soap12"));
-    return response;
+    return Reshaped(std::move(response), fault);
 }
 
 HttpResponse SoapService::Refuse(const std::string& code, const std::string& text, bool soap12)
@@ -163,3 +153,5 @@ HttpResponse SoapService::Refuse(const std::string& code, const std::string& tex
     response.body = Envelope("", fault, soap12);
     return response;
 }
+
+}  // namespace simulator

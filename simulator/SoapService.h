@@ -4,10 +4,15 @@
 #include "Faults.h"
 #include "RequestCheck.h"
 
+namespace simulator {
+
 class SoapService {
 public:
-    SoapService(Database& database, std::string plainAddress, int largestPage)
-        : m_Database(database), m_Check(database), m_PlainAddress(std::move(plainAddress)), m_LargestPage(largestPage)
+    SoapService(Database& database, const Hosts& hosts, const SimulatedClock& clock, const StorefrontOptions& options)
+        : m_Database(database),
+          m_Check(database, hosts, clock, static_cast<size_t>(options.remembered)),
+          m_PlainAddress(hosts.Http()),
+          m_LargestPage(options.largestPage)
     {}
 
     /// The service behind a path, or null.
@@ -15,12 +20,11 @@ public:
 
     /// `takeFault(operation)` gives the fault to apply.
     template <class TakeFault>
-    HttpResponse Answer(const HttpRequest& request, const ServiceRow& service, const std::string& endpoint,
-                        LoggedRequest& log, TakeFault takeFault)
+    HttpResponse Answer(const HttpRequest& request, const ServiceRow& service, LoggedRequest& log, TakeFault takeFault)
     {
         CheckedRequest checked;
         log.service = service.name;
-        log.violation = m_Check.Check(request, service, endpoint, checked, log);
+        log.violation = m_Check.Check(request, service, checked, log);
         const Fault fault = takeFault(log.operation);
         return log.violation.empty() ? Respond(checked, fault) : Refuse("Client", log.violation, false);
     }
@@ -35,3 +39,5 @@ private:
     std::string m_PlainAddress;
     int m_LargestPage;
 };
+
+}  // namespace simulator

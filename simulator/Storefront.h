@@ -4,6 +4,7 @@
 // It runs on threads of its own from Start to destruction. Every member may be called from any thread.
 #pragma once
 
+#include <ctime>
 #include <functional>
 #include <map>
 #include <memory>
@@ -11,7 +12,25 @@
 #include <vector>
 
 /// What the server certificate is like. All but Good must make a careful client refuse.
-enum class CertificateKind { Good, Untrusted, Expired, WrongName, WideWildcard, NameOnly };
+enum class CertificateKind { Good, Untrusted, Expired, NotYetValid, WrongName, WideWildcard, NameOnly };
+
+/// What can be done to a kept connection while it waits for its next request.
+enum class IdleAction {
+    Write,    ///< Bytes that nobody has asked for.
+    Close,    ///< In order, with TLS's own goodbye.
+    Reset,    ///< The peer sees a broken connection.
+    Silence,  ///< Nothing more is read, so that requests are never answered.
+    Ticket,   ///< A further TLS session ticket.
+};
+/// An answer without a request, as servers send it when they have waited long enough.
+inline constexpr char kTimeoutAnswer[] =
+    "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
+
+/// When a certificate is valid, by the real clock. 0: as its kind has it.
+struct CertificateDates {
+    time_t from = 0;
+    time_t until = 0;
+};
 
 /// What the simulator accepts and knows without being told; also written to "account.txt" beside the deployment file.
 struct StorefrontAccount {
@@ -35,12 +54,18 @@ struct StorefrontOptions {
     std::string dataFolder;  ///< Database, certificates and deployment file; made when absent. Empty: a temporary one.
     int httpsPort = 0;       ///< 0: a free one.
     int httpPort = 0;
-    int latency = 0;  ///< Milliseconds before every answer.
+    int proxyPort = -1;         ///< 0: a free one; -1: there is no proxy.
+    std::string proxyUser;      ///< Whom the proxy lets through (Basic); empty: everyone.
+    std::string proxyPassword;  ///< Of that user.
+    int latency = 0;            ///< Milliseconds before every answer.
+    long long clock = 0;        ///< Seconds by which the simulator's clock is ahead of the real one.
     CertificateKind certificate = CertificateKind::Good;
-    bool oldTls = false;  ///< At most TLS 1.1.
-    bool gzip = true;     ///< Compress answers for clients that accept it.
-    int environment = 2;  ///< What discovery answers.
-    int largestPage = 0;  ///< Items that a page holds at most, whatever is asked for; 0: only the catalogue has one.
+    CertificateDates certificateDates;
+    bool oldTls = false;     ///< At most TLS 1.1.
+    bool gzip = true;        ///< Compress answers for clients that accept it.
+    int environment = 2;     ///< What discovery answers.
+    int largestPage = 0;     ///< Items that a page holds at most, whatever is asked for; 0: only the catalogue has one.
+    int remembered = 50000;  ///< Requests whose log entries, and whose nonces, are kept: the last ones.
     std::vector<std::string> faults;
     /// Called with every exchange before its answer is sent, on the thread of its connection: for tests in the same
     /// process.
@@ -49,10 +74,13 @@ struct StorefrontOptions {
 
 struct LoggedRequest {
     unsigned long number = 0;
-    std::string service;  ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart", "contract" or
-                          ///< "connect".
+    std::string service;    ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart", "contract",
+                            ///< "connect" or "proxy".
     std::string operation;  ///< SOAP operation; the service's name for the others; the prefix for box art.
-    std::vector<std::pair<std::string, std::string>> headers;  ///< HTTP headers, names in lower case.
+    std::string method;     ///< HTTP's.
+    std::string target;     ///< What stands behind it: a path and a query, a whole address, or host and port.
+    std::vector<std::pair<std::string, std::string>>
+        headers;  ///< HTTP headers, names in lower case; of Proxy-Authorization only the scheme.
     std::vector<std::pair<std::string, std::string>>
         soap;  ///< The SOAP header's: user, messageID, to, settings (the block's name), the settings' children,
                ///< AuthToken as "***", and token: "none", "current" (the one that its device was given last),
@@ -60,6 +88,8 @@ struct LoggedRequest {
     std::vector<std::pair<std::string, std::string>>
         children;  ///< The request's, in order; passwords and PINs as "***".
     unsigned long connection = 0;
+    unsigned long proxy = 0;  ///< The connection to the proxy through which it came; 0: none, it came directly.
+    std::string credentials;  ///< Those for the proxy: "right", "wrong" or "none"; empty when it asks for none.
     bool tls = false;
     bool resumed = false;   ///< TLS session resumed.
     double time = 0;        ///< Seconds since the start.
@@ -75,8 +105,12 @@ public:
 
     virtual int HttpsPort() const = 0;
     virtual int HttpPort() const = 0;
+    /// -1 when there is no proxy.
+    virtual int ProxyPort() const = 0;
     virtual std::string DataFolder() const = 0;
     virtual std::string DeploymentFile() const = 0;
+    /// One whose hosts have the client's own names, which only the proxy can find.
+    virtual std::string ProxyDeploymentFile() const = 0;
 
     /// Adds a fault in the form that HelpOnFaults tells. False, with the reason, when it is not one.
     virtual bool AddFault(const std::string& text, std::string& error) = 0;
@@ -84,12 +118,22 @@ public:
 
     virtual std::vector<LoggedRequest> Log() const = 0;
     virtual void ClearLog() = 0;
-    /// Waits until the log holds that many requests; false when the simulator ends first.
+    /// Waits until that many requests have come since the log was cleared; false when the simulator ends first.
     virtual bool WaitForRequests(size_t count) const = 0;
 
+    /// Waits until that many connections have been answered and wait for their next request; false when the simulator
+    /// ends first.
+    virtual bool WaitForIdle(size_t count) = 0;
+    /// Does it now to each of these, on whatever port, and returns when it is done: how many they were. `bytes` are
+    /// what Write writes.
+    virtual size_t ActOnIdle(IdleAction action, const std::string& bytes = kTimeoutAnswer) = 0;
+
     virtual void SetLatency(int milliseconds) = 0;
+    /// Seconds by which the clock is ahead of the real one, also negative: that of Date, of the clock service and of
+    /// how fresh a token is. Certificates stay as they are.
+    virtual void SetClock(long long seconds) = 0;
     /// Changes what the next connections see.
-    virtual void SetCertificate(CertificateKind kind) = 0;
+    virtual void SetCertificate(CertificateKind kind, const CertificateDates& dates = {}) = 0;
 
     /// The one value of a query on the database, as text: what tests compare results with.
     virtual std::string Query(const std::string& sql) const = 0;

@@ -1,6 +1,8 @@
 // The stream service: playback, and the operations that streaming devices have to themselves.
 #include "PurchaseList.h"
 
+namespace simulator {
+
 namespace {
 
 std::string EnumText(ChildType type, int number)
@@ -255,3 +257,5 @@ const Operations& StreamOperations()
     };
     return operations;
 }
+
+}  // namespace simulator

@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+namespace simulator {
+
 namespace {
 
 std::string EnumText(ChildType type, int number)
@@ -110,3 +112,5 @@ void WritePage(Call& call, int page, int perPage, int total)
     call.xml.Element("CurrentPageNumber", page).Element("ItemsPerPage", perPage);
     call.xml.Element("TotalPages", (total + perPage - 1) / perPage).Element("TotalItems", total);
 }
+
+}  // namespace simulator

@@ -3,6 +3,8 @@
 
 #include "Service.h"
 
+namespace simulator {
+
 /// Page numbers come back as xsd:short.
 constexpr int kHighestPage = 32767;
 
@@ -14,3 +16,5 @@ void WriteTitleDetails(Call& call, int title);
 void WritePurchased(Call& call, int title, int pass, int position);
 /// The four children that tell where a page stands.
 void WritePage(Call& call, int page, int perPage, int total);
+
+}  // namespace simulator

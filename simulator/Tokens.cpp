@@ -1,5 +1,7 @@
 #include "Tokens.h"
 
+namespace simulator {
+
 TokenStanding StandingOf(Database& database, const std::string& token)
 {
     if (token.empty()) return {"none", false, kFirstAccount};
@@ -30,3 +32,5 @@ void WithdrawTokens(Database& database, const std::string& device)
 {
     database.Run("UPDATE token SET withdrawn = 1 WHERE device = ?", {device});
 }
+
+}  // namespace simulator

@@ -4,6 +4,8 @@
 
 #include "Database.h"
 
+namespace simulator {
+
 /// The account whose requests carry no good token.
 constexpr int kFirstAccount = 1;
 
@@ -21,3 +23,5 @@ std::string GiveToken(Database& database, int account, const std::string& device
 
 /// None that the device was given is good any more, whoever's it was.
 void WithdrawTokens(Database& database, const std::string& device);
+
+}  // namespace simulator

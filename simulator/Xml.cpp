@@ -1,5 +1,7 @@
 #include "Xml.h"
 
+namespace simulator {
+
 std::string XmlEscape(const std::string& text)
 {
     std::string escaped;
@@ -48,3 +50,5 @@ XmlWriter& XmlWriter::Raw(const std::string& xml)
     m_Text += xml;
     return *this;
 }
+
+}  // namespace simulator

@@ -4,6 +4,8 @@
 #include <functional>
 #include <string>
 
+namespace simulator {
+
 std::string XmlEscape(const std::string& text);
 
 class XmlWriter {
@@ -27,3 +29,5 @@ public:
 private:
     std::string m_Text;
 };
+
+}  // namespace simulator

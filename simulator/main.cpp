@@ -6,7 +6,11 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "SimulatedClock.h"
 #include "Storefront.h"
+
+using simulator::ReadDateTime;
+using simulator::ReadSeconds;
 
 namespace {
 
@@ -16,6 +20,7 @@ const struct {
 } kCertificates[] = {{"good", CertificateKind::Good},
                      {"untrusted", CertificateKind::Untrusted},
                      {"expired", CertificateKind::Expired},
+                     {"not-yet-valid", CertificateKind::NotYetValid},
                      {"wrong-name", CertificateKind::WrongName},
                      {"wide-wildcard", CertificateKind::WideWildcard},
                      {"name-only", CertificateKind::NameOnly}};
@@ -38,6 +43,15 @@ bool ReadCertificate(const char* text, StorefrontOptions& options)
     return false;
 }
 
+bool ReadProxyUser(const char* text, StorefrontOptions& options)
+{
+    const char* colon = strchr(text, ':');
+    if (!colon || colon == text) return false;
+    options.proxyUser.assign(text, colon);
+    options.proxyPassword = colon + 1;
+    return true;
+}
+
 struct Option {
     const char* name;
     const char* argument;  // null: a switch
@@ -52,6 +66,10 @@ const Option kOptions[] = {
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.httpsPort); }},
     {"--http-port", "N", "port of box art, clock, bandwidth file and control (default 0: a free one)",
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.httpPort); }},
+    {"--proxy-port", "N", "also a proxy on that port, 0: a free one (default: none)",
+     [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 65535, o.proxyPort); }},
+    {"--proxy-user", "USER:PASSWORD", "whom the proxy lets through, by Basic credentials (default: everyone)",
+     ReadProxyUser},
     {"--latency", "MS", "wait before every answer",
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 600000, o.latency); }},
     {"--environment", "N", "what discovery answers, 0 to 9 (default 2: production)",
@@ -59,10 +77,22 @@ const Option kOptions[] = {
     {"--largest-page", "N",
      "items that a page holds at most, whatever is asked for (default 0: only the catalogue has one, 200)",
      [](const char* text, StorefrontOptions& o) { return ReadNumber(text, 32767, o.largestPage); }},
-    {"--certificate", "KIND", "good, untrusted, expired, wrong-name, wide-wildcard or name-only", ReadCertificate},
+    {"--clock", "SECONDS", "pretend a clock that is ahead of the real one by so many, or behind by -SECONDS",
+     [](const char* text, StorefrontOptions& o) { return ReadSeconds(text, o.clock); }},
+    {"--certificate", "KIND", "good, untrusted, expired, not-yet-valid, wrong-name, wide-wildcard or name-only",
+     ReadCertificate},
+    {"--valid-from", "TIME", "when the certificate begins to be valid, such as 2026-11-22T06:30:00Z",
+     [](const char* text, StorefrontOptions& o) { return ReadDateTime(text, o.certificateDates.from); }},
+    {"--valid-until", "TIME", "when it ends to be valid",
+     [](const char* text, StorefrontOptions& o) { return ReadDateTime(text, o.certificateDates.until); }},
     {"--old-tls", nullptr, "TLS 1.1 at most", [](const char*, StorefrontOptions& o) { return o.oldTls = true; }},
     {"--no-gzip", nullptr, "never compress answers",
      [](const char*, StorefrontOptions& o) { return !(o.gzip = false); }},
+    {"--remember", "N",
+     "requests that are remembered, the last ones: in the log, and that their nonces do not come again (default 50000)",
+     [](const char* text, StorefrontOptions& o) {
+         return ReadNumber(text, 100000000, o.remembered) && o.remembered > 0;
+     }},
     {"--fault", "SPEC", "a fault, see below; may be given again",
      [](const char* text, StorefrontOptions& o) { return o.faults.emplace_back(text), true; }},
 };
@@ -71,9 +101,9 @@ void PrintHelp()
 {
     printf("zv_storefront: the storefront's services on this machine.\n\nOptions:\n");
     for (const Option& option : kOptions) {
-        printf("  %-14s %-5s %s\n", option.name, option.argument ? option.argument : "", option.help);
+        printf("  %-14s %-14s %s\n", option.name, option.argument ? option.argument : "", option.help);
     }
-    printf("  %-14s %-5s %s\n\n", "--help", "", "this text");
+    printf("  %-14s %-14s %s\n\n", "--help", "", "this text");
     printf(
         "Account: user \"%s\", password \"%s\", API key \"%s\", adult PIN %s, activation PIN %s (000000 locks out), "
         "gift\n"
@@ -86,13 +116,39 @@ void PrintHelp()
         "deactivated, it is answered for the first. How the token stands is in the log, the token is not.\n\n",
         StorefrontAccount::kUser, StorefrontAccount::kPassword, StorefrontAccount::kApiKey,
         StorefrontAccount::kAdultPin, StorefrontAccount::kActivationPin, StorefrontAccount::kSecondActivationPin);
+    printf(
+        "The proxy tunnels (CONNECT) to every host and port, and takes plain requests with their whole address. It "
+        "finds\n"
+        "the services under the client's own names for them: \"behind-proxy.conf\" in the data folder is a deployment "
+        "that\n"
+        "works through it alone. Its requests are in the log with their method, target and how their credentials "
+        "stand;\n"
+        "every other request with the proxy's connection that it came through, 0 when it came directly.\n\n");
     printf("%s\n", Storefront::HelpOnFaults().c_str());
     printf(
         "Contract, on the HTTPS port: GET /api/NAME.asmx?wsdl (RealTimeBrowse, DownloadAPI, StreamAPI), and the "
         "schemas it\n"
         "imports beside it. docs/contract.md tells the rest.\n\n"
         "Control, on the plain HTTP port: POST /control/faults (a fault a line), GET and DELETE /control/faults,\n"
-        "GET /control/log (a JSON object a line), DELETE /control/log.\n\n"
+        "GET /control/log (a JSON object a line), DELETE /control/log, GET and POST /control/clock (seconds, as with\n"
+        "--clock), POST /control/idle: what to do now to each kept connection that waits for its next request, "
+        "\"close\",\n"
+        "\"reset\", \"silence\" (answer nothing more), \"ticket\" (a late TLS session ticket) or \"write\", with the "
+        "bytes on\n"
+        "the next lines (an answer of 408); it says how many these were. Date, the clock service and how fresh a token "
+        "is\n"
+        "follow the clock; certificates do not.\n\n"
+        "Every spelling of a request that the standards allow is taken: chunks, prefixes of any name, white space "
+        "around\n"
+        "numbers, times with fractions and zones, a charset in any case or none, a wsu:Timestamp, 100-continue. "
+        "Stricter\n"
+        "than the standards, since players send it so: POST with a user agent, UTF-8, SOAPAction in quotes, no "
+        "document\n"
+        "type declaration; the header blocks are those six, in their order, each with its mustUnderstand; "
+        "wsa:MessageID is\n"
+        "\"uuid:\" and the operation; the token's wsu:Id is \"User\", with name, digest, nonce and time in this order; "
+        "a\n"
+        "time has a zone and lies at most 300 s off; children stand in the contract's order.\n\n"
         "Not checked: which device asks (any DestinationUniqueID and type will do), whether it is activated before it "
         "buys,\n"
         "which device a token was given to, the user agent's text, unused namespace declarations, and anything behind\n"
@@ -145,8 +201,13 @@ int main(int argc, char** argv)
         fprintf(stderr, "zv_storefront: %s\n", error.c_str());
         return 1;
     }
-    printf("https port %d\nhttp port %d\ndeployment file %s\nready\n", storefront->HttpsPort(), storefront->HttpPort(),
+    printf("https port %d\nhttp port %d\ndeployment file %s\n", storefront->HttpsPort(), storefront->HttpPort(),
            storefront->DeploymentFile().c_str());
+    if (storefront->ProxyPort() >= 0) {
+        printf("proxy port %d\nproxy deployment file %s\n", storefront->ProxyPort(),
+               storefront->ProxyDeploymentFile().c_str());
+    }
+    printf("ready\n");
     fflush(stdout);
     int received;
     sigwait(&ends, &received);

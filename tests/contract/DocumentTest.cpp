@@ -180,7 +180,7 @@ TEST_F(Document, Failures)
 TEST_F(Document, Addresses)
 {
     std::string table = "| service | its address ends with | WSDL | its settings block |\n|---|---|---|---|\n";
-    for (const ServiceRow& service : Services()) {
+    for (const simulator::ServiceRow& service : simulator::Services()) {
         const std::string path = service.path;
         const std::string wsdl = path.substr(0, path.find('.')) + ".wsdl";
         EXPECT_TRUE(std::filesystem::exists(ZV_CONTRACT + wsdl));

@@ -9,6 +9,8 @@
 
 namespace {
 
+using simulator::Gzip;
+
 typedef _ZV1__getTitleListingResponse Response;
 
 ZVString Bytes(const std::string& text)

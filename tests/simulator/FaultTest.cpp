@@ -61,6 +61,12 @@ TEST_F(FaultTest, AreConsumedInOrderAndForgotten)
     EXPECT_EQ("getTitleListing=http:503,count=1\ngetTitleListing=code:3,count=1\n", Plain("/control/faults").body);
     EXPECT_EQ(503, Titles().status);
     EXPECT_EQ("3", Titles().Element("ResponseCode"));
+    for (const auto& [order, after] : {std::pair<const char*, const char*>("http:503,retry=30", "30"),
+                                       {"http:503", ""},
+                                       {"http:429,retry=0", "0"}}) {
+        Order(std::string("getTitleListing=") + order);
+        EXPECT_EQ(after, Titles().Header("Retry-After")) << order;
+    }
     EXPECT_EQ("0", Titles().Element("ResponseCode"));
     Order("getTitleListing=cut");
     EXPECT_EQ(200, Plain("/control/faults", "", "DELETE").status);
@@ -79,6 +85,7 @@ TEST_F(FaultTest, OrdersThatMakeNoSenseAreRefusedWithTheReason)
         {"getTitleListing=code:x", "no number"},
         {"getTitleListing=http:99", "from 200 to 599"},
         {"getTitleListing=cut,count=0", "expected"},
+        {"getTitleListing=cut,retry=5", "expected"},
         {"getTitleListing=not-modified", "cannot happen"},
         {"getNavigation=code:1", "no response code"},
     };

@@ -6,6 +6,7 @@
 #include <openssl/evp.h>
 #include <openssl/sha.h>
 #include <openssl/ssl.h>
+#include <poll.h>
 
 #include <csignal>
 #include <cstring>
@@ -56,9 +57,58 @@ public:
     RawClient(const RawClient&) = delete;
     RawClient& operator=(const RawClient&) = delete;
 
+    /// A TLS handshake on the connection as it is, whose certificate must be the authority's, for the name, and valid
+    /// at that time (0: now).
+    bool StartTls(const std::string& name, const std::string& authorityFile, time_t when = 0)
+    {
+        SSL_CTX_load_verify_locations(m_Context, authorityFile.c_str(), nullptr);
+        SSL_CTX_set_verify(m_Context, SSL_VERIFY_PEER, nullptr);
+        BIO* tls = BIO_new_ssl(m_Context, 1);
+        SSL* ssl = nullptr;
+        BIO_get_ssl(tls, &ssl);
+        SSL_set1_host(ssl, name.c_str());
+        if (when) X509_VERIFY_PARAM_set_time(SSL_get0_param(ssl), when);
+        m_Bio = BIO_push(tls, m_Bio);
+        return BIO_do_handshake(m_Bio) == 1;
+    }
     bool Send(const std::string& bytes)
     {
         return BIO_write(m_Bio, bytes.data(), static_cast<int>(bytes.size())) == static_cast<int>(bytes.size());
+    }
+    /// One answer with a length, or without a body (`head`); what comes behind it stays. Status 0 when it is not whole.
+    Reply ReceiveOne(bool head = false)
+    {
+        Reply reply;
+        while (reply.head.size() < 4 || reply.head.compare(reply.head.size() - 4, 4, "\r\n\r\n") != 0) {
+            if (!Append(reply.head, 1)) return {0, reply.head};
+        }
+        reply.head.resize(reply.head.size() - 2);
+        const size_t length = head ? 0 : strtoul(reply.Header("Content-Length").c_str(), nullptr, 10);
+        if (!Append(reply.body, length)) return {0, reply.head, reply.body};
+        reply.status = atoi(reply.head.c_str() + strlen("HTTP/1.1 "));
+        return reply;
+    }
+    /// Waits for the end, before which nothing may come: false when it is a broken connection.
+    bool EndsInOrder()
+    {
+        char byte;
+        const bool ended = BIO_read(m_Bio, &byte, 1) <= 0;
+        SSL* const ssl = Tls();
+        return ended && (ssl ? (SSL_get_shutdown(ssl) & SSL_RECEIVED_SHUTDOWN) != 0 : BIO_eof(m_Bio) != 0);
+    }
+    /// Whether anything has come and waits, the end included.
+    bool HasBytes()
+    {
+        pollfd entry = {static_cast<int>(BIO_get_fd(m_Bio, nullptr)), POLLIN, 0};
+        return BIO_pending(m_Bio) > 0 || poll(&entry, 1, 0) > 0;
+    }
+    /// The TLS session ticket that came last.
+    std::string Ticket()
+    {
+        const unsigned char* ticket = nullptr;
+        size_t size = 0;
+        SSL_SESSION_get0_ticket(SSL_get0_session(Tls()), &ticket, &size);
+        return std::string(ticket, ticket + size);
     }
     /// All that comes; requests ask for the connection's end.
     Reply Receive()
@@ -73,6 +123,25 @@ public:
     }
 
 private:
+    SSL* Tls()
+    {
+        SSL* ssl = nullptr;
+        BIO_get_ssl(m_Bio, &ssl);
+        return ssl;
+    }
+    // False when the connection ends before `count` bytes have come.
+    bool Append(std::string& text, size_t count)
+    {
+        const size_t before = text.size();
+        text.resize(before + count);
+        for (size_t at = before; at < text.size();) {
+            const int size = BIO_read(m_Bio, &text[at], static_cast<int>(text.size() - at));
+            if (size <= 0) return text.resize(at), false;
+            at += static_cast<size_t>(size);
+        }
+        return true;
+    }
+
     SSL_CTX* m_Context = SSL_CTX_new(TLS_client_method());
     BIO* m_Bio = nullptr;
 };
@@ -94,18 +163,23 @@ struct SoapRequest {
     std::string base = "/api/";  ///< what the path begins with
     std::string password = "secret";
     long long created_offset = 0;  ///< seconds from now
-    std::string nonce = {};        ///< of one's own; else a fresh one
-    std::string token = {};        ///< from "authorizeDevice"
+    long long created_zone = 0;    ///< seconds by which the time is ahead of UTC, which `created_end` then says
+    std::string created_end = "Z";
+    std::string nonce = {};  ///< of one's own; else a fresh one
+    std::string token = {};  ///< from "authorizeDevice"
     std::string device = "desktop-player";
+    std::string host = {};  ///< of the address, and its port; else that of this machine
 
+    std::string Authority(int port) const { return host.empty() ? "localhost:" + std::to_string(port) : host; }
     std::string Envelope(int port) const
     {
         static int s_Count;
         const std::string bytes = nonce.empty() ? "number " + std::to_string(++s_Count) : nonce;
-        const time_t when = time(nullptr) + created_offset;
+        const time_t when = time(nullptr) + created_offset + created_zone;
         tm parts{};
-        char created[32];
-        strftime(created, sizeof created, "%Y-%m-%dT%H:%M:%SZ", gmtime_r(&when, &parts));
+        char seconds[32];
+        strftime(seconds, sizeof seconds, "%Y-%m-%dT%H:%M:%S", gmtime_r(&when, &parts));
+        const std::string created = seconds + created_end;
         const std::string digested = bytes + created + password;
         std::string digest(SHA_DIGEST_LENGTH, '\0');
         SHA1(reinterpret_cast<const unsigned char*>(digested.data()), digested.size(),
@@ -126,10 +200,9 @@ struct SoapRequest {
                Base64(bytes) + "</s:Nonce><u:Created>" + created +
                "</u:Created></s:UsernameToken></s:Security><a:MessageID>uuid:" + operation +
                R"(</a:MessageID><a:ReplyTo e:mustUnderstand="1"><a:Address>)" + addressing +
-               R"(/role/anonymous</a:Address></a:ReplyTo><a:To e:mustUnderstand="true">https://localhost:)" +
-               std::to_string(port) + base + service +
-               R"(.asmx</a:To><a:Action e:mustUnderstand="1">http://api.zorvane.example/api/)" + operation +
-               "</a:Action><z:" + block +
+               R"(/role/anonymous</a:Address></a:ReplyTo><a:To e:mustUnderstand="true">https://)" + Authority(port) +
+               base + service + R"(.asmx</a:To><a:Action e:mustUnderstand="1">http://api.zorvane.example/api/)" +
+               operation + "</a:Action><z:" + block +
                R"( e:mustUnderstand="1"><z:APIKey>desktop</z:APIKey><z:DestinationUniqueID>)" + device +
                "</z:DestinationUniqueID><z:DestinationTypeID>48</z:DestinationTypeID>" +
                (token.empty() ? "" : "<z:AuthToken>" + token + "</z:AuthToken>") + "</z:" + block +
@@ -137,7 +210,7 @@ struct SoapRequest {
     }
     std::string Head(int port, size_t length) const
     {
-        return "POST " + base + service + ".asmx HTTP/1.1\r\nHost: localhost:" + std::to_string(port) +
+        return "POST " + base + service + ".asmx HTTP/1.1\r\nHost: " + Authority(port) +
                "\r\nConnection: close\r\nUser-Agent: raw\r\nContent-Type: text/xml; charset=utf-8\r\nContent-Length: " +
                std::to_string(length) + "\r\nSOAPAction: \"http://api.zorvane.example/api/" + operation + "\"\r\n\r\n";
     }

@@ -51,6 +51,7 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
     } rows[] = {
         {"POST ", "PUT ", "not POST"},
         {"text/xml; charset=utf-8", "application/soap+xml; charset=utf-8", "content type"},
+        {"charset=utf-8", "charset=iso-8859-1", "content type"},
         {"User-Agent: raw\r\n", "", "no user agent"},
         {"SOAPAction: \"", "X-Action: \"", "SOAPAction"},
         {"e=\"http://schemas.xmlsoap.org/soap/envelope/\"", "e=\"http://www.w3.org/2003/05/soap-envelope\"",
@@ -62,6 +63,12 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
         {"u:Id=\"User\"", "u:Id=\"user\"", "wsu:Id"},
         {"<s:Username>customer", "<s:Username>nobody", "authentication failed"},
         {"</s:Username>", "</s:Username><s:Extra/>", "user-name token"},
+        {"<s:UsernameToken", "<u:Timestamp><u:Expires>2010-01-01T00:00:00Z</u:Expires></u:Timestamp><s:UsernameToken",
+         "the message has expired"},
+        {"<s:UsernameToken", "<u:Timestamp><u:Created>2100-01-01T00:00:00Z</u:Created></u:Timestamp><s:UsernameToken",
+         "later than now"},
+        {"<s:UsernameToken", "<u:Timestamp><u:Created>today</u:Created></u:Timestamp><s:UsernameToken", "no time"},
+        {"<s:UsernameToken", "<u:Timestamp/><u:Timestamp/><s:UsernameToken", "user-name token"},
         {"#PasswordDigest", "#PasswordText", "no digest"},
         {"#Base64Binary", "#HexBinary", "Base64Binary"},
         {"<a:MessageID>uuid:getTitles", "<a:MessageID>getTitles", "MessageID"},
@@ -76,6 +83,8 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
         {"<z:APIKey>desktop</z:APIKey>", "<z:AuthToken>t</z:AuthToken><z:APIKey>desktop</z:APIKey>", "out of order"},
         {"<z:GenreID>1<", "<z:GenreID>one<", "no xsd:int"},
         {"<z:GenreID>1<", "<z:GenreID>99999999999<", "no xsd:int"},
+        {"<z:GenreID>1<", "<z:GenreID>--1<", "no xsd:int"},
+        {"<z:GenreID>1<", "<z:GenreID>1 2<", "no xsd:int"},
         {"<z:PurchaseType>any", "<z:PurchaseType>Any", "PurchaseType has no value \"Any\""},
         {"<z:PurchaseType>any</z:PurchaseType>", "", "PurchaseType is missing"},
         {"</z:PurchaseType>", "</z:PurchaseType><z:Extra/>", "Extra is not expected"},
@@ -103,6 +112,137 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
         EXPECT_NE(std::string::npos, LastLogged().violation.find(row.reason)) << LastLogged().violation;
         EXPECT_NE(std::string::npos, reply.body.find("<faultstring>"));
     }
+}
+
+// Each row changes what is sent in a way that the standards leave open.
+TEST_F(RequestCheckTest, EverySpellingOfTheStandardsIsTaken)
+{
+    const std::pair<const char*, const char*> rows[] = {
+        {"POST /", "\r\nPOST /"},
+        {"POST /", "POST https://localhost/"},
+        {"Host: ", "HOST:\t"},
+        {"text/xml; charset=utf-8", "Text/XML;charset=UTF-8"},
+        {"text/xml; charset=utf-8", "text/xml ; action=x ; charset=\"utf-8\" \t"},
+        {"text/xml; charset=utf-8", "text/xml"},
+        {"<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n", ""},
+        {"<?xml version=\"1.0\" encoding=\"UTF-8\"?>", "\xef\xbb\xbf<?xml version='1.0'?>"},
+        {"encoding=\"UTF-8\"", "encoding=\"ISO-8859-1\""},
+        {"<e:Header>", "\n<!-- who -->\n<e:Header>"},
+        {"e:mustUnderstand=\"1\"", "e:mustUnderstand='true'"},
+        {"<a:MessageID>", "<a:MessageID e:mustUnderstand=\"0\">"},
+        {"<a:MessageID>uuid:getTitlesByNavigation<", "<a:MessageID>\n uuid:getTitlesByNavigation\n<"},
+        {"/role/anonymous<", "/role/anonymous\n<"},
+        {"<s:UsernameToken", "<u:Timestamp u:Id=\"t\"/><s:UsernameToken"},
+        {"</s:UsernameToken>",
+         "</s:UsernameToken><u:Timestamp><u:Created>2020-02-29T24:00:00.5-09:30</u:Created>"
+         "<u:Expires> 2100-01-01T00:00:00Z </u:Expires></u:Timestamp>"},
+        {"</s:Password>", "\n</s:Password>"},
+        {"<u:Created>", "<u:Created>\n\t"},
+        {"<z:DestinationTypeID>48<", "<z:DestinationTypeID> +48 <"},
+        {"<z:GenreID>1<", "<z:GenreID>\n\t&#x31; <"},
+        {"<z:GenreID>1<", "<z:GenreID><![CDATA[1]]><"},
+        {"<z:GenreID>1</z:GenreID>", "<q:GenreID xmlns:q='http://api.zorvane.example/api/'>1</q:GenreID>"},
+        {"<z:GenreID>", "<!-- genre --><z:GenreID xmlns:i=\"http://www.w3.org/2001/XMLSchema-instance\" i:type='x'>"},
+    };
+    const int port = store->HttpsPort();
+    for (const auto& [from, to] : rows) {
+        SCOPED_TRACE(to);
+        std::string envelope = Titles().Envelope(port);
+        if (envelope.find(from) != std::string::npos) Replace(envelope, from, to);
+        std::string head = Titles().Head(port, envelope.size());
+        if (head.find(from) != std::string::npos) Replace(head, from, to);
+        ASSERT_TRUE(head.find(to) != std::string::npos || envelope.find(to) != std::string::npos);
+        EXPECT_EQ(200, SendText(head + envelope).status);
+        EXPECT_EQ("", LastLogged().violation);
+        EXPECT_EQ("getTitlesByNavigation", LastLogged().operation);
+    }
+}
+
+TEST_F(RequestCheckTest, EveryTimeWithAZoneIsTaken)
+{
+    const struct {
+        long long zone;
+        const char* end;
+        const char* violation;
+    } rows[] = {{0, ".123456Z", ""},
+                {7200, "+02:00", ""},
+                {-12600, ".5-03:30", ""},
+                {0, "+00:00", ""},
+                {50400, "+14:00", ""},
+                {0, "", "the token is not fresh"},
+                {0, ".Z", "the token is not fresh"},
+                {7200, "Z", "the token is not fresh"},
+                {0, "+02:00", "the token is not fresh"},
+                {0, "+0200", "the token is not fresh"}};
+    for (const auto& row : rows) {
+        SoapRequest request = Titles();
+        request.created_zone = row.zone;
+        request.created_end = row.end;
+        Send(request);
+        EXPECT_EQ(row.violation, LastLogged().violation) << row.end;
+    }
+}
+
+// A body in chunks, however they are cut, and one that waits to be asked for.
+TEST_F(RequestCheckTest, BodiesComeAsHttpHasThem)
+{
+    const int port = store->HttpsPort();
+    const std::string envelope = Titles().Envelope(port);
+    std::string head = Titles().Head(port, 0);
+    Replace(head, "Content-Length: 0\r\n", "Transfer-Encoding: Chunked\r\nExpect: 100-Continue\r\n");
+    RawClient client(port, true);
+    ASSERT_TRUE(client.Send(head));
+    EXPECT_EQ(100, client.ReceiveOne(true).status);
+    std::string chunks;
+    for (size_t at = 0, size = 1; at < envelope.size(); at += size, size += 7) {
+        char line[32];
+        snprintf(line, sizeof line, at % 2 ? "%zX;name=\"value\"\r\n" : "%zx \r\n",
+                 std::min(size, envelope.size() - at));
+        chunks += line + envelope.substr(at, size) + "\r\n";
+    }
+    chunks += "000\r\nX-Trailer: 1\r\n\r\n";
+    for (size_t at = 0; at < chunks.size(); at += 500)
+        ASSERT_TRUE(client.Send(chunks.substr(at, 500)));
+    EXPECT_EQ(200, client.Receive().status);
+    EXPECT_EQ("", LastLogged().violation);
+
+    for (const char* wrong : {"Transfer-Encoding: chunked\r\n\r\nx\r\n", "Transfer-Encoding: gzip\r\n\r\n",
+                              "Transfer-Encoding: chunked\r\n\r\n1\r\nab\r\n", "Content-Length: -1\r\n\r\n",
+                              "Content-Length: 2000000\r\n\r\n", "no header\r\n\r\n"}) {
+        EXPECT_EQ(0, SendText(std::string("POST /api/StreamAPI.asmx HTTP/1.1\r\n") + wrong).status) << wrong;
+        EXPECT_EQ("no whole HTTP request", LastLogged().violation) << wrong;
+    }
+}
+
+// Which answers end their connection, and which have no body or are not compressed.
+TEST_F(RequestCheckTest, ConnectionsEndWhenTheRequestSaysSo)
+{
+    const struct {
+        const char* request;
+        bool ends;
+    } rows[] = {{"GET /device/time/ HTTP/1.1\r\n", false},
+                {"GET /device/time/ HTTP/1.1\r\nConnection: TE, Close\r\n", true},
+                {"GET /device/time/ HTTP/1.0\r\n", true},
+                {"GET /device/time/ HTTP/1.0\r\nConnection: Keep-Alive\r\n", false}};
+    for (const auto& row : rows) {
+        RawClient client(store->HttpPort(), false);
+        ASSERT_TRUE(client.Send(std::string(row.request) + "\r\n"));
+        EXPECT_EQ(row.ends ? "close" : "keep-alive", client.ReceiveOne().Header("Connection")) << row.request;
+        if (row.ends) {
+            EXPECT_EQ("", client.Receive().head) << row.request;
+        }
+    }
+    const Reply head = Plain("/bandwidth/test.bin", "", "HEAD");
+    EXPECT_EQ("1000000", head.Header("Content-Length"));
+    EXPECT_EQ("", head.body);
+    for (const auto& [accepted, coding] : {std::pair<const char*, const char*>("GZIP ; q=0.5", "gzip"),
+                                           {"deflate, *", "gzip"},
+                                           {"gzip;q=0, deflate", ""},
+                                           {"x-gzipped", ""}})
+        EXPECT_EQ(
+            coding,
+            Plain("/device/time/", std::string("Accept-Encoding: ") + accepted + "\r\n").Header("Content-Encoding"))
+            << accepted;
 }
 
 TEST_F(RequestCheckTest, TheOtherServicesBlocksAndOperationsAreRefused)
@@ -149,6 +289,33 @@ TEST_F(RequestCheckTest, ATokenIsGoodOnceAndNotForLong)
         EXPECT_EQ(*row.violation ? 500 : 200, Send(request).status) << row.offset;
         EXPECT_EQ(row.violation, LastLogged().violation) << row.offset;
     }
+}
+
+TEST_F(RequestCheckTest, OnlyTheLastRequestsAreRemembered)
+{
+    StorefrontOptions options;
+    options.remembered = 3;
+    Begin(options);
+    const auto ask = [&](const char* nonce) {
+        SoapRequest request = Titles();
+        request.nonce = nonce;
+        Send(request);
+        return LastLogged().violation;
+    };
+    for (const char* nonce : {"a", "b", "c"})
+        EXPECT_EQ("", ask(nonce));
+    EXPECT_EQ("the nonce was used before", ask("a"));
+    EXPECT_EQ("", ask("d")) << "a is forgotten";
+    EXPECT_EQ("", ask("a"));
+    EXPECT_EQ("the nonce was used before", ask("d"));
+    const auto log = store->Log();
+    ASSERT_EQ(3u, log.size());
+    EXPECT_EQ(5u, log[0].number);
+    EXPECT_TRUE(store->WaitForRequests(7));
+    store->ClearLog();
+    ask("e");
+    EXPECT_TRUE(store->WaitForRequests(1));
+    EXPECT_EQ(8u, store->Log().at(0).number);
 }
 
 TEST_F(RequestCheckTest, OptionalChildrenMayBeLeftOutAndStagingHasAPathOfItsOwn)

@@ -91,7 +91,7 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
     const TempFolder old;
     const auto tables = [&] {
         std::string error;
-        return Database::Open(old / "storefront.db", error);
+        return simulator::Database::Open(old / "storefront.db", error);
     };
     tables()->Run("CREATE TABLE account (user TEXT)");
     tables()->Run("PRAGMA user_version = 1");
@@ -104,9 +104,13 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
                 {{"--latency", "soon"}, 2, "--latency needs MS"},
                 {{"--https-port", "65536"}, 2, "--https-port needs N"},
                 {{"--largest-page", "-1"}, 2, "--largest-page needs N"},
+                {{"--proxy-user", ":secret"}, 2, "--proxy-user needs USER:PASSWORD"},
                 {{"--certificate", "bad"}, 2, "--certificate needs KIND"},
+                {{"--clock", "1h"}, 2, "--clock needs SECONDS"},
+                {{"--valid-from", "2026-02-29T00:00:00Z"}, 2, "--valid-from needs TIME"},
                 {{"--fault", "getConfig=sever"}, 1, "sever"},
                 {{"--http-port", taken}, 1, "port " + taken},
+                {{"--proxy-port", taken}, 1, "port " + taken},
                 {{"--data", "/proc/storefront"}, 1, "/proc/storefront"},
                 {{"--data", old / ""}, 1, "storefront.db: has tables of version 1"}};
     for (const auto& row : rows) {

@@ -1,0 +1,12 @@
+// The namespaces of messages.
+#pragma once
+
+namespace simulator {
+
+inline constexpr char kSoap11[] = "http://schemas.xmlsoap.org/soap/envelope/";
+inline constexpr char kSoap12[] = "http://www.w3.org/2003/05/soap-envelope";
+inline constexpr char kService[] = "http://api.zorvane.example/api/";
+inline constexpr char kSchema[] = "http://www.w3.org/2001/XMLSchema";
+inline constexpr char kSchemaInstance[] = "http://www.w3.org/2001/XMLSchema-instance";
+
+}  // namespace simulator

@@ -1,0 +1,90 @@
+#include "XmlNode.h"
+
+#include "Http.h"
+
+namespace simulator {
+
+namespace {
+
+const char* Text(const xmlChar* text)
+{
+    return reinterpret_cast<const char*>(text);
+}
+
+// Takes what the parser has allocated.
+std::string Taken(xmlChar* text)
+{
+    const std::unique_ptr<xmlChar, void (*)(void*)> owned(text, xmlFree);
+    return owned ? Text(owned.get()) : "";
+}
+
+}  // namespace
+
+Document ReadXml(const std::string& text, const char* encoding)
+{
+    return {xmlReadMemory(text.data(), static_cast<int>(text.size()), nullptr, encoding,
+                          XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING),
+            xmlFreeDoc};
+}
+
+std::string Node::Name() const
+{
+    return m_Node ? Text(m_Node->name) : "";
+}
+
+std::string Node::Namespace() const
+{
+    return m_Node && m_Node->ns ? Text(m_Node->ns->href) : "";
+}
+
+std::vector<Node> Node::Children() const
+{
+    std::vector<Node> children;
+    for (xmlNodePtr child = m_Node ? m_Node->children : nullptr; child; child = child->next) {
+        if (child->type == XML_ELEMENT_NODE) children.emplace_back(child);
+    }
+    return children;
+}
+
+Node Node::Child(const char* space, const char* name) const
+{
+    for (const Node& child : Children()) {
+        if (child.Is(space, name)) return child;
+    }
+    return Node();
+}
+
+std::string Node::Content() const
+{
+    return m_Node ? Taken(xmlNodeGetContent(m_Node)) : "";
+}
+
+std::string Node::Value() const
+{
+    return Trimmed(Content());
+}
+
+bool Node::HasText() const
+{
+    for (xmlNodePtr child = m_Node ? m_Node->children : nullptr; child; child = child->next) {
+        if (child->type != XML_ELEMENT_NODE && child->type != XML_COMMENT_NODE && !xmlIsBlankNode(child)) return true;
+    }
+    return false;
+}
+
+std::string Node::Attribute(const char* name, const char* space) const
+{
+    const auto* n = reinterpret_cast<const xmlChar*>(name);
+    return Taken(space ? xmlGetNsProp(m_Node, n, reinterpret_cast<const xmlChar*>(space)) : xmlGetNoNsProp(m_Node, n));
+}
+
+std::vector<std::pair<std::string, std::string>> Node::Attributes() const
+{
+    std::vector<std::pair<std::string, std::string>> attributes;
+    for (const xmlAttr* one = m_Node ? m_Node->properties : nullptr; one; one = one->next) {
+        if (!one->ns) attributes.emplace_back(Text(one->name), Attribute(Text(one->name), nullptr));
+    }
+    return attributes;
+}
+
+}  // namespace simulator
