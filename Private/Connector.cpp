@@ -298,7 +298,10 @@ int OpenTunnel(int socket, const ZVString& host, int port, const Proxy& proxy, c
     if (!asked || !ReceiveHead(socket, head, patience)) return -1;
     const int status = StatusOf(head);
     if (status < 200 || status > 299) return status;
-    return head.find("\r\n\r\n") + 4 == head.size() ? 0 : -1;
+    char behind;
+    const bool isAll =
+        head.find("\r\n\r\n") + 4 == head.size() && recv(socket, &behind, 1, MSG_PEEK | MSG_DONTWAIT) <= 0;
+    return isAll ? 0 : -1;
 }
 
 SSL* OpenTls(SSL_CTX* context, int socket, const ZVString& host, SSL_SESSION* resumed, time_t now,
