@@ -1,6 +1,10 @@
 #include <gtest/gtest.h>
+#include <unistd.h>
 
+#include <atomic>
 #include <string>
+#include <thread>
+#include <vector>
 
 #include "TempFolder.h"
 #include "ZVFile.h"
@@ -59,6 +63,28 @@ TEST(FileTest, MakesEveryFolderOfAPath)
         EXPECT_EQ(row.made && std::string(row.path) != "file", ZVFile::FolderExist(path.c_str())) << row.path;
     }
     EXPECT_FALSE(ZVFile::CreateFolder(""));
+}
+
+// Instances that start at once on a folder that none of them finds.
+TEST(FileTest, MakesAFolderThatOthersMakeAtTheSameTime)
+{
+    const TempFolder folder;
+    const int kTogether = 4;
+    for (int round = 0; round < 200; ++round) {
+        const std::string path = folder / (std::to_string(round) + "/a/b/c");
+        std::atomic<int> ready{0}, made{0};
+        std::vector<std::thread> threads;
+        for (int i = 0; i < kTogether; ++i) {
+            threads.emplace_back([&] {
+                for (++ready; ready < kTogether;)
+                    std::this_thread::yield();
+                made += ZVFile::CreateFolder(path.c_str()) ? 1 : 0;
+            });
+        }
+        for (std::thread& thread : threads)
+            thread.join();
+        ASSERT_EQ(kTogether, made) << round;
+    }
 }
 
 TEST(FileTest, RemovesByWildcard)
