@@ -123,6 +123,38 @@ TEST(FileTest, CopiesAndRenames)
     EXPECT_FALSE(ZVFile::Rename((folder / "from").c_str(), (folder / "to").c_str()));
 }
 
+TEST(FileTest, AFileCopiedOntoItselfStays)
+{
+    const TempFolder folder;
+    const std::string file = folder.Write("file", "content");
+    ASSERT_EQ(0, symlink("file", (folder / "link").c_str()));
+    ASSERT_EQ(0, link(file.c_str(), (folder / "name").c_str()));
+    for (const std::string from : {"file", "link", "name"}) {
+        for (const std::string to : {"file", "link", "name", "./file"}) {
+            EXPECT_TRUE(ZVFile::CopyFile((folder / from).c_str(), (folder / to).c_str())) << from << " " << to;
+            EXPECT_EQ("content", ContentOf(file)) << from << " " << to;
+        }
+    }
+}
+
+// An image on its way into the cache.
+TEST(FileTest, ATemporaryFileIsWrittenWhateverItsNameBecomes)
+{
+    const TempFolder folder;
+    const std::string other = folder.Write("other", "untouched");
+    ZVFile file;
+    ZVString name;
+    ASSERT_TRUE(file.OpenTemporary((folder / "target").c_str(), name));
+    EXPECT_EQ(0600, static_cast<int>(std::filesystem::status(name.c_str()).permissions()));
+    ASSERT_EQ(0, unlink(name.c_str()));
+    ASSERT_EQ(0, symlink("other", name.c_str()));
+    EXPECT_EQ(3, file.Write("new", 3));
+    EXPECT_TRUE(file.Flush());
+    EXPECT_EQ("untouched", ContentOf(other));
+    EXPECT_FALSE(file.OpenTemporary((folder / "none/target").c_str(), name));
+    EXPECT_TRUE(name.empty());
+}
+
 TEST(FileDeathTest, NullsAndPatternsWithoutWildcardStop)
 {
     EXPECT_DEATH(ZVFile().Open(nullptr, "r"), "Private/ZVFile.cpp.*\"filename != 0\"");
