@@ -780,7 +780,10 @@ ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime);
 /// file_not_found_on_server; failed_to_get_bandwidth_check_url and invalid_bandwidth_check_url for the address.
 ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSecond);
 
-/// The device's IPv4 address as text: its only one, or that of a connection to the service.
+/// The device's address as text, IPv4 or IPv6, on its way to the service or, where there is one, to the proxy; never a
+/// loopback address. Asks neither the network nor a name server and does not block: the way is that of the session's
+/// last connection, else that to the addresses already known of the service's name, else, as long as nothing is known
+/// of it or when it is on this device, the default route. ZV_WS_Status_net_error when no way leaves the device.
 ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address);
 
 // ---- Files. ZV_WS_Status_invalid_param for a null path, ZV_WS_Status_file_operation_error when the operation fails.
