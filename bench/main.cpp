@@ -102,6 +102,7 @@ const struct {
     {"Tick while box art is fetched, longest", "tick/longest", "the limit", "=1000", 1, false},
     {"First page from process start", "start/page", "process start alone", "start/nothing", 0, false},
     {"New session and its first page", "start/session", "warm `ZV_WS_getTitles`", "warm/library", 0, true},
+    {"The same with a cache, the service 100 ms away", "start/far", "a way there and back", "=200000", 4.5, false},
 };
 
 std::string Processor()

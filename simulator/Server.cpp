@@ -157,12 +157,22 @@ bool Server::WaitForRequest(Connection& connection, bool first)
     return false;
 }
 
-// With the mutex held, as the next one.
+bool Server::Worker::IsIdle() const
+{
+    return connection && connection->waits && !connection->silent;
+}
+
+// With the mutex held, as the next ones.
 size_t Server::CountIdle() const
 {
-    return static_cast<size_t>(std::count_if(m_Workers.begin(), m_Workers.end(), [](const Worker& worker) {
-        return worker.connection && worker.connection->waits && !worker.connection->silent;
-    }));
+    return static_cast<size_t>(
+        std::count_if(m_Workers.begin(), m_Workers.end(), [](const Worker& worker) { return worker.IsIdle(); }));
+}
+
+bool Server::IsIdle(unsigned long number) const
+{
+    return std::any_of(m_Workers.begin(), m_Workers.end(),
+                       [&](const Worker& worker) { return worker.number == number && worker.IsIdle(); });
 }
 
 bool Server::IsServed(unsigned long number) const
@@ -178,14 +188,20 @@ bool Server::WaitForIdle(size_t count)
     return CountIdle() >= count;
 }
 
+bool Server::WaitUntilIdle(unsigned long number)
+{
+    std::unique_lock<std::mutex> lock(m_Mutex);
+    m_Changed.wait(lock, [&] { return m_Ended || IsIdle(number) || !IsServed(number); });
+    return IsIdle(number);
+}
+
 size_t Server::ActOnIdle(IdleAction action, const std::string& bytes)
 {
     std::unique_lock<std::mutex> lock(m_Mutex);
     std::vector<unsigned long> reached;
     for (const Worker& worker : m_Workers) {
-        Connection* const connection = worker.connection;
-        // Its thread waits, so that the channel is free.
-        if (!connection || !connection->waits || connection->silent) continue;
+        if (!worker.IsIdle()) continue;
+        Connection* const connection = worker.connection;  // its thread waits, so that the channel is free
         bool done = true;
         switch (action) {
             case IdleAction::Write:

@@ -52,6 +52,7 @@ public:
     /// As Storefront's.
     size_t ActOnIdle(IdleAction action, const std::string& bytes);
     bool WaitForIdle(size_t count);
+    bool WaitUntilIdle(unsigned long number);
 
     /// The end breaks off a descriptor of the caller's as well, until it is forgotten.
     void Watch(int descriptor);
@@ -68,6 +69,8 @@ private:
         std::thread thread = {};
         bool done = false;
         Connection* connection = nullptr;  // as long as it is served
+
+        bool IsIdle() const;
     };
 
     void Accept(const Port& port);
@@ -75,6 +78,7 @@ private:
     void Reap();
     size_t CountIdle() const;
     bool IsServed(unsigned long number) const;
+    bool IsIdle(unsigned long number) const;
 
     std::list<Port> m_Ports;
 

@@ -50,6 +50,7 @@ public:
     void ClearLog() override { m_Log.Clear(); }
     bool WaitForRequests(size_t count) const override { return m_Log.WaitFor(count); }
     bool WaitForIdle(size_t count) override { return m_Server.WaitForIdle(count); }
+    bool WaitUntilIdle(unsigned long connection) override { return m_Server.WaitUntilIdle(connection); }
     size_t ActOnIdle(IdleAction action, const std::string& bytes) override { return m_Server.ActOnIdle(action, bytes); }
     void SetLatency(int milliseconds) override { m_Latency = milliseconds; }
     void SetClock(long long seconds) override { m_Clock.SetOffset(seconds); }

@@ -124,6 +124,8 @@ public:
     /// Waits until that many connections have been answered and wait for their next request; false when the simulator
     /// ends first.
     virtual bool WaitForIdle(size_t count) = 0;
+    /// The same of one connection, by its number in the log; false also when it ends first.
+    virtual bool WaitUntilIdle(unsigned long connection) = 0;
     /// Does it now to each of these, on whatever port, and returns when it is done: how many they were. `bytes` are
     /// what Write writes.
     virtual size_t ActOnIdle(IdleAction action, const std::string& bytes = kTimeoutAnswer) = 0;

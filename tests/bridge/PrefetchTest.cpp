@@ -160,15 +160,15 @@ protected:
 };
 
 // The store gives less on a page than it is asked for. All the same a page is fetched ahead as the script will ask for
-// it, and each is asked for once.
+// it, and each is asked for once. Box art is fetched when every page is there.
 TEST_F(CappedPrefetch, PagesAreKnownByTheirRequests)
 {
     for (const Listed& listed : {m_Titles, m_Videos, m_Wishes}) {
         EXPECT_EQ("1 on 2\n1 on 3\n1 on 1\n", RunOn(listed, "var count = " + std::to_string(listed.pages.size()) + R"(;
 function tell(page) { report(page.ItemsPerPage + ' on ' + page.CurrentPageNumber); }
-show(2, 50, function (page) { tell(page); asked(count, function () {
+show(2, 50, function (page) { tell(page); asked(count, function () { ws.idle(); when('boxart', 1, function () {
     show(3, 50, function (page) { tell(page);
-        show(1, 50, function (page) { tell(page); quit(); }); }); }); });)"));
+        show(1, 50, function (page) { tell(page); quit(); }); }); }); }); });)"));
         EXPECT_EQ(listed.pages, Pages(listed.operation));
         EXPECT_EQ(Strings(listed.pages.size(), "50"), Children(listed.operation, "ItemsPerPage"));
     }
