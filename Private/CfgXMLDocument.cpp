@@ -199,8 +199,11 @@ bool CfgXMLDocument::Parse(const ZVString& text)
     // Without XML_PARSE_NOENT an "&" in an attribute would arrive as a reference. There are no entities to expand.
     xmlCtxtReadMemory(parser.get(), text.c_str(), static_cast<int>(text.length()), nullptr, nullptr,
                       XML_PARSE_NOENT | XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING);
-    if (reader.exhausted) throw std::bad_alloc();
-    if (parser->wellFormed && !reader.refused && m_RootEnd > 0) return true;
+    const bool isDocument = parser->wellFormed && !reader.refused && m_RootEnd > 0;
+    // Where the parser is short of memory before it begins, it tells nobody: nothing is wrong, and nothing was read.
+    const bool wasRead = isDocument || !parser->wellFormed || reader.refused;
+    if (reader.exhausted || parser->errNo == XML_ERR_NO_MEMORY || !wasRead) throw std::bad_alloc();
+    if (isDocument) return true;
     m_Elements.clear();
     return false;
 }

@@ -3,25 +3,40 @@
 #include "CfgXMLDocument.h"
 #include "EVPCipher.h"
 #include "SafeFile.h"
+#include "ZV_Log.h"
+
+ZV_LOG_AREA(ZVWS_SoapProxyLOG_AREA_NAME)
 
 namespace {
 
 constexpr mode_t kMode = 0600;
 
-unsigned int Load(const ZVString& path, unsigned int whenAbsent, CfgXMLDocument& document)
+// `isRuined`: whether there is a file that can never be a settings document.
+unsigned int Load(const ZVString& path, unsigned int whenAbsent, CfgXMLDocument& document, bool& isRuined)
 {
     ZVString text;
+    isRuined = false;
     switch (SafeFile::Read(path.c_str(), CfgXMLFile::kMaxSize, text)) {
         case SafeFile::ReadResult::kRead:
-            return document.Parse(text) ? CfgXMLFile::kOk : CfgXMLFile::kNotFound;
+            isRuined = !document.Parse(text);
+            return isRuined ? CfgXMLFile::kNotFound : CfgXMLFile::kOk;
         case SafeFile::ReadResult::kAbsent:
             return whenAbsent;
+        case SafeFile::ReadResult::kTooLarge:
+            isRuined = true;
+            break;
         case SafeFile::ReadResult::kUnopened:
             return CfgXMLFile::kUnopened;
         case SafeFile::ReadResult::kUnreadable:
             break;
     }
     return CfgXMLFile::kUnreadable;
+}
+
+void LogRuin(const ZVString& path)
+{
+    ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_ERROR,
+                 "CfgXMLFile: no settings document, kept with \".bad\" behind its name: %s\n", path.c_str());
 }
 
 unsigned int Unprotect(const ZVString& key, const ZVString& packed, ZVString& value)
@@ -58,7 +73,8 @@ unsigned int CfgXMLFile::Read(const ZVString& key, ZVString& value, bool protect
     value = ZVString();
     if (key.empty()) return kEmptyKey;
     CfgXMLDocument document;
-    const unsigned int loaded = Load(m_Path, kUnopened, document);
+    bool isRuined = false;
+    const unsigned int loaded = Load(m_Path, kUnopened, document, isRuined);
     if (loaded != kOk) return loaded;
     const ZVString* stored = document.Find(key);
     if (!stored) return kNotFound;
@@ -80,10 +96,13 @@ unsigned int CfgXMLFile::Write(const ZVString& key, const ZVString& value, bool 
     const SafeFile::FolderLock lock(m_Path);
     if (!lock.Held()) return kUnwritable;
     CfgXMLDocument document;
-    const unsigned int loaded = Load(m_Path, kOk, document);
-    if (loaded != kOk) return loaded;
-    const ZVString text = document.With(key, stored);
+    bool isRuined = false;
+    const unsigned int loaded = Load(m_Path, kOk, document, isRuined);
+    if (loaded != kOk && !isRuined) return loaded;
+    const ZVString text = (isRuined ? CfgXMLDocument() : document).With(key, stored);
     if (text.length() > kMaxSize) return kUnwritable;
     if (!Holds(text, key, stored)) return kInvalidValue;
-    return SafeFile::Replace(m_Path, text, kMode) ? kOk : kUnwritable;
+    if (!SafeFile::Replace(m_Path, text, kMode, isRuined)) return kUnwritable;
+    if (isRuined) LogRuin(m_Path);
+    return kOk;
 }

@@ -2,10 +2,11 @@
 //
 // A write replaces the whole file in one step, under a lock against other writers of the folder (SafeFile.h): after a
 // crash the file is the old document or the new one, and a write that has returned 0 is on the disk. What stands beside
-// the written setting stays as it was, comments and layout too; a file that is no settings document is never replaced.
+// the written setting stays as it was, comments and layout too. A file that is ruined, no settings document or larger
+// than one, is kept as "<path>.bad" by the next write, which begins a new document.
 //
-// Any thread, any number of objects and processes on the same file. Nothing is logged. Both calls block on the disk, a
-// write also for up to 5 s on other writers.
+// Any thread, any number of objects and processes on the same file. Nothing is logged but a ruined file. Both calls
+// block on the disk, a write also for up to 5 s on other writers.
 #pragma once
 
 #include "ZVString.h"
@@ -32,7 +33,7 @@ public:
     unsigned int Read(const ZVString& key, ZVString& value, bool protectedValue);
 
     /// Changes the first element with that key where it stands, or adds one at the end; makes the file (mode 0600) when
-    /// there is none, but no folder. kNotFound: what is there is no settings document, it is left alone.
+    /// there is none, but no folder.
     unsigned int Write(const ZVString& key, const ZVString& value, bool protectedValue);
 
 private:

@@ -1,17 +1,14 @@
 // Calls that do not speak SOAP: the service's clock, the bandwidth test, the device's own address.
-#include <arpa/inet.h>
-#include <netdb.h>
 #include <stdio.h>
 #include <string.h>
 #include <strings.h>
-#include <sys/socket.h>
-#include <unistd.h>
 
 #include <algorithm>
 #include <memory>
 #include <set>
 
 #include "CallGuard.h"
+#include "LocalAddress.h"
 #include "RawHttp.h"
 #include "Records.h"
 #include "ServiceCall.h"
@@ -21,6 +18,7 @@
 namespace {
 
 constexpr int kClockTimeout = 30;  // seconds
+constexpr int kTlsPort = 443;
 const char kClockPath[] = "/device/time/";
 constexpr unsigned int kMostMeasured = 204800;
 // The service's data spells it without the second "d".
@@ -173,32 +171,30 @@ ZV_WS_Status CheckBandwidth(ZV_WS_Session* handle, unsigned int& bitsPerSecond)
     return Measure(http, bitsPerSecond);
 }
 
-// The device's IPv4 address when it has exactly one; else empty.
-ZVString OnlyAddress()
+// Where the session's requests go, as far as that is known: to a proxy, where there is one.
+std::vector<Address> PeersOf(SessionImpl& session, const ZVString& host, int port)
 {
-    char name[256] = "";
-    gethostname(name, sizeof name - 1);
-    addrinfo wanted = {};
-    wanted.ai_family = AF_INET;
-    wanted.ai_socktype = SOCK_STREAM;
-    addrinfo* list = nullptr;
-    if (getaddrinfo(name, nullptr, &wanted, &list) != 0) return ZVString();
-    const std::unique_ptr<addrinfo, void (*)(addrinfo*)> owned(list, freeaddrinfo);
-    if (!list || list->ai_next) return ZVString();
-    char text[INET_ADDRSTRLEN] = "";
-    inet_ntop(AF_INET, &reinterpret_cast<sockaddr_in*>(list->ai_addr)->sin_addr, text, sizeof text);
-    return text;
+    const Proxy& proxy = session.m_Browse.transport().proxy();
+    std::vector<Address> peers =
+        proxy.IsUsed() ? NameLookup::Known(proxy.host, proxy.port) : NameLookup::Known(host, port);
+    const auto addPeerOf = [&](auto where, Transport& transport) {
+        if (transport.peer().Family() != AF_UNSPEC) peers.insert(where, transport.peer());
+    };
+    addPeerOf(peers.begin(), session.m_Browse.transport());
+    // These two also ask others than the service.
+    addPeerOf(peers.end(), session.m_Stream.transport());
+    addPeerOf(peers.end(), session.m_Download.transport());
+    return peers;
 }
 
-ZV_WS_Status AddressTowardsService(SessionImpl& session, ZVString& address)
+ZV_WS_Status FindLocalAddress(SessionImpl& session, ZVString& address)
 {
-    const ZVString& url = session.m_Browse.Endpoint();
-    ZVString host, path;
-    SplitUrl(url, host, path);
-    if (host.empty()) return ZV_WS_Status_general_error;
-    RawHttp http(session.m_Browse.transport());
-    if (!http.Connect(url)) return ZV_WS_Status_connection_error;
-    return http.LocalAddress(address) ? ZV_WS_Status_ok : ZV_WS_Status_net_error;
+    ZVString hostPort, path, host;
+    SplitUrl(session.m_Browse.Endpoint(), hostPort, path);
+    int port = 0;
+    if (!SplitHostPort(hostPort, kTlsPort, host, port)) return ZV_WS_Status_general_error;
+    address = LocalAddressTowards(PeersOf(session, host, port));
+    return address.empty() ? ZV_WS_Status_net_error : ZV_WS_Status_ok;
 }
 
 }  // namespace
@@ -239,9 +235,8 @@ ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address)
     return LogStatus(__func__, GuardCall([&] {
                          Records::Tag(*address);
                          if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
-                         ZVString text = OnlyAddress();
-                         const ZV_WS_Status found =
-                             text.empty() ? AddressTowardsService(*handle->_pSessionImpl, text) : ZV_WS_Status_ok;
+                         ZVString text;
+                         const ZV_WS_Status found = FindLocalAddress(*handle->_pSessionImpl, text);
                          if (found == ZV_WS_Status_ok) ZVUtilities::SetText(*address, text);
                          return found;
                      }));

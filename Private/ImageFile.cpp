@@ -10,8 +10,7 @@ bool ImageFile::Create(const ZVString& target)
     m_Target = target;
     // Between its making and its lock somebody may have taken the file for one that was left over.
     for (int attempt = 0; attempt < 3; ++attempt) {
-        m_Temporary = ZVFile::CreateTempFileName(target.c_str());
-        if (m_Temporary.empty() || !m_File.Open(m_Temporary.c_str(), "wb")) return false;
+        if (!m_File.OpenTemporary(target.c_str(), m_Temporary)) return false;
         if (m_File.TryLock() && m_File.IsLinked()) return true;
     }
     return false;

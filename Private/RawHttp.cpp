@@ -1,9 +1,7 @@
 #include "RawHttp.h"
 
-#include <arpa/inet.h>
 #include <stdlib.h>
 #include <string.h>
-#include <sys/socket.h>
 
 #include <algorithm>
 
@@ -131,16 +129,5 @@ bool RawHttp::BodyStart(const char*& bytes, size_t& length) const
     if (!end) return false;
     bytes = end + strlen(kHeadEnd);
     length = m_Head + m_HeadLength - bytes;
-    return true;
-}
-
-bool RawHttp::LocalAddress(ZVString& address) const
-{
-    sockaddr_in own = {};
-    socklen_t size = sizeof own;
-    char text[INET_ADDRSTRLEN] = "";
-    if (getsockname(m_Transport.context().socket, reinterpret_cast<sockaddr*>(&own), &size) != 0) return false;
-    if (own.sin_family != AF_INET || !inet_ntop(AF_INET, &own.sin_addr, text, sizeof text)) return false;
-    address = text;
     return true;
 }

@@ -59,9 +59,6 @@ public:
     /// Receives once, at most `size` bytes. 0 at the end and on failure.
     size_t Receive(char* buffer, size_t size);
 
-    /// The dotted-quad address of this end of the connection.
-    bool LocalAddress(ZVString& address) const;
-
 private:
     Transport& m_Transport;
     SigpipeGuard m_Guard;

@@ -120,10 +120,15 @@ struct NameLookup::Question {
     bool isDone = false;
 };
 
-NameLookup::NameLookup(const ZVString& host, int port) : m_Host(host), m_Port(port), m_Seconds(kLongest)
+NameLookup::NameLookup(const ZVString& host, int port, WithoutAsking) : m_Host(host), m_Port(port), m_Seconds(kLongest)
 {
     AddLocal();
-    if (m_Found.empty() && !AddKnown()) Ask();
+    if (m_Found.empty()) AddKnown();
+}
+
+NameLookup::NameLookup(const ZVString& host, int port) : NameLookup(host, port, WithoutAsking())
+{
+    if (m_Found.empty()) Ask();
 }
 
 NameLookup::~NameLookup() = default;
@@ -145,16 +150,20 @@ void NameLookup::AddLocal()
     hosts.Ask("f");
 }
 
-bool NameLookup::AddKnown()
+std::vector<Address> NameLookup::Known(const ZVString& host, int port)
+{
+    return NameLookup(host, port, WithoutAsking()).Take();
+}
+
+void NameLookup::AddKnown()
 {
     Cache& cache = TheCache();
     ZVMutexLock lock(cache.mutex);
     const auto known = cache.names.find(m_Host.c_str());
-    if (known == cache.names.end() || ZVUtilities::MillisecondTime() >= known->second.until) return false;
+    if (known == cache.names.end() || ZVUtilities::MillisecondTime() >= known->second.until) return;
     m_Found = known->second.addresses;
     for (Address& address : m_Found)
         SetPort(address, m_Port);
-    return true;
 }
 
 void NameLookup::Ask()
@@ -185,7 +194,8 @@ void NameLookup::Keep()
     if (m_All.empty() || m_Seconds <= 0) return;
     Cache& cache = TheCache();
     ZVMutexLock lock(cache.mutex);
-    cache.names[m_Host.c_str()] = {m_All, ZVUtilities::MillisecondTime() + 1000ull * static_cast<unsigned int>(m_Seconds)};
+    cache.names[m_Host.c_str()] = {m_All,
+                                   ZVUtilities::MillisecondTime() + 1000ull * static_cast<unsigned int>(m_Seconds)};
 }
 
 void NameLookup::Forget(const ZVString& host)
@@ -233,7 +243,8 @@ void NameLookup::Process(const std::vector<pollfd>& waited)
             const bool reads = (wait.revents & (POLLIN | POLLERR | POLLHUP)) != 0;
             const bool writes = (wait.revents & POLLOUT) != 0;
             if (reads || writes) {
-                ares_process_fd(question->channel, reads ? wait.fd : ARES_SOCKET_BAD, writes ? wait.fd : ARES_SOCKET_BAD);
+                ares_process_fd(question->channel, reads ? wait.fd : ARES_SOCKET_BAD,
+                                writes ? wait.fd : ARES_SOCKET_BAD);
             }
         }
         ares_process_fd(question->channel, ARES_SOCKET_BAD, ARES_SOCKET_BAD);  // what has waited too long

@@ -31,6 +31,9 @@ public:
     NameLookup(const NameLookup&) = delete;
     NameLookup& operator=(const NameLookup&) = delete;
 
+    /// What is known without asking anybody; nothing for a name that would have to be asked for.
+    static std::vector<Address> Known(const ZVString& host, int port);
+
     /// Whether nothing more will come for that family (AF_INET, AF_INET6).
     bool IsDone(int family) const;
     bool IsDone() const { return IsDone(AF_INET) && IsDone(AF_INET6); }
@@ -51,9 +54,11 @@ public:
 
 private:
     struct Question;
+    struct WithoutAsking {};
 
+    NameLookup(const ZVString& host, int port, WithoutAsking);
     void AddLocal();
-    bool AddKnown();
+    void AddKnown();
     void Ask();
     void Keep();
 

@@ -3,6 +3,7 @@
 #include <errno.h>
 #include <fcntl.h>
 #include <limits.h>
+#include <stdio.h>
 #include <stdlib.h>
 #include <string.h>
 #include <sys/file.h>
@@ -42,20 +43,36 @@ bool WriteAll(int file, const ZVString& text)
 }
 
 // Only root may give files away; for others the owner changes with the replacement.
-bool TakeOver(int file, const char* original)
+bool TakeOver(int file, const char* original, mode_t modeOfNew)
 {
     struct stat old;
-    if (stat(original, &old) != 0) return errno == ENOENT;
+    if (stat(original, &old) != 0) return errno == ENOENT && fchmod(file, modeOfNew) == 0;
     if (fchown(file, old.st_uid, old.st_gid) != 0 && errno != EPERM) return false;
     return fchmod(file, old.st_mode & 0777) == 0;
 }
 
+// A file that nobody else has, or had, open.
+int MakeFile(const char* path)
+{
+    if (remove(path) != 0 && errno != ENOENT) return -1;
+    return open(path, O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600);
+}
+
 bool WriteFlushed(const char* path, const ZVString& text, mode_t mode, const char* original)
 {
-    const int file = open(path, O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_CLOEXEC, mode);
+    const int file = MakeFile(path);
     if (file < 0) return false;
-    const bool written = TakeOver(file, original) && WriteAll(file, text) && fsync(file) == 0;
+    const bool written = TakeOver(file, original, mode) && WriteAll(file, text) && fsync(file) == 0;
     return close(file) == 0 && written;
+}
+
+// Between the two renames there is no file, which is as good as one that cannot be used.
+bool MoveInPlace(const char* fresh, const char* target, const char* aside)
+{
+    if (aside && rename(target, aside) != 0) return false;
+    if (rename(fresh, target) == 0) return true;
+    if (aside) rename(aside, target);
+    return false;
 }
 
 }  // namespace
@@ -66,7 +83,9 @@ SafeFile::ReadResult SafeFile::Read(const char* path, size_t limit, ZVString& te
     const int file = open(path, O_RDONLY | O_NONBLOCK | O_CLOEXEC);  // a pipe would block otherwise
     if (file < 0) return errno == ENOENT ? ReadResult::kAbsent : ReadResult::kUnopened;
     struct stat entry;
-    bool whole = fstat(file, &entry) == 0 && S_ISREG(entry.st_mode) && entry.st_size <= static_cast<off_t>(limit);
+    const bool isFile = fstat(file, &entry) == 0 && S_ISREG(entry.st_mode);
+    const bool fits = isFile && entry.st_size <= static_cast<off_t>(limit);
+    bool whole = fits;
     for (off_t left = whole ? entry.st_size : 0; left > 0 && whole;) {
         char block[4096];
         const ssize_t count = read(file, block, left < static_cast<off_t>(sizeof block) ? left : sizeof block);
@@ -79,16 +98,16 @@ SafeFile::ReadResult SafeFile::Read(const char* path, size_t limit, ZVString& te
     close(file);
     if (whole) return ReadResult::kRead;
     text = ZVString();
-    return ReadResult::kUnreadable;
+    return isFile && !fits ? ReadResult::kTooLarge : ReadResult::kUnreadable;
 }
 
-bool SafeFile::Replace(const ZVString& path, const ZVString& text, mode_t mode)
+bool SafeFile::Replace(const ZVString& path, const ZVString& text, mode_t mode, bool keepsOld)
 {
     const ZVString target = Target(path);
-    const ZVString fresh = target + ".new";
+    const ZVString fresh = target + ".new", aside = target + ".bad";
     const int folder = OpenFolderOf(target);  // before the rename: a failure leaves the old file
-    const bool replaced =
-        WriteFlushed(fresh.c_str(), text, mode, target.c_str()) && rename(fresh.c_str(), target.c_str()) == 0;
+    const bool replaced = WriteFlushed(fresh.c_str(), text, mode, target.c_str()) &&
+                          MoveInPlace(fresh.c_str(), target.c_str(), keepsOld ? aside.c_str() : nullptr);
     if (!replaced) unlink(fresh.c_str());
     // The rename reaches the disk with the folder. Where a folder cannot be flushed, the file system sees to it.
     if (replaced && folder >= 0) fsync(folder);

@@ -3,7 +3,8 @@
 //
 // A file is replaced by renaming a flushed "<path>.new" over it, so a reader needs no lock and sees the old text or the
 // new one. Writers hold the FolderLock from their read to their Replace: none overwrites what another has completed,
-// and "<path>.new" is never two writers'. What a killed writer left of it is overwritten by the next one.
+// and "<path>.new" is never two writers'. Whatever stands there before, what a killed writer left or a link or pipe of
+// somebody else's, is removed and not used.
 #pragma once
 
 #include <sys/types.h>
@@ -16,15 +17,17 @@ enum class ReadResult {
     kRead,        ///< An empty file too.
     kAbsent,      ///< There is no such file.
     kUnopened,    ///< There is one, or a part of the path is no folder; it cannot be opened.
-    kUnreadable,  ///< Larger than the limit, no file, or an error while reading.
+    kTooLarge,    ///< Larger than the limit.
+    kUnreadable,  ///< No file, or an error while reading.
 };
 
 /// Reads the file; `text` is empty unless the result is kRead. A file above `limit` bytes is not read at all.
 ReadResult Read(const char* path, size_t limit, ZVString& text);
 
 /// Replaces the file, or makes it with `mode`; an existing one's mode and owner stay, and what a symbolic link points
-/// to is replaced, not the link. False leaves the old file as it was. The caller holds the folder's lock.
-bool Replace(const ZVString& path, const ZVString& text, mode_t mode);
+/// to is replaced, not the link. With `keepsOld` the old file stays as "<path>.bad", in the place of an earlier one.
+/// False leaves the old file as it was. The caller holds the folder's lock.
+bool Replace(const ZVString& path, const ZVString& text, mode_t mode, bool keepsOld = false);
 
 /// The folder's exclusive lock (flock) for the life of the object, against other processes and other threads alike. The
 /// kernel gives it back when its process dies; it leaves no file behind. Not recursive.

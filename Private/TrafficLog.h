@@ -9,10 +9,11 @@
 /// thread.
 void soap_init_zv_log();
 
-/// Takes secrets out of an HTTP message that comes in pieces of any size: the values of header lines that authorise,
-/// the texts of XML elements that hold a secret. "***" stands where a secret was. A body in chunks is left out: their
-/// boundaries could hide an element's name. So is the part of a compressed body that comes in the piece of the head;
-/// what follows is taken for inflated.
+/// Takes secrets out of an HTTP message that comes in pieces of any size: the values of header lines and of attributes,
+/// and the contents of XML elements, whose names say that they hold one (an element's also where the XML is itself the
+/// text of an element). "***" stands where a secret was. A body in chunks is left out: their boundaries could hide an
+/// element's name. So is the part of a compressed body that comes in the piece of the head; what follows is taken for
+/// inflated.
 class SecretFilter {
 public:
     /// The piece without secrets.
@@ -22,19 +23,31 @@ public:
     void Restart() { *this = SecretFilter(); }
 
 private:
-    enum class State { HeadLine, HeadSecret, Text, Tag, Secret, SecretTag, Hidden };
+    enum class State { HeadLine, HeadSecret, Text, Tag, Value, Secret, SecretTag, Hidden };
 
     void Step(char c, ZVString& out);
     void StepHead(char c, ZVString& out);
     void EndHeadLine();
     void StepTag(char c, ZVString& out);
-    bool TagNamesSecret() const;
+    void BeginValue(char quote, ZVString& out);
+    void StepValue(char c, ZVString& out);
+    void StepSecret(char c, ZVString& out);
+    void BeginTag();
+    void EndTag(char c, ZVString& out);
+    bool OpensTag(char c) const;
+    bool ClosesTag(char c) const;
 
     State m_State = State::HeadLine;
+    bool m_IsInterim = false;  // another head follows this one
     bool m_IsCompressed = false;
     bool m_IsChunked = false;
-    ZVString
-        m_Name;  ///< What has come of the header line or the tag, without its opening bracket; cut at kLongestName.
+    bool m_LineIsSecret = false;  // and so are those that go on with it
+    ZVString m_Name;     // what has come of the header line or of the tag, without attributes that are over; cut at
+                         // kLongestName
+    ZVString m_Element;  // whose content is secret
+    char m_Quote = 0;    // that ends the attribute's value
+    bool m_ValueIsSecret = false;
+    char m_Last[4] = {};  // the latest characters of a body
 };
 
 namespace TrafficLog {

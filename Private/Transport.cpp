@@ -199,6 +199,8 @@ SOAP_SOCKET Transport::Open(const char* endpoint, const char* host, int port)
         if (m_Proxy.IsUsed()) m_Soap.error = OpenTunnel(socket, host, port, patience);
         if (m_Soap.error == SOAP_OK && !OpenTls(socket, host, patience)) m_Soap.error = SOAP_SSL_ERROR;
     }
+    m_Peer.length = sizeof m_Peer.socket;
+    getpeername(socket, reinterpret_cast<sockaddr*>(&m_Peer.socket), &m_Peer.length);
     if (m_Soap.error == SOAP_OK) return socket;
     close(socket);
     return SOAP_INVALID_SOCKET;

@@ -14,6 +14,7 @@
 #include "Clock.h"
 #include "Connector.h"
 #include "Deployment.h"
+#include "Resolver.h"
 #include "RetryAfter.h"
 #include "TrafficLog.h"
 #include "ZVString.h"
@@ -78,6 +79,9 @@ public:
     /// Whether the exchange failed for the clock's sake.
     Clock::Verdict ClockVerdict() const { return m_ClockVerdict; }
 
+    /// The other end of the last connection that was opened, the proxy's where there is one; of no family before any.
+    const Address& peer() const { return m_Peer; }
+
     /// Closes the connection at once, without waiting for the peer.
     void Close();
 
@@ -113,6 +117,7 @@ private:
     RetryAfter m_RetryAfter;
     const Deployment* m_Deployment = nullptr;
     Proxy m_Proxy;
+    Address m_Peer;
     ZVString m_TlsHost;
     ZVString m_UserAgent;
     uint64_t m_SendTimeout = 0, m_ReceiveTimeout = 0;  // milliseconds
@@ -124,7 +129,7 @@ private:
     bool m_HasSent = false;
     size_t m_Received = 0;
     int64_t m_ClockOffset = 0;
-    time_t m_Date = 0;  // that the answer bears; 0: none
+    time_t m_Date = 0;     // that the answer bears; 0: none
     bool m_IsOld = false;  // it comes from somebody's cache
     Clock::Verdict m_ClockVerdict = Clock::Verdict::Right;
     SecretFilter m_SentSecrets;

@@ -2,7 +2,9 @@
 
 #include <dirent.h>
 #include <errno.h>
+#include <fcntl.h>
 #include <fnmatch.h>
+#include <stdlib.h>
 #include <string.h>
 #include <sys/file.h>
 #include <sys/stat.h>
@@ -31,6 +33,13 @@ bool Exists(const char* path)
 bool MakeFolder(const char* path, mode_t mode)
 {
     return mkdir(path, mode) == 0 || (errno == EEXIST && IsFolder(path));
+}
+
+bool AreOneFile(const char* one, const char* other)
+{
+    struct stat first, second;
+    return stat(one, &first) == 0 && stat(other, &second) == 0 && first.st_dev == second.st_dev &&
+           first.st_ino == second.st_ino;
 }
 
 bool EndsIn(const ZVString& text, const char* end)
@@ -62,6 +71,21 @@ bool ZVFile::Open(const char* filename, const char* mode)
     Close();
     m_File = fopen(filename, mode);
     return m_File != nullptr;
+}
+
+bool ZVFile::OpenTemporary(const char* path, ZVString& name)
+{
+    Close();
+    name = GetFolderName(path) + "zvwsXXXXXX";
+    const int descriptor = mkostemp(&name[0], O_CLOEXEC);
+    m_File = descriptor < 0 ? nullptr : fdopen(descriptor, "wb");
+    if (m_File) return true;
+    if (descriptor >= 0) {
+        close(descriptor);
+        unlink(name.c_str());
+    }
+    name = ZVString();
+    return false;
 }
 
 void ZVFile::Close()
@@ -214,10 +238,8 @@ bool ZVFile::RemoveWithWildcard(const char* filename)
 
 ZVString ZVFile::CreateTempFileName(const char* path)
 {
-    ZVString name = GetFolderName(path) + "zvwsXXXXXX";
-    const int descriptor = mkstemp(&name[0]);
-    if (descriptor < 0) return ZVString();
-    close(descriptor);
+    ZVString name;
+    ZVFile().OpenTemporary(path, name);
     return name;
 }
 
@@ -226,7 +248,9 @@ bool ZVFile::CopyFile(const char* oldname, const char* newname)
     ZV_ASSERT(oldname != 0);
     ZV_ASSERT(newname != 0);
     ZVFile source, target;
-    if (!source.Open(oldname, "rb") || !target.Open(newname, "wb")) return false;
+    if (!source.Open(oldname, "rb")) return false;
+    if (AreOneFile(oldname, newname)) return true;
+    if (!target.Open(newname, "wb")) return false;
     char block[kCopyBlock];
     for (zv_int64 count; (count = source.Read(block, sizeof block)) >= 1;)
         target.Write(block, count);

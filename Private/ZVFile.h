@@ -21,6 +21,9 @@ public:
 
     /// Closes what was open, then opens with fopen's mode.
     bool Open(const char* filename, const char* mode);
+    /// Closes what was open, then makes a file as CreateTempFileName does and keeps it open for writing: what its name
+    /// may stand for a moment later is not looked at. `name` is empty on failure.
+    bool OpenTemporary(const char* path, ZVString& name);
     void Close();
 
     /// Reads until the size is reached or the file ends; the bytes read.
@@ -66,7 +69,8 @@ public:
     /// removes it.
     static ZVString CreateTempFileName(const char* path);
 
-    /// True when both files could be opened: write errors go unreported.
+    /// True when both files could be opened: write errors go unreported. A file copied onto itself, by whatever names,
+    /// stays as it is.
     static bool CopyFile(const char* oldname, const char* newname);
 
 private:

@@ -780,13 +780,17 @@ ZV_WS_Status ZV_WS_getServerTime(time_t* serverTime);
 /// file_not_found_on_server; failed_to_get_bandwidth_check_url and invalid_bandwidth_check_url for the address.
 ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSecond);
 
-/// The device's IPv4 address as text: its only one, or that of a connection to the service.
+/// The device's address as text, IPv4 or IPv6, on its way to the service or, where there is one, to the proxy; never a
+/// loopback address. Asks neither the network nor a name server and does not block: the way is that of the session's
+/// last connection, else that to the addresses already known of the service's name, else, as long as nothing is known
+/// of it or when it is on this device, the default route. ZV_WS_Status_net_error when no way leaves the device.
 ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address);
 
 // ---- Files. ZV_WS_Status_invalid_param for a null path, ZV_WS_Status_file_operation_error when the operation fails.
 
 /// A file that is not there counts as removed.
 ZV_WS_Status ZV_WS_removeFile(const char* path);
+/// A file copied onto itself (the same path, a link, another name of it) stays as it is: ok.
 ZV_WS_Status ZV_WS_copyFile(const char* source, const char* target);
 /// The path up to and including its last "/".
 ZV_WS_Status ZV_WS_getFolderName(const char* path, ZV_WS_String* folder);
@@ -800,8 +804,8 @@ ZV_WS_Status ZV_WS_fileExist(const char* path, bool* exists);
 // also on each other (at most 5 s).
 //
 // ZV_WS_Status_invalid_param for a null argument, an empty path and an empty key. ZV_WS_Status_setting_invalid_value as
-// said for each call. ZV_WS_Status_file_operation_error when the file cannot be read or written, is larger than 1 MiB,
-// or, for a protected value, when the device key (docs/deployment.md) is missing.
+// said for each call. ZV_WS_Status_file_operation_error when the file cannot be read or written, to read also when it
+// is larger than 1 MiB, or, for a protected value, when the device key (docs/deployment.md) is missing.
 
 /// The value of a key, never null on success; "" when the key has no value. Others: setting_key_not_found, also for a
 /// file that is empty or no settings file; setting_invalid_value for a protected value that was changed from outside,
@@ -810,8 +814,10 @@ ZV_WS_Status ZV_WS_readSetting(const char* path, const char* key, bool protected
 
 /// Changes the key's value or adds it; makes the file when there is none, but no folder. Once it has succeeded the
 /// value is on the disk; when it fails, or the process dies in it, the file is what it was or is whole with the new
-/// value. A file that is not empty and no settings file is left alone (file_operation_error). Key and value are UTF-8:
-/// setting_invalid_value for characters that XML cannot hold; a protected value may be any bytes.
+/// value. A file that is ruined, so that it is no settings file or is larger than 1 MiB, is kept as "<path>.bad", in
+/// the place of an earlier one and with a line in the log, and a new one is begun; what is no file is left alone
+/// (file_operation_error). Key and value are UTF-8: setting_invalid_value for characters that XML cannot hold; a
+/// protected value may be any bytes.
 ZV_WS_Status ZV_WS_writeSetting(const char* path, const char* key, const char* value, bool protectedValue);
 
 /// Keeps the environment that a device is set to in a file of its own, of the same format, under the key "EnvNum" in

@@ -20,14 +20,15 @@
 // kWrongArguments, and nothing is sent: its getter throws, or its value or an element of it cannot be converted
 // (valueOf or toString throws, a symbol).
 //
-// Methods that answer at once, with arguments of their own:
+// Methods that answer at once, with arguments of their own. None of them waits for the network; those that take a path
+// and "clone", which opens the cache, block on the disk.
 //   clone(instance)             a session like that of another instance, which may have a call under way; ReturnCode
 //   idle()                      0; updates go on until the next result or "quitFlash"
 //   quitFlash()                 0; ends the movie
 //   getUserAgent()              text, empty before "init"
 //   getDeviceEnv()              environment number, -1 before "init"
-//   getAvailableEnvLists()      Array of {endpoint, envNum}, with isDefault where the service says so: blocks while
-//                               it is asked, and does not ask before "init" or while a worker runs
+//   getAvailableEnvLists()      Array of {endpoint, envNum}; isDefault is true for the one that the service assigned to
+//                               the device, which is known after an "init" with the EnvNum 3 ("default")
 //   getSysInfo(value)           the value's text
 //   fileExist(path)             boolean
 //   clearLocalCache(folder)     ZV_WS_Status

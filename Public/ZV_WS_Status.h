@@ -70,3 +70,8 @@ enum ZV_WS_Status : int {
     /// The device's clock is so wrong that no service accepts its requests, or no certificate is valid yet.
     ZV_WS_Status_clock_wrong = -7001,
 };
+
+/// What the status says, in English and in a few words, for logs and consoles: "credit card expired". A number of a
+/// family has the text of its base; "unknown status" for any other number without a name. Never null; a constant, of
+/// which nothing is to be freed. Any thread.
+const char* ZV_WS_statusText(ZV_WS_Status status);

@@ -1,6 +1,10 @@
 #include <gtest/gtest.h>
+#include <unistd.h>
 
+#include <atomic>
 #include <string>
+#include <thread>
+#include <vector>
 
 #include "TempFolder.h"
 #include "ZVFile.h"
@@ -61,6 +65,28 @@ TEST(FileTest, MakesEveryFolderOfAPath)
     EXPECT_FALSE(ZVFile::CreateFolder(""));
 }
 
+// Instances that start at once on a folder that none of them finds.
+TEST(FileTest, MakesAFolderThatOthersMakeAtTheSameTime)
+{
+    const TempFolder folder;
+    const int kTogether = 4;
+    for (int round = 0; round < 200; ++round) {
+        const std::string path = folder / (std::to_string(round) + "/a/b/c");
+        std::atomic<int> ready{0}, made{0};
+        std::vector<std::thread> threads;
+        for (int i = 0; i < kTogether; ++i) {
+            threads.emplace_back([&] {
+                for (++ready; ready < kTogether;)
+                    std::this_thread::yield();
+                made += ZVFile::CreateFolder(path.c_str()) ? 1 : 0;
+            });
+        }
+        for (std::thread& thread : threads)
+            thread.join();
+        ASSERT_EQ(kTogether, made) << round;
+    }
+}
+
 TEST(FileTest, RemovesByWildcard)
 {
     const TempFolder folder;
@@ -95,6 +121,38 @@ TEST(FileTest, CopiesAndRenames)
     EXPECT_TRUE(ZVFile::CopyFile((folder / "from").c_str(), "/dev/full")) << "write errors go unreported";
     EXPECT_TRUE(ZVFile::Rename((folder / "from").c_str(), (folder / "to").c_str()));
     EXPECT_FALSE(ZVFile::Rename((folder / "from").c_str(), (folder / "to").c_str()));
+}
+
+TEST(FileTest, AFileCopiedOntoItselfStays)
+{
+    const TempFolder folder;
+    const std::string file = folder.Write("file", "content");
+    ASSERT_EQ(0, symlink("file", (folder / "link").c_str()));
+    ASSERT_EQ(0, link(file.c_str(), (folder / "name").c_str()));
+    for (const std::string from : {"file", "link", "name"}) {
+        for (const std::string to : {"file", "link", "name", "./file"}) {
+            EXPECT_TRUE(ZVFile::CopyFile((folder / from).c_str(), (folder / to).c_str())) << from << " " << to;
+            EXPECT_EQ("content", ContentOf(file)) << from << " " << to;
+        }
+    }
+}
+
+// An image on its way into the cache.
+TEST(FileTest, ATemporaryFileIsWrittenWhateverItsNameBecomes)
+{
+    const TempFolder folder;
+    const std::string other = folder.Write("other", "untouched");
+    ZVFile file;
+    ZVString name;
+    ASSERT_TRUE(file.OpenTemporary((folder / "target").c_str(), name));
+    EXPECT_EQ(0600, static_cast<int>(std::filesystem::status(name.c_str()).permissions()));
+    ASSERT_EQ(0, unlink(name.c_str()));
+    ASSERT_EQ(0, symlink("other", name.c_str()));
+    EXPECT_EQ(3, file.Write("new", 3));
+    EXPECT_TRUE(file.Flush());
+    EXPECT_EQ("untouched", ContentOf(other));
+    EXPECT_FALSE(file.OpenTemporary((folder / "none/target").c_str(), name));
+    EXPECT_TRUE(name.empty());
 }
 
 TEST(FileDeathTest, NullsAndPatternsWithoutWildcardStop)

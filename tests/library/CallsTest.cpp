@@ -1,6 +1,12 @@
 // The calls against the simulator, whose checks hold the requests' form: those that no movie makes, and of the others
 // what a movie that is answered well (tests/endtoend/MethodsTest.cpp) does not show.
+#include <limits.h>
+
+#include <regex>
+#include <set>
+
 #include "Store.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -218,15 +224,15 @@ TEST_F(Calls, TextsThatXmlCannotCarryAreNotSent)
         {"\xC2\x80 \xE0\xA0\x80 \xED\x9F\xBF \xEE\x80\x80 \xEF\xBF\xBD \xF0\x90\x80\x80 \xF4\x8F\xBF\xBF", true},
         {"\x01", false},
         {"a\x1f", false},
-        {"\x80", false},              // no first byte
-        {"\xC3", false},              // cut short
+        {"\x80", false},  // no first byte
+        {"\xC3", false},  // cut short
         {"\xC3(", false},
         {"\xE2\x82", false},
-        {"\xC0\xAF", false},          // longer than it has to be
+        {"\xC0\xAF", false},  // longer than it has to be
         {"\xE0\x9F\xBF", false},
         {"\xF0\x8F\xBF\xBF", false},
-        {"\xED\xA0\x80", false},      // half a pair
-        {"\xEF\xBF\xBE", false},      // U+FFFE
+        {"\xED\xA0\x80", false},  // half a pair
+        {"\xEF\xBF\xBE", false},  // U+FFFE
         {"\xEF\xBF\xBF", false},
         {"\xF4\x90\x80\x80", false},  // beyond the last
         {"\xF8\x88\x80\x80\x80", false},
@@ -348,6 +354,26 @@ TEST_F(Calls, Files)
     EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_createFolder((data + "/account.txt/x").c_str()));
     EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_copyFile(nullptr, "x"));
     EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_fileExist(nullptr, &after));
+}
+
+TEST_F(Calls, EveryStatusHasATextOfItsOwn)
+{
+    const std::string header = ContentOf(ZV_SOURCES "Public/ZV_WS_Status.h");
+    const std::regex row("ZV_WS_Status_\\w+ = (-?\\d+)");
+    std::set<std::string> texts = {ZV_WS_statusText(static_cast<ZV_WS_Status>(1))};
+    EXPECT_EQ(1u, texts.count("unknown status"));
+    int named = 0;
+    for (std::sregex_iterator at(header.begin(), header.end(), row), end; at != end; ++at, ++named) {
+        const std::string text = ZV_WS_statusText(static_cast<ZV_WS_Status>(std::stoi(at->str(1))));
+        EXPECT_TRUE(texts.insert(text).second && !text.empty()) << at->str() << ": " << text;
+    }
+    EXPECT_LT(60, named);
+    const std::pair<int, const char*> others[] = {
+        {-4503, "HTTP failure"},   {-5030, "TLS failure"},    {-6012, "SOAP failure"},
+        {-4999, "HTTP failure"},   {-6999, "SOAP failure"},   {-2999, "unknown status"},
+        {-7000, "unknown status"}, {-1002, "unknown status"}, {INT_MIN, "unknown status"}};
+    for (const auto& [status, text] : others)
+        EXPECT_STREQ(text, ZV_WS_statusText(static_cast<ZV_WS_Status>(status))) << status;
 }
 
 }  // namespace

@@ -1,8 +1,10 @@
 
+#include <atomic>
 #include <fstream>
 #include <thread>
 
 #include "Store.h"
+#include "TempFolder.h"
 
 namespace {
 
@@ -209,6 +211,35 @@ TEST_F(Session, CallsWithoutASessionTagTheirOutput)
         EXPECT_EQ(0, env);
     }
     EXPECT_EQ(ZV_WS_Status_ok, ZV_WS_release(nullptr));
+}
+
+TEST_F(Session, InstancesThatStartAtOnceShareANewCacheFolder)
+{
+    const TempFolder folder;
+    const int kTogether = 3;
+    std::string levels;  // many, so that the instances meet in some of them
+    while (levels.size() < 200)
+        levels += "/a";
+    for (int round = 0; round < 10; ++round) {
+        const std::string path = folder / (std::to_string(round) + levels);
+        std::atomic<int> ready{0};
+        std::vector<ZV_WS_Status> statuses(kTogether, ZV_WS_Status_general_error);
+        std::vector<std::thread> threads;
+        for (ZV_WS_Status& status : statuses) {
+            threads.emplace_back([&] {
+                ZV_WS_SetupParams setup = Setup();
+                setup.EnvNum = ENVNUM_PRODUCTION;
+                Cache(setup, CacheType_File, 0, path.c_str());
+                Owned<ZV_WS_Session> own;
+                for (++ready; ready < kTogether;)
+                    std::this_thread::yield();
+                status = ZV_WS_initialize(&own, &setup);
+            });
+        }
+        for (std::thread& thread : threads)
+            thread.join();
+        EXPECT_EQ(std::vector<ZV_WS_Status>(kTogether, ZV_WS_Status_ok), statuses) << round;
+    }
 }
 
 }  // namespace

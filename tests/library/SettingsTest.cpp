@@ -1,7 +1,10 @@
 // The settings file: what is read from documents of every kind, what a write keeps, and what no one may change.
 #include <sys/stat.h>
 
+#include <functional>
+
 #include "EVPCipher.h"
+#include "LogLines.h"
 #include "SafeFile.h"
 #include "Serializer.h"
 #include "SettingsFolder.h"
@@ -75,8 +78,8 @@ TEST_F(Settings, AreReadFromDocuments)
     EXPECT_EQ("1:", Reading(""));
 }
 
-// None of these may be read, taken for empty or replaced.
-TEST_F(Settings, DocumentsThatAreNoneAreLeftAlone)
+// None of these may be read, or be lost by the write that begins anew.
+TEST_F(Settings, RuinedDocumentsAreKeptAside)
 {
     const std::string setting = Setting("k", "v");
     const auto entity = [](const std::string& type, const std::string& value) {
@@ -107,12 +110,26 @@ TEST_F(Settings, DocumentsThatAreNoneAreLeftAlone)
         {"other encoding", "<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?>" + Document(setting + "<!--\xE4-->")},
         {"too large", Document(setting + "<!--" + std::string(CfgXMLFile::kMaxSize, ' ') + "-->"), 2},
     };
+    LogLines log;
     for (const auto& row : rows) {
         Put(file, row.document);
+        log.Clear();
         EXPECT_EQ(std::to_string(row.result) + ":", Reading("k")) << row.what;
-        EXPECT_EQ(row.result, Write("k", "w")) << row.what;
-        EXPECT_TRUE(row.document == ContentOf(file)) << row.what;
+        EXPECT_TRUE(row.document == ContentOf(file)) << row.what << ": a read changes nothing";
+        EXPECT_EQ(0, log.Count("")) << row.what;
+        EXPECT_EQ(0u, Write("k", "w")) << row.what;
+        EXPECT_TRUE(row.document == ContentOf(file + ".bad")) << row.what;
+        EXPECT_EQ(1, log.Count(file)) << row.what;
+        EXPECT_EQ("0:w", Reading("k")) << row.what;
+        EXPECT_EQ(0u, Write("k", "x")) << row.what;
+        EXPECT_EQ(1, log.Count("")) << row.what;
     }
+    // What cannot be kept is not replaced.
+    ASSERT_EQ(0, unlink((file + ".bad").c_str()));
+    ASSERT_EQ(0, mkdir((file + ".bad").c_str(), 0700));
+    Put(file, "hello");
+    EXPECT_EQ(4u, Write("k", "w"));
+    EXPECT_EQ("hello", ContentOf(file));
 }
 
 TEST_F(Settings, FilesThatAreNoneAreRefusedAtOnce)
@@ -121,7 +138,8 @@ TEST_F(Settings, FilesThatAreNoneAreRefusedAtOnce)
     Put(file, "");
     ASSERT_EQ(0, truncate(file.c_str(), 100 << 20));
     EXPECT_EQ("2:", Reading("k"));
-    EXPECT_EQ(2u, Write("k", "v"));
+    EXPECT_EQ(0u, Write("k", "v"));
+    EXPECT_EQ(100u << 20, std::filesystem::file_size(file + ".bad"));
 
     const std::string below = file + "/below.xml", pipe = folder + "pipe";
     ASSERT_EQ(0, mkfifo(pipe.c_str(), 0600));
@@ -347,16 +365,39 @@ TEST_F(Settings, PackedTextsCarryBothParts)
 
 // ---- Disks and other writers
 
-TEST_F(Settings, ALinkInPlaceOfTheNewFileIsNotFollowed)
+// Whoever may write in the folder could read a device key, or have others' files overwritten.
+TEST_F(Settings, WhatStandsInPlaceOfATemporaryFileIsNotUsed)
 {
-    ASSERT_EQ(0u, Write("k", "v"));
-    const std::string before = ContentOf(file);
-    Put(folder + "other", "untouched");
-    ASSERT_EQ(0, symlink("other", (file + ".new").c_str()));
-    EXPECT_EQ(4u, Write("k", "w"));
-    EXPECT_EQ(before, ContentOf(file));
-    EXPECT_EQ("untouched", ContentOf(folder + "other"));
-    EXPECT_EQ(0u, Write("k", "w")) << "and does not stay";
+    const std::string other = folder + "other";
+    const struct {
+        const char* what;
+        std::function<int(const char*)> make;
+    } rows[] = {
+        {"open to all", [&](const char* path) { return Put(path, "old"), chmod(path, 0666); }},
+        {"a pipe", [&](const char* path) { return mkfifo(path, 0666); }},
+        {"a link", [&](const char* path) { return symlink(other.c_str(), path); }},
+        {"a link to nothing", [&](const char* path) { return symlink("nothing", path); }},
+        {"another name of a file", [&](const char* path) { return link(other.c_str(), path); }},
+        {"a folder", [&](const char* path) { return mkdir(path, 0777); }},
+    };
+    for (const auto& row : rows) {
+        Put(other, "untouched");
+        chmod(other.c_str(), 0666);
+        for (const std::string& path : {file, folder + "device.key"}) {
+            unlink(path.c_str());
+            ASSERT_EQ(0, row.make((path + ".new").c_str())) << row.what;
+        }
+        EXPECT_EQ(0u, Write("k", "v", true)) << row.what;
+        EXPECT_EQ("0:v", Reading("k", true)) << row.what;
+        EXPECT_EQ("untouched", ContentOf(other)) << row.what;
+        EXPECT_FALSE(std::filesystem::exists(folder + "nothing")) << row.what;
+        for (const std::string& path : {file, folder + "device.key"}) {
+            struct stat made;
+            ASSERT_EQ(0, lstat(path.c_str(), &made)) << row.what;
+            EXPECT_EQ(S_IFREG | 0600u, made.st_mode) << row.what << " " << path;
+            EXPECT_EQ(1u, made.st_nlink) << row.what << " " << path;
+        }
+    }
 }
 
 TEST_F(Settings, AWriterThatNeverEndsStopsTheOthersForATimeOnly)
@@ -386,7 +427,7 @@ TEST_F(Settings, StatusesOfTheCalls)
     for (const auto& row : refused)
         EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_writeSetting(row[0], row[1], row[2], false));
     EXPECT_EQ(ZV_WS_Status_setting_invalid_value, ZV_WS_writeSetting(path, "k", "\x01", false));
-    EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_writeSetting(deployment.c_str(), "k", "v", false));
+    EXPECT_EQ(ZV_WS_Status_file_operation_error, ZV_WS_writeSetting(folder.c_str(), "k", "v", false));
     EXPECT_EQ(ZV_WS_Status_setting_invalid_value, ZV_WS_createEnvXML(path, static_cast<ZV_WS_EnvNum>(-1)));
     EXPECT_EQ(ZV_WS_Status_invalid_param, ZV_WS_deleteEnvXML(nullptr));
     EXPECT_EQ("-1906:", read(deployment, "k", false));

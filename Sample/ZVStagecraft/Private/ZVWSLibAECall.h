@@ -46,7 +46,13 @@ public:
 
     /// Whether the instance has a session. Any thread; set by the worker of "init", or by "clone".
     bool IsInitialized() const { return m_Init; }
-    void SetInitialized(bool initialized) { m_Init = initialized; }
+    /// Whether it has, and its environment is the one that the service assigned to the device.
+    bool HasAssignedEnv() const { return m_Init && m_EnvIsAssigned; }
+    void SetInitialized(bool initialized, bool envIsAssigned)
+    {
+        m_EnvIsAssigned = envIsAssigned;
+        m_Init = initialized;
+    }
 
     /// The worker's while one runs. What set-up has fixed may be read beside it, and the session be duplicated.
     ZV_WS_Session& Session() { return m_Session; }
@@ -55,6 +61,7 @@ private:
     ZV_WS_Session m_Session;
     Result m_Result;  // the worker's until m_NeedFireEvent is set, then the main thread's
     std::atomic<bool> m_Init{false};
+    std::atomic<bool> m_EnvIsAssigned{false};  // set before m_Init
     std::atomic<bool> m_NeedFireEvent{false};
     KernelMutex m_ThreadMutex;
     ZVThread* m_Thread ZV_GUARDED_BY(m_ThreadMutex) = nullptr;

@@ -37,6 +37,12 @@ ZV_WS_SetupParams SetupOf(const Param_init& param)
     return setup;
 }
 
+// Whether set-up asks the service for the environment.
+bool IsAssigned(ZV_WS_EnvNum envNum)
+{
+    return envNum < ENVNUM_APISTG || envNum > ENVNUM_PRODUCTION;
+}
+
 }  // namespace
 
 void init(void* argument)
@@ -54,7 +60,7 @@ void init(void* argument)
     } else {
         ZV_WS_release(&call.Session());  // one failure leaves something behind
     }
-    call.SetInitialized(succeeded);
+    call.SetInitialized(succeeded, IsAssigned(param->EnvNum));
     call.Publish(succeeded, status);
 }
 
@@ -98,7 +104,7 @@ ZVWSLibAE::ReturnCode Clone(ZVWSLibAE& self, ASValueArray& arguments)
     ZVWSLibAE::Prefetcher& prefetcher = self.GetPrefetcher();
     prefetcher.CopySettings(source->GetPrefetcher());
     prefetcher.OpenSessions(call.Session());
-    call.SetInitialized(true);
+    call.SetInitialized(true, source->GetCall().HasAssignedEnv());
     return ZVWSLibAE::kStarted;
 }
 

@@ -1,4 +1,4 @@
-// Methods that answer at once. Only getAvailableEnvLists uses the network.
+// Methods that answer at once. None of them uses the network.
 #include <openssl/evp.h>
 #include <stdio.h>
 #include <stdlib.h>
@@ -135,12 +135,12 @@ void ZVWSLibAE::getDeviceEnv(StageWindow* /*window*/, ASObject& /*object*/, ASVa
 
 namespace {
 
-// The environment that the service assigns to the device; -1 when it cannot be asked now.
+// The environment that the service assigns to the device; -1 when the session was not set up with that one. To ask the
+// service (ZV_WS_getDefaultEnvID) would hold up the movie.
 int DefaultEnvironment(ZVWSLibAE::ForegroundCall& call)
 {
     ZV_WS_EnvID env = ENVID_APISTG;
-    const bool known =
-        call.IsInitialized() && !call.IsBusy() && ZV_WS_getDefaultEnvID(&call.Session(), &env) == ZV_WS_Status_ok;
+    const bool known = call.HasAssignedEnv() && ZV_WS_getDeviceEnv(&call.Session(), &env) == ZV_WS_Status_ok;
     return known ? env : -1;
 }
 
