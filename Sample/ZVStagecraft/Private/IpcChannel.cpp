@@ -8,6 +8,7 @@
 #include "ExitDecision.h"
 #include "Host.h"
 #include "HostConsole.h"
+#include "SignalStack.h"
 #include "ZVMutex.h"
 #include "player/NetworkStub.h"
 
@@ -68,6 +69,7 @@ void Dispatch(uint32_t type)
 
 void* _zv_stagecraft_ipc_listen_thread_main(void*)
 {
+    const SignalStack signalStack;
     pthread_setname_np(pthread_self(), "zv_ipc_listen");
     HostPrint("<ZV_FLASH> Calling -------> %s, %d\n", __func__, ExitDecision::Get().Listens() ? 0 : 1);
     while (ExitDecision::Get().Listens()) {
