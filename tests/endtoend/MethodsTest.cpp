@@ -238,7 +238,6 @@ function call(name, parameters, next) {
     var code = ws[name]([{onComplete: function (status, result) {
         if (name === 'checkBandwidth' && result > 0) result = 'a number';
         if (name === 'getLocalIPAddr' && /^\d+\.\d+\.\d+\.\d+$/.test(result)) result = 'an address';
-        if (name === 'init') trace('');  // the library's line about the user agent has no end
         show(name, status, result);
         next();
     }}, parameters]);
