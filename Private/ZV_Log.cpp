@@ -180,15 +180,21 @@ int ZV_LogGetConsoleTarget(ZV_LogTarget* target, void** user)
 
 void ZV_LogReleaseConsoleTarget(ZV_LogTarget, void*) {}
 
-int ZV_LogGetFileTarget(const char* fileName, ZV_LogTarget* target, void** user, unsigned int maxSize, bool wrap)
+int GetFileTarget(const char* fileName, const char* mode, ZV_LogTarget* target, void** user, unsigned int maxSize,
+                  bool wrap)
 {
     *target = nullptr;
     *user = nullptr;
-    FILE* file = fileName ? fopen(fileName, "wb") : nullptr;
+    FILE* file = fileName ? fopen(fileName, mode) : nullptr;
     if (!file) return 2;
     *target = FileOutput;
     *user = new FileTarget{file, maxSize, 0, wrap};
     return 0;
+}
+
+int ZV_LogGetFileTarget(const char* fileName, ZV_LogTarget* target, void** user, unsigned int maxSize, bool wrap)
+{
+    return GetFileTarget(fileName, "wb", target, user, maxSize, wrap);
 }
 
 void ZV_LogReleaseFileTarget(ZV_LogTarget, void* user)

@@ -8,6 +8,10 @@
 #include "ZVString.h"
 #include "ZV_Log.h"
 
+/// ZV_LogGetFileTarget with fopen's mode: "wb", or "ab" for a file whose lines stay.
+int GetFileTarget(const char* fileName, const char* mode, ZV_LogTarget* target, void** user, unsigned int maxSize,
+                  bool wrap);
+
 class ZV_Log {
 public:
     static ZV_Log& GetInstance();
