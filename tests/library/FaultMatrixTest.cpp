@@ -98,6 +98,10 @@ struct Kind {
     bool isCached;
     Outcome (*call)(ZV_WS_Session&, int n);
 };
+void PrintTo(const Kind& kind, std::ostream* stream)
+{
+    *stream << kind.name;
+}
 
 const Kind kKinds[] = {
     {"Browse", "getTitleListing", kSoap, ACCESS_TYPE_STREAM, CacheType_File, true, Browse},
