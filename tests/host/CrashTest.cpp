@@ -7,6 +7,7 @@
 #include <stdlib.h>
 #include <string.h>
 #include <sys/mman.h>
+#include <sys/prctl.h>
 #include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -108,6 +109,7 @@ void OldSegv(int signal)
 
 void Fail(const std::function<void()>& cause)
 {
+    prctl(PR_SET_PDEATHSIG, SIGKILL);  // a report that hangs ends with the test
     dup2(STDERR_FILENO, STDOUT_FILENO);
     struct sigaction old = {};
     old.sa_handler = OldSegv;

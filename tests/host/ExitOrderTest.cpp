@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 #include <stdarg.h>
 #include <stdlib.h>
+#include <string.h>
+#include <sys/prctl.h>
 #include <unistd.h>
 
 #include <condition_variable>
@@ -127,6 +129,7 @@ namespace {
 // Exits with the types of the messages sent.
 void End(const std::string& mainPoint, const std::string& listenPoint)
 {
+    prctl(PR_SET_PDEATHSIG, SIGKILL);  // threads that are never released end with the test
     s_mainPoint = mainPoint;
     s_listenPoint = listenPoint;
     s_main = std::this_thread::get_id();
