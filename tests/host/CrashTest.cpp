@@ -3,6 +3,7 @@
 
 #include <errno.h>
 #include <fcntl.h>
+#include <limits.h>
 #include <malloc.h>
 #include <stdlib.h>
 #include <string.h>
@@ -18,6 +19,7 @@
 #include <functional>
 #include <thread>
 
+#include "CrashConsole.h"
 #include "HostLines.h"
 #include "TempFolder.h"
 #include "ZVThread.h"
@@ -182,6 +184,28 @@ TEST(FaultDeathTest, TheInterruptedCodeKeepsItsErrno)
         _exit(errno == EXDEV ? 0 : 1);
     };
     EXPECT_EXIT(interrupt(), testing::ExitedWithCode(0), "");
+}
+
+TEST(CrashConsoleTest, PrintsAsPrintfDoes)
+{
+    testing::internal::CaptureStdout();
+    char expected[256];
+    const auto print = [](auto printer) {
+        printer("%d|%-2d|%3d|%d|%s|%6s|%-6s|", 0, 7, -12, INT_MIN, "", "right", "left");
+        printer("%p|%p|%lx|%08lx|%016lx|", static_cast<void*>(nullptr), reinterpret_cast<void*>(0xabc), 0ul, 0x1ful,
+                ~0ul);
+    };
+    std::string wanted;
+    print([&](const char* format, auto... values) {
+        snprintf(expected, sizeof expected, format, values...);
+        wanted += expected;
+    });
+    print([](const char* format, auto... values) { CrashPrint(format, values...); });
+    EXPECT_EQ(wanted, testing::internal::GetCapturedStdout());
+
+    testing::internal::CaptureStdout();
+    CrashPrint("%s", std::string(5000, 'x').c_str());
+    EXPECT_EQ(std::string(1023, 'x') + "\n", testing::internal::GetCapturedStdout());
 }
 
 // ---- The process

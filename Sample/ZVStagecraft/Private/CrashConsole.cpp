@@ -34,8 +34,9 @@ public:
             Add(text[i]);
         if (field.isLeft) Pad(padding, ' ');
     }
-    void Write() const
+    void Write()
     {
+        if (m_length == sizeof m_text) m_text[m_length - 1] = '\n';
         for (size_t at = 0; at < m_length;) {
             const ssize_t written = write(STDOUT_FILENO, m_text + at, m_length - at);
             if (written < 0 && errno != EINTR) return;
@@ -50,7 +51,7 @@ private:
             Add(character);
     }
 
-    char m_text[511];
+    char m_text[1024];
     size_t m_length = 0;
 };
 

@@ -108,14 +108,19 @@ void GiveBack(int signal, const char* name, const struct sigaction& old)
 constexpr unsigned kMostSeconds = 5;
 volatile int s_reported = 0;  // the signal
 
+void Unblock(int signal)
+{
+    sigset_t signals;
+    sigemptyset(&signals);
+    sigaddset(&signals, signal);
+    pthread_sigmask(SIG_UNBLOCK, &signals, nullptr);
+}
+
 void OnTimeout(int)
 {
     const int signal = s_reported;
     sigaction(signal, &old_segv, nullptr);
-    sigset_t unblocked;
-    sigemptyset(&unblocked);
-    sigaddset(&unblocked, signal);
-    pthread_sigmask(SIG_UNBLOCK, &unblocked, nullptr);
+    Unblock(signal);
     raise(signal);
     _exit(128 + signal);  // the action was to go on
 }
@@ -127,6 +132,7 @@ void LimitTime(int signal)
     sigemptyset(&action.sa_mask);
     action.sa_handler = OnTimeout;
     sigaction(SIGALRM, &action, nullptr);
+    Unblock(SIGALRM);
     alarm(kMostSeconds);
 }
 
