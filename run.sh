@@ -52,4 +52,8 @@ failed=0
     STAGECRAFT_MOVIE=$movie ZV_CORE_DUMP=${ZV_CORE_DUMP:-1} build/bin/zv_stagecraft 5 2>&1 1>&3 | tee "$work/errors" >&2 || failed=1
 } 3>&1
 if [ $failed -ne 0 ]; then fail "zv_stagecraft ended with an error"; fi
-if grep -q "^script error: " "$work/errors"; then fail "the movie met script errors (see above)"; fi
+case $(tail -n 1 "$work/errors") in
+    "movie ended: ok" | "movie ended: stopped") ;;
+    "movie ended: script error") fail "the movie met script errors (see above)" ;;
+    *) fail "the movie was not shown to its end (see above)" ;;
+esac

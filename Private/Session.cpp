@@ -252,7 +252,8 @@ ZV_WS_Status Initialize(ZV_WS_Session* handle, const ZV_WS_SetupParams& params)
     CopyGiven(own.FirmwareRevision, params.FirmwareRevision);
     CopyGiven(own.ModelCode, params.ModelCode);
     own.UserAgent = MakeUserAgent(own);
-    if (!own.UserAgent.empty()) printf("\n***---> User-Agent = %s", own.UserAgent.c_str());
+    // With a line end of its own: what another thread prints next would stand on the same line.
+    if (!own.UserAgent.empty()) printf("\n***---> User-Agent = %s\n", own.UserAgent.c_str());
     SetParams(session);
     own.AccessType = AccessTypeOf(handle, params.AccessType);
     InitFacade(session);

@@ -21,6 +21,7 @@
 class ZV_THREAD_ATTRIBUTE(capability("mutex")) ZVMutex {
 public:
     void lock() ZV_THREAD_ATTRIBUTE(acquire_capability()) { m_Mutex.lock(); }
+    bool try_lock() ZV_THREAD_ATTRIBUTE(try_acquire_capability(true)) { return m_Mutex.try_lock(); }
     void unlock() ZV_THREAD_ATTRIBUTE(release_capability()) { m_Mutex.unlock(); }
 
 private:

@@ -8,6 +8,7 @@
 #include <atomic>
 #include <memory>
 
+#include "SignalStack.h"
 #include "ZVAssert.h"
 #include "ZVMutex.h"
 
@@ -34,6 +35,7 @@ struct ZVThread::Impl {
 
     static void* EntryPoint(void* argument)
     {
+        const SignalStack signalStack;
         const std::unique_ptr<std::shared_ptr<Shared>> owned(static_cast<std::shared_ptr<Shared>*>(argument));
         Shared& shared = **owned;
         shared.running = true;

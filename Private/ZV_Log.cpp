@@ -14,12 +14,14 @@ namespace {
 
 constexpr size_t kMessageSize = 512;
 
+std::atomic<ZV_Log*> s_Log{nullptr};  // for handlers, which must not make it
+
 }  // namespace
 
 ZV_Log& ZV_Log::GetInstance()
 {
-    static auto* log = new ZV_Log;  // threads that still run at exit may log
-    return *log;
+    static ZV_Log& log = *(s_Log = new ZV_Log);  // threads that still run at exit may log
+    return log;
 }
 
 int ZV_Log::RegisterArea(const char* name, int& id)
@@ -86,17 +88,20 @@ ZVString ZV_Log::LineStart(int id) const
     return ZVString("[") + GetCurrentTime() + "-" + m_Areas[id].name + "] ";
 }
 
-void ZV_Log::Emit(const ZVString& line, unsigned int length)
+// An error may be the last thing that the process says.
+void ZV_Log::Emit(const ZVString& line, unsigned int length, int severity)
 {
     ZVMutexLock lock(m_Mutex);
-    if (m_Target) m_Target(line.c_str(), length, m_User);
+    if (!m_Target) return;
+    m_Target(line.c_str(), length, m_User);
+    if ((severity & ZV_LOG_ERROR) || m_FlushesEach) FlushFile();
 }
 
 // A line for which there is no memory is dropped, like every line that cannot be written.
 void ZV_Log::Output(int id, int severity, const char* text)
 {
     if (!WouldOutput(id, severity)) return;
-    WithinMemory([&] { Emit(LineStart(id) + text, 0); });
+    WithinMemory([&] { Emit(LineStart(id) + text, 0, severity); });
 }
 
 void ZV_Log::Output(int id, int severity, const char* text, unsigned int length)
@@ -105,7 +110,7 @@ void ZV_Log::Output(int id, int severity, const char* text, unsigned int length)
     WithinMemory([&] {
         ZVString line = LineStart(id);
         line.append(text, length);
-        Emit(line, static_cast<unsigned int>(line.length()));
+        Emit(line, static_cast<unsigned int>(line.length()), severity);
     });
 }
 
@@ -143,6 +148,29 @@ void FileOutput(const char* text, unsigned int length, void* user)
 
 }  // namespace
 
+// Whoever writes to the file of the target holds the mutex: the stream needs no lock of its own.
+void ZV_Log::FlushFile()
+{
+    if (m_Target == FileOutput && m_User) fflush_unlocked(static_cast<FileTarget*>(m_User)->file);
+}
+
+ZV_THREAD_ATTRIBUTE(no_thread_safety_analysis) void ZV_Log::FlushInHandler(bool isFatal)
+{
+    static std::atomic_flag s_Flushing = ATOMIC_FLAG_INIT;  // the stream may be what is broken
+    ZV_Log* log = s_Log;
+    if (!log || s_Flushing.test_and_set()) return;
+    log->m_FlushesEach = true;
+    const timespec aMillisecond = {0, 1000000};
+    bool locked = log->m_Mutex.try_lock();
+    for (int i = 0; isFatal && !locked && i < 500; ++i) {
+        nanosleep(&aMillisecond, nullptr);
+        locked = log->m_Mutex.try_lock();
+    }
+    if (locked || isFatal) log->FlushFile();
+    if (locked) log->m_Mutex.unlock();
+    s_Flushing.clear();
+}
+
 int ZV_LogGetConsoleTarget(ZV_LogTarget* target, void** user)
 {
     *target = ConsoleOutput;
@@ -152,15 +180,21 @@ int ZV_LogGetConsoleTarget(ZV_LogTarget* target, void** user)
 
 void ZV_LogReleaseConsoleTarget(ZV_LogTarget, void*) {}
 
-int ZV_LogGetFileTarget(const char* fileName, ZV_LogTarget* target, void** user, unsigned int maxSize, bool wrap)
+int GetFileTarget(const char* fileName, const char* mode, ZV_LogTarget* target, void** user, unsigned int maxSize,
+                  bool wrap)
 {
     *target = nullptr;
     *user = nullptr;
-    FILE* file = fileName ? fopen(fileName, "wb") : nullptr;
+    FILE* file = fileName ? fopen(fileName, mode) : nullptr;
     if (!file) return 2;
     *target = FileOutput;
     *user = new FileTarget{file, maxSize, 0, wrap};
     return 0;
+}
+
+int ZV_LogGetFileTarget(const char* fileName, ZV_LogTarget* target, void** user, unsigned int maxSize, bool wrap)
+{
+    return GetFileTarget(fileName, "wb", target, user, maxSize, wrap);
 }
 
 void ZV_LogReleaseFileTarget(ZV_LogTarget, void* user)

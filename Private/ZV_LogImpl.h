@@ -8,6 +8,10 @@
 #include "ZVString.h"
 #include "ZV_Log.h"
 
+/// ZV_LogGetFileTarget with fopen's mode: "wb", or "ab" for a file whose lines stay.
+int GetFileTarget(const char* fileName, const char* mode, ZV_LogTarget* target, void** user, unsigned int maxSize,
+                  bool wrap);
+
 class ZV_Log {
 public:
     static ZV_Log& GetInstance();
@@ -21,6 +25,11 @@ public:
     void Output(int id, int severity, const char* text) ZV_EXCLUDES(m_Mutex);
     void Output(int id, int severity, const char* text, unsigned int length) ZV_EXCLUDES(m_Mutex);
 
+    /// For signal handlers: writes out what the log file's stream holds, and from then on each line at once. Does not
+    /// allocate. Waits half a second at most for a thread that is writing; in a process that is lost (`isFatal`) it
+    /// then goes ahead, else that thread does it.
+    static void FlushInHandler(bool isFatal);
+
     static ZVString GetCurrentTime();
 
 private:
@@ -33,13 +42,15 @@ private:
     };
 
     bool IsArea(int id) const { return id >= 0 && id < m_Count.load(std::memory_order_acquire); }
-    void Emit(const ZVString& line, unsigned int length) ZV_EXCLUDES(m_Mutex);
+    void Emit(const ZVString& line, unsigned int length, int severity) ZV_EXCLUDES(m_Mutex);
+    void FlushFile() ZV_REQUIRES(m_Mutex);
     ZVString LineStart(int id) const;
 
     ZVMutex m_Mutex;
     std::array<Area, kMostAreas> m_Areas;
     std::atomic<int> m_Count{0};
     std::atomic<bool> m_HasTarget{false};
+    std::atomic<bool> m_FlushesEach{false};
     ZV_LogTarget m_Target ZV_GUARDED_BY(m_Mutex) = nullptr;
     void* m_User ZV_GUARDED_BY(m_Mutex) = nullptr;
 };

@@ -43,8 +43,8 @@ void ZV_LogSetTarget(ZV_LogTarget target, void* user);
 int ZV_LogGetConsoleTarget(ZV_LogTarget* target, void** user);
 void ZV_LogReleaseConsoleTarget(ZV_LogTarget target, void* user);
 
-/// A target that writes to a file, which it empties. `maxSize` 0 is no limit; else a full file starts again at its
-/// beginning
+/// A target that writes to a file, which it empties. Lines reach the disk's file when a buffer is full, when one of
+/// severity 1 comes, and at the release. `maxSize` 0 is no limit; else a full file starts again at its beginning
 /// (`wrap`), or takes no more. 0, or 2 and two nulls when the name is null or the file cannot be opened. Ends with
 /// ZV_LogReleaseFileTarget, after another target was set.
 int ZV_LogGetFileTarget(const char* fileName, ZV_LogTarget* target, void** user, unsigned int maxSize, bool wrap);

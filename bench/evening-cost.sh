@@ -87,7 +87,8 @@ count() { # MOVIE
     control DELETE >/dev/null
     ZV_FLASHVARS="cache=$folder/&keep=1" STAGECRAFT_MOVIE=movies/$1.js \
         strace -ff -o "$work/calls" -yy -s 0 -qq --seccomp-bpf -e signal=none \
-        -e trace=%network,read,readv,write,writev build/bin/zv_stagecraft 5 </dev/null >"$work/output" 2>&1 ||
+        -e trace=%network,read,readv,write,writev build/bin/zv_stagecraft 5 </dev/null >"$work/output" 2>&1 &&
+        [ "$(tail -n 1 "$work/output")" = "movie ended: ok" ] ||
         { tail -n 5 "$work/output" >&2; return 1; }
     echo "$(control GET | from_log) $(from_calls)"
 }

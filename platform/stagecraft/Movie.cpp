@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <cstdlib>
 
+#include "LastLine.h"
 #include "Text.h"
 
 using namespace ae::stagecraft;
@@ -34,6 +35,7 @@ bool Movie::Run()
     m_engine.SetRunning(false);
     m_stop.SetBreakTimer(nullptr);
     if (!m_engine.Alive()) {
+        LastLine::ScriptError();
         fprintf(stderr, "script error: did not return after a stop request and was broken off (%s)\n",
                 m_options.path.c_str());
     }

@@ -6,6 +6,8 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "LastLine.h"
+
 using namespace ae::stagecraft;
 
 namespace {
@@ -134,7 +136,10 @@ AEError Runtime::RunStageWindowSet(AEArray<StageWindow*>& set)
 {
     if (!Holds(set) || m_wasRun) return Failed(AEError::Usage);
     m_wasRun = true;
-    return m_movie->Run() ? Ok() : Failed(AEError::Generic);
+    LastLine::MovieBegins();
+    const bool succeeded = m_movie->Run();
+    LastLine::MovieEnds(m_stop.Raised());
+    return succeeded ? Ok() : Failed(AEError::Generic);
 }
 
 AEError Runtime::DestroyStageWindowSet(AEArray<StageWindow*>& set)

@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "LastLine.h"
 #include "ScriptBreak.h"
 #include "Text.h"
 
@@ -188,6 +189,7 @@ void ScriptEngine::ReportError()
     if (m_alive && described) ReadValue(-1, text);
     Pop();
     Pop();
+    LastLine::ScriptError();
     fprintf(stderr, "script error: %s%s%s\n", described ? text.GetString().c_str() : "an error without description",
             m_currentMethod.empty() ? "" : ", called by ", m_currentMethod.c_str());
 }

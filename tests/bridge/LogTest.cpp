@@ -1,7 +1,13 @@
 // The tracer, and the log that a movie sets up.
 #include <gtest/gtest.h>
+
 #include <algorithm>
+#include <atomic>
+#include <filesystem>
+#include <set>
 #include <sstream>
+#include <thread>
+#include <vector>
 
 #include "MovieRun.h"
 #include "TempFolder.h"
@@ -18,11 +24,12 @@ protected:
         ZV_LogSetTarget(nullptr, nullptr);
     }
 
-    // The file's lines without their times.
+    // The file's lines without their times. The next ones go to a new file.
     std::string File()
     {
         ZVWSAELog::InitWSLogs(0, ZVWSAELog::kConsole);
         std::istringstream file(m_Temp.Read("log.txt"));
+        std::filesystem::remove(m_Folder + "log.txt");
         std::string text;
         for (std::string line; std::getline(file, line);)
             text += "[" + line.substr(std::min(line.size(), sizeof "[HH:MM:SS.mmm-" - 1)) + "\n";
@@ -84,14 +91,14 @@ TEST_F(Log, AMovieSetsItUpUnlessTheEnvironmentDoes)
         unsetenv("ZV_LOG");
         EXPECT_EQ("0,-1\n", run.Text());
         EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
-        std::filesystem::remove(m_Folder + "log.txt");
     }
     // What is refused changes nothing.
     EXPECT_EQ(0, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, m_Folder.c_str()));
     EXPECT_EQ(
-        "-3,-3,-3,-3,-3,-3\n",
+        "-3,-3,-3,-3,-3,-3,-3\n",
         RunMovie("var lib = com.orvex.ZVWSLib, names = ['LogAreaIDs', 'LogTarget', 'SettingsFile', 'PreferenceFile'];\n"
-                 "report([lib.setLogAreaIDsAndTargetConfig(), lib.setLogAreaIDsAndTargetConfig('0x100')].concat(\n"
+                 "report([lib.setLogAreaIDsAndTargetConfig(), lib.setLogAreaIDsAndTargetConfig('0x100'),\n"
+                 "    lib.setLogAreaIDsAndTargetConfig([{}, {LogAreaIDs: 0x200, LogTarget: 1}])].concat(\n"
                  "    names.map(function (name) {\n"
                  "        var settings = {LogAreaIDs: 0x200, LogTarget: 1, SettingsFile: '/no/such/s'};\n"
                  "        settings[name] = {toString: function () { throw new Error('on purpose'); }};\n"
@@ -99,6 +106,46 @@ TEST_F(Log, AMovieSetsItUpUnlessTheEnvironmentDoes)
                  "new lib().getNavigation();\n")
             .Text());
     EXPECT_EQ("[ZV_WSAE] Entering ZVWSLibAE::getNavigation\n[ZV_WSAE] Exiting ZVWSLibAE::getNavigation\n", File());
+}
+
+TEST_F(Log, SettingItUpAgainLosesAndGarblesNothing)
+{
+    const TempFolder other;
+    const std::string folders[] = {m_Folder, m_Temp / "./", other / "", m_Folder};
+    ASSERT_EQ(0, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, m_Folder.c_str()));
+    std::atomic<bool> stop{false};
+    std::atomic<int> logged{0};
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 2; ++i) {
+        threads.emplace_back([&] {
+            while (!stop)
+                ZV_LogOutput(AreaId("ZV_WSAE"), ZV_LOG_TRACE, "line %d.\n", logged++);
+        });
+    }
+    for (int i = 0; i < 40 || logged < 1000; ++i)
+        ASSERT_EQ(0, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, folders[i % 4].c_str()));
+    stop = true;
+    for (std::thread& thread : threads)
+        thread.join();
+
+    std::istringstream lines(File() + other.Read("log.txt"));
+    std::set<int> seen;
+    for (std::string line; std::getline(lines, line);) {
+        int number = -1;
+        char point = 0;
+        const size_t text = line.find("] line ");
+        ASSERT_TRUE(text != std::string::npos && sscanf(&line[text], "] line %d%c", &number, &point) == 2) << line;
+        EXPECT_TRUE(point == '.' && seen.insert(number).second) << line;
+    }
+    EXPECT_EQ(static_cast<size_t>(logged), seen.size());
+}
+
+TEST_F(Log, ARefusedInitIsNotLeft)
+{
+    ASSERT_EQ(0, ZVWSAELog::InitWSLogs(0x100, ZVWSAELog::kFile, m_Folder.c_str()));
+    EXPECT_EQ("-3,-3\n", RunMovie("var ws = new com.orvex.ZVWSLib(); report([ws.init(), ws.init([{}])]);\n").Text());
+    const std::string refused = "[ZV_WSAE] Entering ZVWSLibAE::init\n[ZV_WSAE] Exiting ZVWSLibAE::init\n";
+    EXPECT_EQ(refused + refused, File());
 }
 
 }  // namespace

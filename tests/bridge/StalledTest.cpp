@@ -1,4 +1,6 @@
 // The movie goes on while the services hang, and ends soon while a call does, at every stage at which it can hang.
+#include <ctype.h>
+
 #include <chrono>
 
 #include "StoreMovie.h"
@@ -8,7 +10,21 @@ namespace {
 struct Stage {
     const char* fault;
     const char* method;  // the call that hangs
+
+    // Letters, digits and "_".
+    std::string Name() const
+    {
+        std::string name = std::string(method) + "_" + fault;
+        for (char& c : name) {
+            if (!isalnum(static_cast<unsigned char>(c))) c = '_';
+        }
+        return name;
+    }
 };
+void PrintTo(const Stage& stage, std::ostream* stream)
+{
+    *stream << stage.Name();
+}
 
 class Stalled : public StoreMovie, public testing::WithParamInterface<Stage> {};
 
@@ -33,7 +49,8 @@ INSTANTIATE_TEST_SUITE_P(Stages, Stalled,
                                          Stage{"getNavigation=stall", "getNavigation"},
                                          Stage{"getNavigation=stall-body", "getNavigation"},
                                          Stage{"getNavigation=drip:300", "getNavigation"},
-                                         Stage{"bandwidth=stall", "checkBandwidth"}));
+                                         Stage{"bandwidth=stall", "checkBandwidth"}),
+                         [](const auto& info) { return info.param.Name(); });
 
 // ---- Methods that answer at once, with nothing under way and beside a call that hangs. Those that are not here reach
 // no session: the static ones, which have no instance, getSysInfo and quitFlash.

@@ -241,7 +241,6 @@ function call(name, parameters, next) {
             if (status === -1001 && result === null) { status = 0; result = 'an address'; }
             if (/^[0-9a-f.:]+$/.test(result) && !/^127\.|^::1$/.test(result)) result = 'an address';
         }
-        if (name === 'init') trace('');  // the library's line about the user agent has no end
         show(name, status, result);
         next();
     }}, parameters]);

@@ -15,6 +15,12 @@ struct MovieOutput {
         }
         return "(none)";
     }
+    /// What the movie did: "ok", "stopped" or "script error", by the last line of the error stream.
+    std::string End() const
+    {
+        const std::string prefix = "movie ended: ";
+        return !lines.empty() && lines.back().rfind(prefix, 0) == 0 ? lines.back().substr(prefix.size()) : "(unknown)";
+    }
     std::string Text() const
     {
         std::string text;

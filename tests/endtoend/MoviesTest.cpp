@@ -12,8 +12,9 @@ protected:
                             {{"ZV_DEPLOYMENT", deployment.empty() ? store->DeploymentFile() : deployment}});
     }
 
-    static void ExpectScriptErrors(const MovieOutput& output, const std::string& error)
+    static void ExpectScriptError(const MovieOutput& output, const std::string& error)
     {
+        EXPECT_EQ("script error", output.End());
         EXPECT_EQ(error, output.After("script error: ").substr(0, error.size())) << output.Text();
     }
 
@@ -21,7 +22,7 @@ protected:
     void ExpectWell(const MovieOutput& output) const
     {
         EXPECT_EQ(0, output.status);
-        ExpectScriptErrors(output, "(none)");
+        EXPECT_EQ("ok", output.End()) << output.Text();
         for (const LoggedRequest& request : store->Log())
             EXPECT_EQ("", request.violation) << request.operation;
     }
@@ -51,18 +52,19 @@ TEST_F(Demonstration, AnEveningChangesTheAccount)
 TEST_F(Demonstration, AStoreThatCannotBeTrustedOrReachedEndsTheMovieWithAnError)
 {
     store->SetCertificate(CertificateKind::Untrusted);
-    ExpectScriptErrors(Run("storefront.js"), "Error: init failed with status -2011");
-    ExpectScriptErrors(Run("storefront.js", "/no/such/file"), "Error: init failed with status -1900");
+    ExpectScriptError(Run("storefront.js"), "Error: init failed with status -2011");
+    ExpectScriptError(Run("storefront.js", "/no/such/file"), "Error: init failed with status -1900");
     store->SetCertificate(CertificateKind::Good);
     Fault("getTitlesByNavigation=http:503");
-    ExpectScriptErrors(Run("storefront.js"), "Error: getTitles failed with status -4503");
-    ExpectScriptErrors(Run("storefront.js"), "(none)");
+    ExpectScriptError(Run("storefront.js"), "Error: getTitles failed with status -4503");
+    EXPECT_EQ("ok", Run("storefront.js").End());
 }
 
 TEST_F(Demonstration, AMovieThatCannotBeReadIsOneLine)
 {
     const MovieOutput output = Run("no-such-movie.js");
     EXPECT_EQ("", output.After("[ZV_FLASH]CreateAndConfigureStageWindowSet fail "));
+    EXPECT_EQ("(unknown)", output.End());
     EXPECT_NE(std::string::npos, output.After("stagecraft: cannot read the movie ").find("no-such-movie.js"));
 }
 

@@ -148,6 +148,29 @@ TEST_F(LogTest, FileTargetsEndAtTheirSize)
     ZV_LogReleaseFileTarget(target, user);
 }
 
+// An error takes along what came before it; the rest waits for a full buffer.
+TEST_F(LogTest, ErrorsReachTheFileAtOnce)
+{
+    const TempFolder folder;
+    const int id = Register("errors");
+    ZV_LogTarget target;
+    void* user;
+    ASSERT_EQ(0, ZV_LogGetFileTarget((folder / "log.txt").c_str(), &target, &user, 0, true));
+    ZV_LogSetTarget(target, user);
+    const std::pair<int, bool> rows[] = {{ZV_LOG_TRACE, false}, {ZV_LOG_ERROR, true}, {ZV_LOG_VERBOSE, false}};
+    for (const auto& [severity, flushes] : rows) {
+        const std::string text = "severity " + std::to_string(severity) + "\n";
+        for (const bool withLength : {false, true}) {
+            withLength ? ZV_LogOutputwithLen(id, severity, text.data(), static_cast<unsigned int>(text.size()))
+                       : ZV_LogOutput(id, severity, "%s", text.c_str());
+            const std::string file = folder.Read("log.txt");
+            EXPECT_EQ(flushes, file.size() >= text.size() && file.substr(file.size() - text.size()) == text) << text;
+        }
+    }
+    ZV_LogSetTarget(nullptr, nullptr);
+    ZV_LogReleaseFileTarget(target, user);
+}
+
 // Under changes of the area's state and of the target: lines stay whole, and none reaches a target once replaced.
 TEST_F(LogTest, ServesSeveralThreads)
 {

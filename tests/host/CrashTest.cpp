@@ -1,9 +1,14 @@
 // The reports of signals: real faults in a child of the test, and the real process.
 #include "CrashHandler.h"
 
+#include <errno.h>
+#include <fcntl.h>
+#include <limits.h>
+#include <malloc.h>
 #include <stdlib.h>
 #include <string.h>
 #include <sys/mman.h>
+#include <sys/prctl.h>
 #include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -11,17 +16,23 @@
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
+#include <functional>
+#include <thread>
 
+#include "CrashConsole.h"
 #include "HostLines.h"
 #include "TempFolder.h"
-
-// The handler's stdio is accepted.
-extern "C" const char* __tsan_default_options()
-{
-    return "report_signal_unsafe=0";
-}
+#include "ZVThread.h"
+#include "ZV_Log.h"
 
 namespace {
+
+// The allocator of the C library ends the process in an order of its own; a sanitizer's does in another.
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+constexpr bool kHasPlainHeap = false;
+#else
+constexpr bool kHasPlainHeap = true;
+#endif
 
 // ---- Faults
 
@@ -48,6 +59,42 @@ void Overflow()
     Deepen(0);
 }
 
+// On a thread of the client's.
+void OverflowElsewhere()
+{
+    ZVThread* thread = ZVThread::CreateThread();
+    thread->Run(
+        "overflow", [](void*) { Overflow(); }, nullptr);
+    ZVThread::SafeDestroyThread(thread);
+}
+
+// Writes over the size of the heap's rest. The allocator ends the process when it next looks there, with its lock held,
+// which it takes only in a process with threads.
+void CorruptHeap()
+{
+    std::thread([] { pause(); }).detach();
+    mallopt(M_ARENA_MAX, 1);
+    const size_t size = 100000;  // from the rest, not out of a bin
+    static char* volatile last;
+    last = static_cast<char*>(malloc(size));
+    static char* volatile rest;
+    rest = last + malloc_usable_size(last);
+    memset(rest, 0xff, sizeof(size_t));
+    last = static_cast<char*>(malloc(size));
+}
+
+// Nobody reads what it prints.
+void AbortBehindAFullPipe()
+{
+    int ends[2];
+    if (pipe2(ends, O_NONBLOCK) != 0) _exit(1);
+    while (write(ends[1], "x", 1) == 1) {
+    }
+    fcntl(ends[1], F_SETFL, 0);
+    dup2(ends[1], STDOUT_FILENO);
+    abort();
+}
+
 // As a fault repeats.
 template <int kSignal>
 void RaiseTwice()
@@ -62,8 +109,9 @@ void OldSegv(int signal)
     _exit(signal + 100);
 }
 
-void Fail(void (*cause)())
+void Fail(const std::function<void()>& cause)
 {
+    prctl(PR_SET_PDEATHSIG, SIGKILL);  // a report that hangs ends with the test
     dup2(STDERR_FILENO, STDOUT_FILENO);
     struct sigaction old = {};
     old.sa_handler = OldSegv;
@@ -72,6 +120,13 @@ void Fail(void (*cause)())
     zv_dbg_init();
     _EN_CORE_DUMP = true;
     cause();
+}
+
+// The report of a fatal signal, to the end of what is printed. No line of registers has a "k".
+std::string Report(const std::string& title, bool backtrace)
+{
+    return "\n" + title + "\nPid: [0-9]+, comm: +host_tests\npc : \\[<[^k]*\n" +
+           (backtrace ? "backtrace:\n.+\\[0x[0-9a-f]+\\]\n" : "") + "Using default signal handler\\.\n$";
 }
 
 TEST(FaultDeathTest, IsReported)
@@ -86,15 +141,71 @@ TEST(FaultDeathTest, IsReported)
         bool backtrace;
     } rows[] = {{SIGSEGV, Touch, "Invalid memory reference" + pc + "addr: " + address, false},
                 {SIGSEGV, Overflow, "Invalid memory reference" + pc + "addr: 0x[0-9a-f]+\n", false},
+                {SIGSEGV, OverflowElsewhere, "Invalid memory reference" + pc + "addr: 0x[0-9a-f]+\n", false},
                 {SIGILL, RaiseTwice<SIGILL>, "Illegal Instruction" + pc + "inst: 0x[0-9a-f]{8}\n", true},
                 {SIGFPE, RaiseTwice<SIGFPE>, "Floating point exception" + pc + "inst: 0x[0-9a-f]{8}\n", true},
                 {SIGABRT, RaiseTwice<SIGABRT>, " Abort signal\n\n", true}};
-    for (const auto& row : rows) {
-        // No line of registers has a "k".
-        const std::string report = "^\n" + row.title + "\nPid: [0-9]+, comm: +host_tests\npc : \\[<[^k]*\n" +
-                                   (row.backtrace ? "backtrace:\n.*\n" : "") + "Using default signal handler\\.\n$";
-        EXPECT_EXIT(Fail(row.cause), testing::ExitedWithCode(row.signal + 100), report);
-    }
+    for (const auto& row : rows)
+        EXPECT_EXIT(Fail(row.cause), testing::ExitedWithCode(row.signal + 100), "^" + Report(row.title, row.backtrace));
+}
+
+// What was printed and logged before comes first, and nothing of it is lost.
+TEST(FaultDeathTest, ABrokenHeapIsReportedAfterWhatCameBefore)
+{
+    if (!kHasPlainHeap) GTEST_SKIP() << "a sanitizer's allocator";
+    const TempFolder folder;
+    const auto cause = [&] {
+        int area = -1;
+        ZV_LogTarget target;
+        void* file;
+        ZV_LogRegisterArea("crash", &area);
+        ZV_LogGetFileTarget((folder / "log.txt").c_str(), &target, &file, 0, true);
+        ZV_LogSetTarget(target, file);
+        ZV_LogOutput(area, ZV_LOG_TRACE, "logged before\n");
+        printf("printed before\n");
+        CorruptHeap();
+    };
+    // The C library goes on to the default action.
+    EXPECT_EXIT(Fail(cause), testing::KilledBySignal(SIGABRT), "printed before\n" + Report(" Abort signal\n\n", true));
+    EXPECT_NE(std::string::npos, folder.Read("log.txt").find("-crash] logged before\n"));
+}
+
+TEST(FaultDeathTest, EndsInTimeThoughTheConsoleTakesNothing)
+{
+    EXPECT_EXIT(Fail(AbortBehindAFullPipe), testing::ExitedWithCode(SIGABRT + 100), "");
+}
+
+TEST(FaultDeathTest, TheInterruptedCodeKeepsItsErrno)
+{
+    const auto interrupt = [] {
+        zv_dbg_init();
+        errno = EXDEV;
+        raise(SIGTERM);
+        _exit(errno == EXDEV ? 0 : 1);
+    };
+    EXPECT_EXIT(interrupt(), testing::ExitedWithCode(0), "");
+}
+
+TEST(CrashConsoleTest, PrintsAsPrintfDoes)
+{
+    testing::internal::CaptureStdout();
+    char expected[256];
+    const auto print = [](auto printer) {
+        printer("%d|%-2d|%3d|%d|%s|%6s|%-6s|", 0, 7, -12, INT_MIN, "", "right", "left");
+        printer("%p|%p|%lx|%08lx|%016lx|", static_cast<void*>(nullptr), reinterpret_cast<void*>(0xabc), 0ul, 0x1ful,
+                ~0ul);
+    };
+    std::string wanted;
+    print([&](const char* format, auto... values) {
+        snprintf(expected, sizeof expected, format, values...);
+        wanted += expected;
+    });
+    print([](const char* format, auto... values) { CrashPrint(format, values...); });
+    EXPECT_EQ(wanted, testing::internal::GetCapturedStdout());
+
+    testing::internal::CaptureStdout();
+    CrashPrint("%s", std::string(5000, 'x').c_str());
+    EXPECT_EQ(std::string(1023, 'x') + "\n", testing::internal::GetCapturedStdout());
 }
 
 // ---- The process
@@ -105,7 +216,7 @@ protected:
     {
         Environment environment = {{"STAGECRAFT_MOVIE", m_folder.Write("movie.js", kRunsOn)},
                                    // A sanitizer's own handlers would be the actions from before.
-                                   {"TSAN_OPTIONS", "report_signal_unsafe=0:handle_segv=0"},
+                                   {"TSAN_OPTIONS", "handle_segv=0"},
                                    {"ASAN_OPTIONS", "handle_segv=0"}};
         environment.insert(environment.end(), more.begin(), more.end());
         return environment;

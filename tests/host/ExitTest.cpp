@@ -44,8 +44,30 @@ TEST_F(ExitTest, ActiveExit)
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"hello"}) + ActiveExitLines(),
                         ListenLines({InitMessage(), DoneMessage()})));
-    EXPECT_EQ(Lines{}, host.Errors());
+    EXPECT_EQ(Lines{"movie ended: ok"}, host.Errors());
     ExpectReceived({});
+}
+
+// Nothing follows the line that says what the movie did, not even what comes after the runtime is gone.
+TEST_F(ExitTest, TheErrorStreamEndsWithWhatTheMovieDid)
+{
+    const std::pair<const char*, const char*> rows[] = {{"", "ok"},
+                                                        {"throw new Error('1');", "script error"},
+                                                        {"setTimeout(nothing, 0);", "script error"},
+                                                        {"setTimeout(function () { nothing(); }, 0);", "script error"}};
+    for (const auto& [movie, end] : rows) {
+        Process host({ZV_STAGECRAFT, "5"}, WithMovie(movie));
+        m_player.Accept();
+        ASSERT_TRUE(host.WaitForLine("[ZV_FLASH] ZV FLASH Run End "));
+        m_player.SendBytes("x");
+        m_player.Send(6);
+        EXPECT_EQ(0, host.WaitForEnd());
+        const Lines errors = host.Errors();
+        ASSERT_GE(errors.size(), 2u);
+        EXPECT_EQ("player: dropped a packet of 1 bytes, a message has 16", errors[errors.size() - 2]);
+        EXPECT_EQ(std::string("movie ended: ") + end, errors.back());
+        m_player.Close();
+    }
 }
 
 TEST_F(ExitTest, ActiveExitThatNobodyAcknowledges)
@@ -133,7 +155,7 @@ TEST_F(ExitTest, RequestedClose)
         host.Output(), StartLines() + MovieLines({"running"}) + ReleaseLines(),
         ListenLines({NetworkErrorMessage(), {"[ZV_FLASH] IPC get 2 "}, {"[ZV_FLASH] IPC get -1 "}, UninitMessage()})));
     EXPECT_EQ((Lines{"player: dropped a packet of 15 bytes, a message has 16",
-                     "player: dropped a packet of 17 bytes, a message has 16"}),
+                     "player: dropped a packet of 17 bytes, a message has 16", "movie ended: stopped"}),
               host.Errors());
     ExpectReceived({4});
 }
@@ -165,7 +187,8 @@ TEST_F(ExitTest, NoQueue)
     const Lines nothingSent = {"[ZV_FLASH] ipc thread already exit, now do nothing! ", "[ZV_FLASH] ZV FLASH Run End "};
     EXPECT_TRUE(IsMerge(host.Output(), start + MovieLines() + FinalizeLines() + nothingSent,
                         ListenLines({ReceiveFailure(ENOTCONN)})));
-    EXPECT_EQ(Lines{"player: no queue to the player system at " + m_folder / "nobody" + ": No such file or directory"},
+    EXPECT_EQ((Lines{"player: no queue to the player system at " + m_folder / "nobody" + ": No such file or directory",
+                     "movie ended: stopped"}),
               host.Errors());
 }
 

@@ -1,4 +1,6 @@
 // What the host makes of its arguments and environment before the movie runs.
+#include <filesystem>
+
 #include "HostLines.h"
 #include "TempFolder.h"
 
@@ -46,6 +48,24 @@ TEST(VariantTest, ChoosesMovieAndFlashVariables)
     EXPECT_TRUE(replaced.WaitForLine("a=1&b=x"));
     EXPECT_EQ(0, replaced.WaitForEnd());
     EXPECT_EQ("** a=%31&b=x **", replaced.Output().at(0));
+}
+
+// No file, socket or database of the process takes the place of its console.
+TEST(StreamsTest, ClosedOnesAreFilled)
+{
+    const TempFolder folder;
+    Player player(folder / "player");
+    Process host({"/bin/sh", "-c", "exec \"$0\" 5 <&- >&- 2>&-", ZV_STAGECRAFT},
+                 {{"ZV_IPC_SOCKET", folder / "player"}, {"STAGECRAFT_MOVIE", folder.Write("movie.js", kRunsOn)}});
+    player.Accept();
+    for (const char* stream : {"0", "1", "2"}) {
+        const std::string file = "/proc/" + std::to_string(host.Pid()) + "/fd/" + stream;
+        std::error_code none;
+        EXPECT_EQ("/dev/null", std::filesystem::read_symlink(file, none)) << stream;
+    }
+    player.Send(3);
+    EXPECT_EQ(Player::Message(4), player.Receive());
+    EXPECT_EQ(0, host.WaitForEnd());
 }
 
 TEST(DrmTest, FailureStartsNothingElse)

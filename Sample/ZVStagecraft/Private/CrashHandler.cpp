@@ -1,14 +1,19 @@
 #include "CrashHandler.h"
 
+#include <dlfcn.h>
+#include <errno.h>
 #include <execinfo.h>
+#include <link.h>
 #include <stdint.h>
-#include <stdio.h>
-#include <stdlib.h>
 #include <string.h>
 #include <sys/prctl.h>
 #include <termios.h>
 #include <ucontext.h>
 #include <unistd.h>
+
+#include "CrashConsole.h"
+#include "SignalStack.h"
+#include "ZV_LogImpl.h"
 
 volatile bool _EN_CORE_DUMP = false;
 
@@ -24,11 +29,11 @@ unsigned long ProgramCounter(const sigcontext& r)
 }
 void PrintRegisters(const sigcontext& r)
 {
-    printf("pc : [<%08lx>]    lr : [<%08lx>]    psr: %08lx\nsp : %08lx  ip : %08lx  fp : %08lx\n", r.arm_pc, r.arm_lr,
-           r.arm_cpsr, r.arm_sp, r.arm_ip, r.arm_fp);
-    printf("r10: %08lx  r9 : %08lx  r8 : %08lx\n", r.arm_r10, r.arm_r9, r.arm_r8);
-    printf("r7 : %08lx  r6 : %08lx  r5 : %08lx  r4 : %08lx\n", r.arm_r7, r.arm_r6, r.arm_r5, r.arm_r4);
-    printf("r3 : %08lx  r2 : %08lx  r1 : %08lx  r0 : %08lx\n", r.arm_r3, r.arm_r2, r.arm_r1, r.arm_r0);
+    CrashPrint("pc : [<%08lx>]    lr : [<%08lx>]    psr: %08lx\nsp : %08lx  ip : %08lx  fp : %08lx\n", r.arm_pc,
+               r.arm_lr, r.arm_cpsr, r.arm_sp, r.arm_ip, r.arm_fp);
+    CrashPrint("r10: %08lx  r9 : %08lx  r8 : %08lx\n", r.arm_r10, r.arm_r9, r.arm_r8);
+    CrashPrint("r7 : %08lx  r6 : %08lx  r5 : %08lx  r4 : %08lx\n", r.arm_r7, r.arm_r6, r.arm_r5, r.arm_r4);
+    CrashPrint("r3 : %08lx  r2 : %08lx  r1 : %08lx  r0 : %08lx\n", r.arm_r3, r.arm_r2, r.arm_r1, r.arm_r0);
 }
 #elif defined(__aarch64__)
 unsigned long ProgramCounter(const sigcontext& r)
@@ -38,12 +43,12 @@ unsigned long ProgramCounter(const sigcontext& r)
 void PrintRegisters(const sigcontext& r)
 {
     const auto x = [&](int n) { return static_cast<unsigned long>(r.regs[n]); };
-    printf("pc : [<%016lx>]    lr : [<%016lx>]    pstate: %08lx\nsp : %016lx  fp : %016lx\n", ProgramCounter(r), x(30),
-           static_cast<unsigned long>(r.pstate), static_cast<unsigned long>(r.sp), x(29));
-    printf("x28: %016lx\n", x(28));
+    CrashPrint("pc : [<%016lx>]    lr : [<%016lx>]    pstate: %08lx\nsp : %016lx  fp : %016lx\n", ProgramCounter(r),
+               x(30), static_cast<unsigned long>(r.pstate), static_cast<unsigned long>(r.sp), x(29));
+    CrashPrint("x28: %016lx\n", x(28));
     for (int n = 27; n > 0; n -= 4) {
-        printf("x%-2d: %016lx  x%-2d: %016lx  x%-2d: %016lx  x%-2d: %016lx\n", n, x(n), n - 1, x(n - 1), n - 2,
-               x(n - 2), n - 3, x(n - 3));
+        CrashPrint("x%-2d: %016lx  x%-2d: %016lx  x%-2d: %016lx  x%-2d: %016lx\n", n, x(n), n - 1, x(n - 1), n - 2,
+                   x(n - 2), n - 3, x(n - 3));
     }
 }
 #elif defined(__x86_64__)
@@ -55,12 +60,12 @@ void PrintRegisters(const sigcontext& r)
 {
     // Some C libraries declare the fields as long long.
     const auto hex = [](unsigned long value) { return value; };
-    printf("pc : [<%016lx>]    flags: %08lx\nsp : %016lx  bp : %016lx\n", hex(r.rip), hex(r.eflags), hex(r.rsp),
-           hex(r.rbp));
-    printf("r15: %016lx  r14: %016lx  r13: %016lx  r12: %016lx\n", hex(r.r15), hex(r.r14), hex(r.r13), hex(r.r12));
-    printf("r11: %016lx  r10: %016lx  r9 : %016lx  r8 : %016lx\n", hex(r.r11), hex(r.r10), hex(r.r9), hex(r.r8));
-    printf("di : %016lx  si : %016lx\n", hex(r.rdi), hex(r.rsi));
-    printf("dx : %016lx  cx : %016lx  bx : %016lx  ax : %016lx\n", hex(r.rdx), hex(r.rcx), hex(r.rbx), hex(r.rax));
+    CrashPrint("pc : [<%016lx>]    flags: %08lx\nsp : %016lx  bp : %016lx\n", hex(r.rip), hex(r.eflags), hex(r.rsp),
+               hex(r.rbp));
+    CrashPrint("r15: %016lx  r14: %016lx  r13: %016lx  r12: %016lx\n", hex(r.r15), hex(r.r14), hex(r.r13), hex(r.r12));
+    CrashPrint("r11: %016lx  r10: %016lx  r9 : %016lx  r8 : %016lx\n", hex(r.r11), hex(r.r10), hex(r.r9), hex(r.r8));
+    CrashPrint("di : %016lx  si : %016lx\n", hex(r.rdi), hex(r.rsi));
+    CrashPrint("dx : %016lx  cx : %016lx  bx : %016lx  ax : %016lx\n", hex(r.rdx), hex(r.rcx), hex(r.rbx), hex(r.rax));
 }
 #else
 #error "tell the crash handler the registers of this processor"
@@ -73,13 +78,12 @@ void* PointerTo(unsigned long address)
 
 void DrainConsole()
 {
-    fflush(stdout);
     tcdrain(STDOUT_FILENO);
 }
 
 void PrintName(const char* name)
 {
-    printf("\n%s\n\n", name);
+    CrashPrint("\n%s\n\n", name);
 }
 
 void PrintInstruction(const sigcontext& registers)
@@ -87,25 +91,59 @@ void PrintInstruction(const sigcontext& registers)
     const unsigned long pc = ProgramCounter(registers);
     uint32_t instruction;
     memcpy(&instruction, PointerTo(pc), sizeof(instruction));
-    printf("\tpc: %p, inst: 0x%08lx\n", PointerTo(pc), static_cast<unsigned long>(instruction));
+    CrashPrint("\tpc: %p, inst: 0x%08lx\n", PointerTo(pc), static_cast<unsigned long>(instruction));
 }
 
 // Asked to end: the next one of its kind takes the action from before start-up.
 void GiveBack(int signal, const char* name, const struct sigaction& old)
 {
     PrintName(name);
-    printf("Using default signal handler.\n");
+    CrashPrint("Using default signal handler.\n");
     DrainConsole();
     sigaction(signal, &old, nullptr);
+}
+
+// With a core dump the report has this many seconds, whatever it meets: a console that takes nothing, a lock of the
+// loader that nobody will free.
+constexpr unsigned kMostSeconds = 5;
+volatile int s_reported = 0;  // the signal
+
+void Unblock(int signal)
+{
+    sigset_t signals;
+    sigemptyset(&signals);
+    sigaddset(&signals, signal);
+    pthread_sigmask(SIG_UNBLOCK, &signals, nullptr);
+}
+
+void OnTimeout(int)
+{
+    const int signal = s_reported;
+    sigaction(signal, &old_segv, nullptr);
+    Unblock(signal);
+    raise(signal);
+    _exit(128 + signal);  // the action was to go on
+}
+
+void LimitTime(int signal)
+{
+    s_reported = signal;
+    struct sigaction action = {};
+    sigemptyset(&action.sa_mask);
+    action.sa_handler = OnTimeout;
+    sigaction(SIGALRM, &action, nullptr);
+    Unblock(SIGALRM);
+    alarm(kMostSeconds);
 }
 
 // All fatal signals get the action that SIGSEGV had.
 void EndFatal(int signal)
 {
     if (_EN_CORE_DUMP) {
-        printf("Using default signal handler.\n");
+        CrashPrint("Using default signal handler.\n");
         DrainConsole();
         sigaction(signal, &old_segv, nullptr);
+        alarm(0);
         return;
     }
     for (;;) {
@@ -113,45 +151,29 @@ void EndFatal(int signal)
     }
 }
 
-// A stack overflow can be reported on a stack of its own only. A sanitizer may have provided one.
-void ProvideSignalStack()
+bool IsFatal(int signal)
 {
-    static char stack[1 << 16];
-    stack_t current;
-    if (sigaltstack(nullptr, &current) != 0 || !(current.ss_flags & SS_DISABLE)) return;
-    stack_t own = {};
-    own.ss_sp = stack;
-    own.ss_size = sizeof(stack);
-    sigaltstack(&own, nullptr);
+    return signal == SIGILL || signal == SIGABRT || signal == SIGFPE || signal == SIGSEGV;
 }
 
-}  // namespace
-
-void show_regs(sigcontext* registers)
+// As backtrace_symbols writes it, without its memory.
+void PrintFrame(void* address)
 {
-    char name[20] = {};
-    prctl(PR_GET_NAME, name);
-    printf("\nPid: %d, comm: %20s\n", static_cast<int>(getpid()), name);
-    PrintRegisters(*registers);
-}
-
-__attribute__((noinline)) void dump_stack()
-{
-    void* frames[32];
-    const int count = backtrace(frames, 32);
-    char** symbols = backtrace_symbols(frames, count);
-    if (!symbols) return;
-    printf("backtrace:\n");
-    for (int i = 1; i < count; ++i) {
-        printf("%s\n", symbols[i]);
+    Dl_info symbol;
+    link_map* object = nullptr;
+    if (!dladdr1(address, &symbol, reinterpret_cast<void**>(&object), RTLD_DL_LINKMAP) || !symbol.dli_fname ||
+        !*symbol.dli_fname) {
+        CrashPrint("[%p]\n", address);
+        return;
     }
-    free(symbols);
+    const auto at = reinterpret_cast<uintptr_t>(address);
+    const uintptr_t start = symbol.dli_sname ? reinterpret_cast<uintptr_t>(symbol.dli_saddr) : object->l_addr;
+    CrashPrint("%s(%s%s0x%lx) [%p]\n", symbol.dli_fname, symbol.dli_sname ? symbol.dli_sname : "",
+               at < start ? "-" : "+", static_cast<unsigned long>(at < start ? start - at : at - start), address);
 }
 
-void sighandler(int signal, siginfo_t* info, void* context)
+void Report(int signal, const siginfo_t& info, sigcontext* registers)
 {
-    // The kernel's own name for the machine part of the context.
-    sigcontext* registers = reinterpret_cast<sigcontext*>(&static_cast<ucontext_t*>(context)->uc_mcontext);
     switch (signal) {
         case SIGINT:
             return GiveBack(signal, "Interrupt from keyboard", old_int);
@@ -173,7 +195,7 @@ void sighandler(int signal, siginfo_t* info, void* context)
             break;
         case SIGSEGV:
             PrintName("Invalid memory reference");
-            printf("\tpc: %p, addr: %p\n", PointerTo(ProgramCounter(*registers)), info->si_addr);
+            CrashPrint("\tpc: %p, addr: %p\n", PointerTo(ProgramCounter(*registers)), info.si_addr);
             show_regs(registers);
             break;
         default:
@@ -183,9 +205,41 @@ void sighandler(int signal, siginfo_t* info, void* context)
     EndFatal(signal);
 }
 
+}  // namespace
+
+void show_regs(sigcontext* registers)
+{
+    char name[20] = {};
+    prctl(PR_GET_NAME, name);
+    CrashPrint("\nPid: %d, comm: %20s\n", static_cast<int>(getpid()), name);
+    PrintRegisters(*registers);
+}
+
+__attribute__((noinline)) void dump_stack()
+{
+    void* frames[32];
+    const int count = backtrace(frames, 32);
+    CrashPrint("backtrace:\n");
+    for (int i = 1; i < count; ++i)
+        PrintFrame(frames[i]);
+}
+
+void sighandler(int signal, siginfo_t* info, void* context)
+{
+    const int error = errno;  // the interrupted code's
+    const bool isFatal = IsFatal(signal);
+    if (isFatal && _EN_CORE_DUMP) LimitTime(signal);
+    CrashFlush();
+    ZV_Log::FlushInHandler(isFatal);
+    // The kernel's own name for the machine part of the context.
+    Report(signal, *info, reinterpret_cast<sigcontext*>(&static_cast<ucontext_t*>(context)->uc_mcontext));
+    errno = error;
+}
+
 void zv_dbg_init()
 {
-    ProvideSignalStack();
+    static SignalStack& stack = *new SignalStack;  // main thread's, to its end
+    static_cast<void>(stack);
     void* frame;
     backtrace(&frame, 1);  // its first call loads a library, which a handler had better not
     struct sigaction action = {};

@@ -10,8 +10,9 @@ extern volatile bool _EN_CORE_DUMP;
 /// Installs the handlers, for all threads. Once, first thing in the process, main thread.
 void zv_dbg_init();
 
-/// The handler. Runs on the thread that took the signal. Uses stdio, which no handler may; a report that can fail is
-/// worth more here than none.
+/// The handler. Runs on the thread that took the signal. First writes out what standard output and the log file still
+/// hold. Neither allocates nor waits for what the interrupted code may hold; with _EN_CORE_DUMP it ends within seconds
+/// also when the console takes nothing. The stack overflow of a thread is reported when that has a SignalStack.
 void sighandler(int signal, siginfo_t* info, void* context);
 
 /// Prints process, thread and registers of the interrupted code.

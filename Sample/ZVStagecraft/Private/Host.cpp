@@ -2,6 +2,7 @@
 
 #include <stdio.h>
 
+#include "ExitDecision.h"
 #include "HostConsole.h"
 #include "IpcChannel.h"
 #include "ZVCfgLibAE.h"
@@ -15,8 +16,6 @@ using ae::stagecraft::IStagecraft;
 using ae::stagecraft::StageWindow;
 
 namespace {
-
-bool zv_stagecraft_active_exit = false;  // main thread's
 
 // The runtime while its movie can be asked to end. The mutex is held over every request, so that none reaches a runtime
 // that is being unloaded.
@@ -75,9 +74,8 @@ void RunMovie(IStagecraft& runtime, int argc, const char** argv)
         HostPrint("[ZV_FLASH] ZV FLASH Run Over! ");
     }
     StopDrm();
-    if (!zv_stagecraft_ipc_state_get()) {
+    if (ExitDecision::Get().ChooseActiveExit()) {
         HostPrint("[ZV_FLASH] zv_stagecraft_finalize_proc calling! Active Exit ");
-        zv_stagecraft_active_exit = true;
         zv_stagecraft_finalize_proc();
     }
     runtime.DestroyStageWindowSet(windows);
@@ -88,7 +86,6 @@ void RunMovie(IStagecraft& runtime, int argc, const char** argv)
 int main_zv_stagecraft(int argc, const char** argv)
 {
     IStagecraft* runtime = IStagecraft::InitializeStagecraftLibrary(argc, argv);
-    zv_stagecraft_active_exit = false;
     if (runtime) {
         RegisterExtensionClasses(*runtime);
         RunMovie(*runtime, argc, argv);
@@ -96,7 +93,7 @@ int main_zv_stagecraft(int argc, const char** argv)
     Publish(nullptr);
     IStagecraft::UninitializeStagecraftLibrary();
     HostPrint("[ZV_FLASH] ZV FLASH Run End ");
-    if (!zv_stagecraft_active_exit) {
+    if (ExitDecision::Get().NeedsRelease()) {
         HostPrint("[ZV_FLASH] Not active exit, release resource ");
         zv_stagecraft_exit_by_bdp_release();
     }

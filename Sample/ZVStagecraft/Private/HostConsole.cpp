@@ -1,9 +1,20 @@
 #include "HostConsole.h"
 
+#include <errno.h>
+#include <fcntl.h>
 #include <stdarg.h>
 #include <stdio.h>
+#include <unistd.h>
 
 #include <string>
+
+void FillStandardStreams()
+{
+    for (int stream = STDIN_FILENO; stream <= STDERR_FILENO; ++stream) {
+        // The lowest free number is the stream's own.
+        if (fcntl(stream, F_GETFD) == -1 && errno == EBADF && open("/dev/null", O_RDWR) != stream) return;
+    }
+}
 
 void HostPrint(const char* format, ...)
 {

@@ -3,11 +3,12 @@
 #include <pthread.h>
 #include <signal.h>
 
-#include <atomic>
 #include <chrono>
 
+#include "ExitDecision.h"
 #include "Host.h"
 #include "HostConsole.h"
+#include "SignalStack.h"
 #include "ZVMutex.h"
 #include "player/NetworkStub.h"
 
@@ -15,10 +16,6 @@ namespace {
 
 // Beyond it a player system does not answer any more.
 constexpr std::chrono::seconds kLastMessageTime{5};
-
-// Set by the listen thread alone, when it is about to end.
-std::atomic<bool> s_quit{false};
-std::atomic<bool> s_closeRequested{false};
 
 pthread_t s_listenThread;  // main thread's, like the next
 bool s_listenThreadCreated = false;
@@ -54,12 +51,12 @@ void Dispatch(uint32_t type)
             HostPrint("[ZV_FLASH] NETWORK_MSG_STUB_UNINIT !");
             // Before the movie ends: start-up reads it then.
             zv_stagecraft_ipc_state_set(true);
-            s_quit = true;
+            ExitDecision::Get().StopListening();
             zv_stagecraft_uninit_proc();
             break;
         case NETWORK_MSG_STUB_FINALIZE_DONE:
             HostPrint("[ZV_FLASH] listener thread main,zv_app_recv_ipc_msg() NETWORK_MSG_STUB_FINALIZE_DONE!");
-            s_quit = true;
+            ExitDecision::Get().StopListening();
             uninit_network_msg_queue();
             break;
         case NETWORK_MSG_STUB_FINALIZE_NETWORK_ERROR:
@@ -72,9 +69,10 @@ void Dispatch(uint32_t type)
 
 void* _zv_stagecraft_ipc_listen_thread_main(void*)
 {
+    const SignalStack signalStack;
     pthread_setname_np(pthread_self(), "zv_ipc_listen");
-    HostPrint("<ZV_FLASH> Calling -------> %s, %d\n", __func__, s_quit ? 1 : 0);
-    while (!s_quit) {
+    HostPrint("<ZV_FLASH> Calling -------> %s, %d\n", __func__, ExitDecision::Get().Listens() ? 0 : 1);
+    while (ExitDecision::Get().Listens()) {
         HostPrint("[ZV_FLASH] IPC enter ");
         NETWORK_MSG_STUB_MESSAGE message;
         const int error = network_stub_recv_ipc_msg(&message);
@@ -82,7 +80,7 @@ void* _zv_stagecraft_ipc_listen_thread_main(void*)
             HostPrint(
                 "[ZV_FLASH]listener thread main, zv_app_recv_ipc_msg() failed! ERR =%d ,Release flash resource \n",
                 error);
-            s_quit = true;
+            ExitDecision::Get().StopListening();
             zv_stagecraft_uninit_proc();
             break;
         }
@@ -134,13 +132,14 @@ int start_zv_stagecraft_ipc_listen_thread()
 int stop_zv_stagecraft_ipc_listen_thread()
 {
     HostPrint("[ZV_FLASH] stop_zv_app_ipc_listen_thread Enter! ");
-    if (s_quit) {
+    if (!ExitDecision::Get().BeginFinalize()) {
         HostPrint("[ZV_FLASH] ipc thread already exit, now do nothing! ");
         return 0;
     }
     HostPrint("[ZV_FLASH] STOP: send FINALIZE msg to BDP ");
     const int error = Send(NETWORK_MSG_STUB_FINALIZE);
     if (error == 0) return 0;
+    ExitDecision::Get().FinalizeFailed();
     HostPrint("[ZV_FLASH] send NETWORK_MSG_STUB_FINALIZE failed! ERR =%d \n", error);
     return -1;
 }
@@ -215,10 +214,10 @@ void zv_stagecraft_unlock()
 
 bool zv_stagecraft_ipc_state_get()
 {
-    return s_closeRequested;
+    return ExitDecision::Get().IsRequested();
 }
 
 void zv_stagecraft_ipc_state_set(bool requested)
 {
-    s_closeRequested = requested;
+    ExitDecision::Get().SetRequested(requested);
 }

@@ -10,7 +10,8 @@ void zv_stagecraft_ipc_release();
 int start_zv_stagecraft_ipc_listen_thread();
 
 /// Tells the player system that the interface ended by itself, which makes it end the listen thread; nothing is sent
-/// when that thread has ended already. 0, or -1 when the message could not be sent. Does not wait.
+/// when that thread is ending already, or the player system asked for the close. 0, or -1 when the message could not be
+/// sent. Does not wait.
 int stop_zv_stagecraft_ipc_listen_thread();
 
 /// Gives the listen thread the time to end that a player system needs for its last message, a few seconds at most.

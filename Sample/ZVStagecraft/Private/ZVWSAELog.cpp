@@ -1,8 +1,12 @@
 #include "ZVWSAELog.h"
 
 #include <stdio.h>
+#include <sys/stat.h>
 
-#include "ZV_Log.h"
+#include <algorithm>
+#include <vector>
+
+#include "ZV_LogImpl.h"
 
 namespace {
 
@@ -18,18 +22,52 @@ Area s_Areas[] = {
     {ZVWS_SoapSentLOG_AREA_NAME, 0x1000, -1}, {ZVWS_SoapTestLOG_AREA_NAME, 0x2000, -1},
 };
 
+// What a file is, whatever its name.
+struct FileId {
+    dev_t device = 0;
+    ino_t number = 0;
+
+    bool operator==(const FileId& other) const { return device == other.device && number == other.number; }
+};
+
 // The file target in use, which is this file's to release.
 struct FileTarget {
     ZV_LogTarget function = nullptr;
     void* user = nullptr;
+    FileId id;
 };
 FileTarget s_File;
 
-void SetTarget(ZV_LogTarget function, void* user, bool isFile)
+// The files to which this process has logged. The first set-up empties a file, the next ones keep its lines.
+std::vector<FileId> s_Known;
+
+bool IsKnown(const FileId& id)
 {
-    ZV_LogSetTarget(function, user);
+    return std::find(s_Known.begin(), s_Known.end(), id) != s_Known.end();
+}
+
+// false when there is no such file.
+bool Identify(const char* name, FileId& id)
+{
+    struct stat status;
+    if (stat(name, &status) != 0) return false;
+    id = {status.st_dev, status.st_ino};
+    return true;
+}
+
+void SetTarget(const FileTarget& target)
+{
+    ZV_LogSetTarget(target.function, target.user);
     ZV_LogReleaseFileTarget(s_File.function, s_File.user);
-    s_File = isFile ? FileTarget{function, user} : FileTarget{};
+    s_File = target;
+}
+
+void SetConsoleTarget()
+{
+    ZV_LogTarget function = nullptr;
+    void* user = nullptr;
+    ZV_LogGetConsoleTarget(&function, &user);
+    SetTarget({function, user, {}});
 }
 
 int SetFileTarget(const char* folder)
@@ -40,11 +78,19 @@ int SetFileTarget(const char* folder)
     const int length = snprintf(name, sizeof name, "%s%s", start, "log.txt");
     if (length < 0 || static_cast<size_t>(length) >= sizeof name) return kCannotOpen;
 
-    ZV_LogTarget function = nullptr;
-    void* user = nullptr;
-    const int result = ZV_LogGetFileTarget(name, &function, &user, 0, true);
-    if (result == 0) SetTarget(function, user, true);
-    return result == 1 ? 3 : result;
+    FileTarget target;
+    const bool exists = Identify(name, target.id);
+    if (exists && s_File.user && target.id == s_File.id) {
+        // A second stream would write over what the first one has not written yet.
+        ZV_LogSetTarget(s_File.function, s_File.user);
+        return 0;
+    }
+    const char* mode = exists && IsKnown(target.id) ? "ab" : "wb";
+    const int result = GetFileTarget(name, mode, &target.function, &target.user, 0, true);
+    if (result != 0) return result == 1 ? 3 : result;
+    if (Identify(name, target.id) && !IsKnown(target.id)) s_Known.push_back(target.id);
+    SetTarget(target);
+    return 0;
 }
 
 }  // namespace
@@ -67,10 +113,7 @@ int ZVWSAELog::InitWSLogs(unsigned int areaMask, unsigned char target, const cha
         ZV_LogActivateArea(area.id, (areaMask & area.bit) != 0);
     }
     if (target & kConsole) {
-        ZV_LogTarget function = nullptr;
-        void* user = nullptr;
-        ZV_LogGetConsoleTarget(&function, &user);
-        SetTarget(function, user, false);
+        SetConsoleTarget();
         return 0;
     }
     return target & kFile ? SetFileTarget(folder) : 1;

@@ -17,8 +17,9 @@ public:
     enum Target : unsigned char { kConsole = 1, kFile = 2 };  // bits; the console wins
 
     /// Switches the six log areas on and off by their bits in `areaMask` and chooses the target. The file is "log.txt"
-    /// in `folder`, which ends with "/"; in the current folder when the argument is left out. Main thread. 0; 1 when
-    /// `target` names none, 2 when the file cannot be opened: the target is then unchanged; 3 for other failures.
+    /// in `folder`, which ends with "/"; in the current folder when the argument is left out. A file is emptied when
+    /// the process logs to it for the first time, and goes on when it does so again. Main thread. 0; 1 when `target`
+    /// names none, 2 when the file cannot be opened: the target is then unchanged; 3 for other failures.
     static int InitWSLogs(unsigned int areaMask, unsigned char target, const char* folder = kDefaultFolder);
 
 private:

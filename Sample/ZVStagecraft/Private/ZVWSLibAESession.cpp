@@ -74,7 +74,9 @@ void ZVWSLibAE::init(StageWindow* /*window*/, ASObject& object, ASValueArray& ar
         returnValue = ASValue::Number(kStarted);
         return;
     }
-    returnValue = ASValue::Number(ZVWSLib::StartCall(*this, "init", ZVWSLib::init, Param_init(), object, arguments));
+    const ReturnCode code = ZVWSLib::StartCall(*this, "init", ZVWSLib::init, Param_init(), object, arguments);
+    returnValue = ASValue::Number(code);
+    if (code != kStarted) return;
     ZV_LogOutput(GetZV_LogAreaID(), ZV_LOG_TRACE, "ZVWSLibAE::init left\n");
 }
 

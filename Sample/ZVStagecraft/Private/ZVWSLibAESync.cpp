@@ -235,7 +235,9 @@ int InitLogs(ASObject& object)
 void ZVWSLibAE::setLogAreaIDsAndTargetConfig(StageWindow* /*window*/, ASObject& /*object*/, ASValueArray& arguments,
                                              ASValue& returnValue)
 {
-    const bool given = arguments.size() == 1 && arguments[0].IsObject();
+    // The other methods' [callback, parameters] is an object, too, but has none of the properties.
+    const bool given =
+        arguments.size() == 1 && arguments[0].IsObject() && !arguments[0].GetObject()->IsInstanceOf("Array");
     const char* override = getenv("ZV_LOG");
     const auto init = [&] {
         return override && *override ? InitLogsAs(override) : InitLogs(*arguments[0].GetObject());

@@ -71,6 +71,7 @@ int RunInterface(int uiType, const char* flashVars)
 int main(int argc, char** argv)
 {
     zv_dbg_init();
+    FillStandardStreams();
 #ifdef M_ARENA_MAX
     // Every call is a thread of its own: heaps for threads would each keep what was freed in them. They wait for the
     // network, not for each other's allocations.

@@ -17,7 +17,8 @@ enum NETWORK_MSG_STUB_TYPE {
     NETWORK_MSG_STUB_INIT = 1,                    // to the host: the player system is there
     NETWORK_MSG_STUB_UNINIT = 3,                  // to the host: close the interface
     NETWORK_MSG_STUB_UNINIT_RET = 4,              // from the host: closed as asked, all resources released
-    NETWORK_MSG_STUB_FINALIZE = 5,                // from the host: the interface ended by itself
+    NETWORK_MSG_STUB_FINALIZE = 5,                // from the host: the interface ended by itself; answers a UNINIT
+                                                  //   that it crosses, after which no UNINIT_RET comes
     NETWORK_MSG_STUB_FINALIZE_DONE = 6,           // to the host: the player system has seen FINALIZE
     NETWORK_MSG_STUB_FINALIZE_NETWORK_ERROR = 7,  // to the host: finalize because the network failed
 };
