@@ -1,12 +1,11 @@
-// The records of ZVWSLib.h as data: tag, base, members in order.
+// The records of ZV_WS_Types.h as data: tag, base, members in order.
 //
 // For code that treats records alike, such as releasing them or turning them into script objects. Header only; any
 // thread.
 //
 //   ZV_WS_RecordTraits<Record>::kTag          the number behind `_pImpl`
 //   ZV_WS_RecordTraits<Record>::Base          the record it extends, ZV_WS_Object at the root
-//   ZV_WS_RecordTraits<Record>::Visit(r, v)   for its own members, not the base's, in order: v.Member("Name", r.Name),
-//   or
+//   ZV_WS_RecordTraits<Record>::Visit(r, v)   for its own members, not the base's, in order: v.Member("Name", r.Name);
 //                                             v.Elements("Name", r.size, r.Name) for the array of an array record
 #pragma once
 
