@@ -67,8 +67,8 @@ enum ZV_WS_Status : int {
     ZV_WS_Status_verify_userid_gift_code = -1019,
     /// Service: what was typed cannot be a gift code. Then: ask for it again (ZV_WS_assignGiftCertificateToUser).
     ZV_WS_Status_verify_inputs = -1020,
-    /// Service: the price is not the one that it reckons with. Then: ask for the price anew and show it
-    /// (ZV_WS_calcOrderTax, ZV_WS_doPurchaseSavedBilling).
+    /// Service: the price is not the one that it reckons with. Then: ask for the price anew and show it, before the
+    /// customer buys again (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_discrepancy_in_total_amount = -1021,
     /// Service: the product does not go with this device, or with what the customer has. Then: offer another one
     /// (ZV_WS_doPurchaseSavedBilling).
@@ -148,8 +148,8 @@ enum ZV_WS_Status : int {
     ZV_WS_Status_failed_to_get_bandwidth_check_url = -1920,
     /// Service: its configuration has an address for that which is none. Then: do without the measurement.
     ZV_WS_Status_invalid_bandwidth_check_url = -1921,
-    /// Network: no connection to the service: no name, no route, nobody there, or ZV_WS_abort. Then: look after the
-    /// network; try again later. Nothing was sent.
+    /// Network: no connection to the service: no name, no route, nobody there, or ZV_WS_abort; nothing was sent. Then:
+    /// look after the network; try again later.
     ZV_WS_Status_connection_error = -2011,
     /// Network: the answer never came, or ended too early, or ZV_WS_abort broke the call off. Then: try again later;
     /// ask first what became of a call that is sent once.
@@ -159,9 +159,9 @@ enum ZV_WS_Status : int {
     /// Service: family of HTTP: the status of the answer (or of the proxy's), or an answer that is no SOAP (-4200).
     /// -4503: the service wants relief. Then: try again later; -4401, -4403 and -4407: look after the credentials.
     ZV_WS_Status_http_error = -4000,
-    /// Network: family of TLS: -5030 when a connection is not safe (wrong host, unknown or old certificate); -5000
-    /// itself when the device's certificate authorities cannot be loaded. Then: look who is on the line; mend the
-    /// deployment. Nothing was sent.
+    /// Network: family of TLS: -5030 when a connection is not safe (wrong host, unknown or old certificate) and nothing
+    /// was sent; -5000 itself when the device's certificate authorities cannot be loaded. Then: look who is on the
+    /// line; mend the deployment.
     ZV_WS_Status_ssl_error = -5000,
     /// Service: family of SOAP: -6012 a fault, whose reason only the log tells; others when the answer breaks the
     /// contract or its limits (docs/contract.md). Then: tell the service's engineers.
