@@ -33,9 +33,9 @@
 //  - ZV_WS_Status_connection_error, ZV_WS_Status_timeout_error, a status of the families of HTTP, TLS and SOAP: the
 //    exchange failed, and the output is empty. A later call may succeed.
 //  - ZV_WS_Status_clock_wrong: likewise, and no later call will succeed before somebody sets the device's clock.
-//  - ZV_WS_Status_general_error: the service refused with a response code that is no "Refusal" of this call, or its
-//    answer could not be understood. A refusal is in the record (ResponseCode, ResponseMessage); else the record is
-//    empty.
+//  - ZV_WS_Status_general_error: the service refused with a response code that is no "Refusal" of this call, or
+//    its answer could not be understood. A refusal is in the record (ResponseCode, ResponseMessage); else the
+//    record is empty.
 //  - the statuses listed as "Refusals": the service's response codes that this call tells apart. The record is filled.
 //
 // "Sent once": the call changes something at the service, or counts there. Of itself it is sent a second time only when
@@ -46,17 +46,17 @@
 // "Cached": with a cache for that kind of data (ZV_WS_CacheParam::Data) the call looks there first, and answers from it
 // without asking the service. What the service answers with success is kept there. Answers have no age: they stay until
 // something drops them. An answer that was asked for before such a moment is not kept after it.
-//  - catalogue (CacheData_Metadata): until ZV_WS_updateLocalCache, as set-up does by itself, finds that the service has
-//    loaded a new catalogue; until they outgrow their share of the limit, when the customer's answers go with them;
-//    until ZV_WS_clearLocalCache.
-//  - catalogue and wishes (CacheData_Metadata): answers that tell of the wish list, too. Like the catalogue's; where
-//    CacheData_Userdata is cached, too, also dropped with all of the customer's and by
-//    ZV_WS_removeAllItemsFromWishlist.
+//  - catalogue (CacheData_Metadata): until ZV_WS_updateLocalCache, as set-up does by itself, finds that the service
+//    has loaded a new catalogue; until they outgrow their share of the limit, when the customer's answers go with
+//    them; until ZV_WS_clearLocalCache.
+//  - catalogue and wishes (CacheData_Metadata): answers that tell of the wish list, too. Like the
+//    catalogue's; where CacheData_Userdata is cached, too, also dropped with all of the customer's
+//    and by ZV_WS_removeAllItemsFromWishlist.
 //  - customer (CacheData_Userdata): until set-up, ZV_WS_updateLocalCache with CacheData_Userdata, ZV_WS_authorizeDevice
 //    or ZV_WS_deactivateDevice drop all of them; until they or the catalogue's outgrow their share; until a change that
 //    is named at the call, also one whose answer was lost; until ZV_WS_clearLocalCache.
-//  - wish-list flags (CacheData_Userdata): what is known of single titles, from changes and checks. Dropped with the
-//    customer's.
+//  - wish-list flags (CacheData_Userdata): what is known of single titles, from changes and checks. Dropped
+//    with the customer's.
 //  - images (CacheData_BoxArtImage): until ZV_WS_updateLocalCache with CacheData_BoxArtImage marks them, after which
 //    the next call asks the host whether it has another one, and keeps the old one when the host cannot be asked; until
 //    the oldest titles make room in a share that was outgrown; until ZV_WS_clearLocalCache.
@@ -75,8 +75,8 @@
 /// Makes a session. In this order: checks `params`, which must not be null; reads the deployment file
 /// (docs/deployment.md) and the certificate authorities; discovers the environment unless EnvNum names one; asks for
 /// the access type unless AccessType tells it; opens the cache, sweeps its folder for at most 50 ms, drops what it
-/// holds of the customer, and asks whether the catalogue is still the same. Asks the service for each of these, so it
-/// can block for several exchanges. A service that cannot tell the access type leaves it unknown, which works like
+/// holds of the customer, and asks whether the catalogue is still the same. Environment, access type and catalogue ask
+/// the service: up to three exchanges. A service that cannot tell the access type leaves it unknown, which works like
 /// ACCESS_TYPE_STREAM. Prints one line of the environment and one of the user agent on standard output.
 ///
 /// Makes the proxy of `params` (none, too) that of ZV_WS_getServerTime. The handle's former content is overwritten
@@ -186,11 +186,11 @@ ZV_WS_Status ZV_WS_searchForTitleDetail(ZV_WS_Session* handle, const ZV_WS_Pagin
 /// Titles like that one. Cached: catalogue.
 ZV_WS_Status ZV_WS_getRecommendedTitles(ZV_WS_Session* handle, int titleID, ZV_WS_RecommendedTitlesResponse* titles);
 
-// ---- The device at the service. Asks the service that has the account (ZV_WS_AccessType), unless another one is
-// named.
+// ---- The device at the service. Asks the service that has the account (ZV_WS_AccessType), unless another
+// one is named.
 
-/// The form in which the service has films for this type of device. Asks the browse service. The record has no response
-/// code.
+/// The form in which the service has films for this type of device. Asks the browse service. The record has
+/// no response code.
 ZV_WS_Status ZV_WS_getFileType(ZV_WS_Session* handle, ZV_WS_FileType* fileType);
 
 /// Ties the device to the customer who was shown the PIN, which is required. On success the next requests of the
@@ -298,8 +298,8 @@ ZV_WS_Status ZV_WS_getBillingInfoAndPPCBalance(ZV_WS_Session* handle, ZV_WS_Bill
 /// The customer's prepaid money.
 ZV_WS_Status ZV_WS_getPrePaidCardBalance(ZV_WS_Session* handle, ZV_WS_PPCardBalanceResponse* balance);
 
-/// Adds the worth of a gift code to the customer's prepaid money. Sent once: after a lost answer ask for the balance.
-/// Refusals:
+/// Adds the worth of a gift code to the customer's prepaid money. Sent once: after a lost answer ask for
+/// the balance. Refusals:
 ///  - ZV_WS_Status_verify_userid_gift_code: no such code, or not for this customer, or used before.
 ///  - ZV_WS_Status_verify_inputs: the code has not the form of one.
 ZV_WS_Status ZV_WS_assignGiftCertificateToUser(ZV_WS_Session* handle, const char* code,
@@ -311,9 +311,9 @@ ZV_WS_Status ZV_WS_assignGiftCertificateToUser(ZV_WS_Session* handle, const char
 ///  - ZV_WS_Status_invalid_sku_purchase_id, ZV_WS_Status_product_not_available, ZV_WS_Status_incompatible_products: the
 ///    product cannot be had, or not on this device.
 ///  - ZV_WS_Status_invalid_user_id: activate the device again.
-///  - ZV_WS_Status_invalid_user_address, ZV_WS_Status_invalid_cc_security_code, ZV_WS_Status_invalid_cc_number,
-///    ZV_WS_Status_cc_expired, ZV_WS_Status_avs_fail, ZV_WS_Status_cc_not_on_file: the customer has to mend the card's
-///    data.
+///  - ZV_WS_Status_invalid_user_address, ZV_WS_Status_invalid_cc_security_code,
+///    ZV_WS_Status_invalid_cc_number, ZV_WS_Status_cc_expired, ZV_WS_Status_avs_fail,
+///    ZV_WS_Status_cc_not_on_file: the customer has to mend the card's data.
 ///  - ZV_WS_Status_trans_failed, ZV_WS_Status_insufficent_prepaid_fund: another way to pay may do.
 ///  - ZV_WS_Status_reach_daily_spend_limit, ZV_WS_Status_reach_daily_trans_limit: tomorrow.
 ///  - ZV_WS_Status_discrepancy_in_total_amount: the price has changed; show the new one first.
@@ -323,8 +323,8 @@ ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, cons
 /// What a product costs, without and with tax. Asks the stream service. Refusals:
 ///  - ZV_WS_Status_product_not_found, ZV_WS_Status_product_not_available: it cannot be had.
 ///  - ZV_WS_Status_user_not_found, ZV_WS_Status_user_cant_transact: this customer cannot buy.
-///  - ZV_WS_Status_payment_details_not_found, ZV_WS_Status_payment_details_invalid: the customer has to mend the card's
-///    data.
+///  - ZV_WS_Status_payment_details_not_found, ZV_WS_Status_payment_details_invalid: the customer has to mend
+///    the card's data.
 ZV_WS_Status ZV_WS_calcOrderTax(ZV_WS_Session* handle, int skuID, ZV_WS_CalcOrderTaxResponse* tax);
 
 // ---- Playback. All of it asks the stream service, whatever the access type. The calls for a location are sent once
@@ -338,8 +338,8 @@ ZV_WS_Status ZV_WS_getStreamingAssetLocation(ZV_WS_Session* handle, int passID, 
 ZV_WS_Status ZV_WS_getStreamingBonusAssetLocation(ZV_WS_Session* handle, int bonusAssetID,
                                                   ZV_WS_StreamingAssetLocationResponse* location);
 
-/// Where to go on playing what a pass stands for: the stream that was played last, and the second at which it stopped.
-/// Sent once.
+/// Where to go on playing what a pass stands for: the stream that was played last, and the second at which it
+/// stopped. Sent once.
 ZV_WS_Status ZV_WS_loadLastStreamingAssetLocation(ZV_WS_Session* handle, int passID, ZV_WS_FileProfile fileProfile,
                                                   ZV_WS_StreamingAssetLocationResponse* location);
 
@@ -357,8 +357,8 @@ ZV_WS_Status ZV_WS_getTHXMediaDirectorBonusAsset(ZV_WS_Session* handle, int bonu
                                                  ZV_WS_BonusAssetType bonusAssetType,
                                                  ZV_WS_THXMediaDirectorResponse* data);
 
-/// Diagnostic: asks the stream service for an operation that it may let time out, to see a client's own way with it.
-/// Sent once.
+/// Diagnostic: asks the stream service for an operation that it may let time out, to see a client's own way with
+/// it. Sent once.
 ZV_WS_Status ZV_WS_returnTimeout(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer);
 
 /// Diagnostic: likewise for an operation that it answers with an error. Sent once.
@@ -373,12 +373,12 @@ ZV_WS_Status ZV_WS_shouldUpdateCache(ZV_WS_Session* handle, const char* utcTime,
 /// When the service last loaded its catalogue. Asks the browse service, and leaves the cache alone.
 ZV_WS_Status ZV_WS_getLastCacheLoadTimeUTC(ZV_WS_Session* handle, ZV_WS_String* utcTime);
 
-/// Refreshes the session's cache. `operations` are CacheData bits: with CacheData_Metadata the browse service is asked,
-/// and the catalogue's answers are dropped when it has loaded a new one; with CacheData_BoxArtImage the images are
-/// marked, to be asked for anew when they are used next; with CacheData_Userdata the customer's answers and wish-list
-/// flags are dropped. Bits that the session does not cache do nothing. ZV_WS_Status_ok also when nothing is cached, and
-/// when a step fails: what cannot be dropped of the customer is not shown either, a catalogue whose time cannot be
-/// learnt stays.
+/// Refreshes the session's cache. `operations` are CacheData bits: with CacheData_Metadata the browse service is
+/// asked, and the catalogue's answers are dropped when it has loaded a new one; with CacheData_BoxArtImage the images
+/// are marked, to be asked for anew when they are used next; with CacheData_Userdata the customer's answers and
+/// wish-list flags are dropped. Bits that the session does not cache do nothing. ZV_WS_Status_ok also when nothing is
+/// cached, and when a step fails: what cannot be dropped of the customer is not shown either, a catalogue whose time
+/// cannot be learnt stays.
 ZV_WS_Status ZV_WS_updateLocalCache(ZV_WS_Session* handle, unsigned int operations);
 
 /// Removes images ("*.jpg"), databases ("*.zv") and temporary files ("zvws*") of a cache folder, whoever's they are.
@@ -428,15 +428,15 @@ ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSe
 /// ZV_WS_Status_connection_error when there is no connection, and ZV_WS_Status_net_error when it is none of IPv4.
 ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address);
 
-// ---- Files. No session, any thread; they block on the disk only. Paths are the system's own, relative ones from the
-// current folder. ZV_WS_Status_invalid_param for a null path, ZV_WS_Status_file_operation_error when the operation
-// fails.
+// ---- Files. No session, any thread; they block on the disk only. Paths are the system's own, relative ones
+// from the current folder. ZV_WS_Status_invalid_param for a null path, ZV_WS_Status_file_operation_error when
+// the operation fails.
 
 /// Removes a file or an empty folder. What is not there, or cannot be read, counts as removed.
 ZV_WS_Status ZV_WS_removeFile(const char* path);
 
-/// Copies a file over another, or to a new one. Fails when either cannot be opened; a disk that fills up is not
-/// noticed.
+/// Copies a file over another, or to a new one. Fails when either cannot be opened; a disk that fills up
+/// is not noticed.
 ZV_WS_Status ZV_WS_copyFile(const char* source, const char* target);
 
 /// The path up to and including its last "/"; a bare name is taken for a folder ("b" is "b/"), and "" is "./". Looks at

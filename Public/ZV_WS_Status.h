@@ -23,55 +23,55 @@ enum ZV_WS_Status : int {
     /// understood. Also this library, when memory is exhausted. Then: with a record, show what was refused; without
     /// one, try again later.
     ZV_WS_Status_general_error = -1004,
-    /// Service: the activation PIN is none that it gave out. Then: ask the customer for it again
-    /// (ZV_WS_authorizeDevice).
+    /// Service: the activation PIN is none that it gave out. Then: ask the customer for
+    /// it again (ZV_WS_authorizeDevice).
     ZV_WS_Status_invalid_pin = -1005,
-    /// Service: too many wrong PINs, or a device that was shut out. Then: send the customer to the service
-    /// (ZV_WS_authorizeDevice).
+    /// Service: too many wrong PINs, or a device that was shut out. Then: send the customer to
+    /// the service (ZV_WS_authorizeDevice).
     ZV_WS_Status_device_locked_out = -1006,
     /// Service: there is no such product to buy. Then: show the title anew (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_invalid_sku_purchase_id = -1007,
-    /// Service: the device belongs to no customer that it knows. Then: activate the device again
-    /// (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
+    /// Service: the device belongs to no customer that it knows. Then: activate the device
+    /// again (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
     ZV_WS_Status_invalid_user_id = -1008,
-    /// Service: the customer's address does not do for a bill. Then: let the customer mend it at the service
-    /// (ZV_WS_doPurchaseSavedBilling).
+    /// Service: the customer's address does not do for a bill. Then: let the customer mend it at
+    /// the service (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_invalid_user_address = -1009,
-    /// Service: the card's security code is wrong. Then: let the customer mend the card at the service
-    /// (ZV_WS_doPurchaseSavedBilling).
+    /// Service: the card's security code is wrong. Then: let the customer mend the card at
+    /// the service (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_invalid_cc_security_code = -1010,
-    /// Service: the card's number is wrong. Then: let the customer mend the card at the service
-    /// (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
+    /// Service: the card's number is wrong. Then: let the customer mend the card at the
+    /// service (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
     ZV_WS_Status_invalid_cc_number = -1011,
-    /// Service: the card has expired. Then: let the customer give another one at the service
-    /// (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
+    /// Service: the card has expired. Then: let the customer give another one at the
+    /// service (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
     ZV_WS_Status_cc_expired = -1012,
     /// Service: the payment did not go through. Then: offer another way to pay (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_trans_failed = -1013,
-    /// Service: the customer has spent what a day allows. Then: tell so; tomorrow it works again
-    /// (ZV_WS_doPurchaseSavedBilling).
+    /// Service: the customer has spent what a day allows. Then: tell so; tomorrow it
+    /// works again (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_reach_daily_spend_limit = -1014,
-    /// Service: the customer has bought as often as a day allows. Then: tell so; tomorrow it works again
-    /// (ZV_WS_doPurchaseSavedBilling).
+    /// Service: the customer has bought as often as a day allows. Then: tell so; tomorrow it
+    /// works again (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_reach_daily_trans_limit = -1015,
-    /// Service: the card's bank knows another address of the customer. Then: let the customer mend it at the service
-    /// (ZV_WS_doPurchaseSavedBilling).
+    /// Service: the card's bank knows another address of the customer. Then: let the customer mend it at
+    /// the service (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_avs_fail = -1016,
-    /// Service: the customer has given no card. Then: let the customer give one at the service
-    /// (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
+    /// Service: the customer has given no card. Then: let the customer give one at the
+    /// service (ZV_WS_doPurchaseSavedBilling, ZV_WS_getBillingInfo).
     ZV_WS_Status_cc_not_on_file = -1017,
     /// Service: the prepaid money does not do. Then: offer the card, or a gift code (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_insufficent_prepaid_fund = -1018,
-    /// Service: the gift code is none, was used, or is for somebody else. Then: ask for it again
-    /// (ZV_WS_assignGiftCertificateToUser).
+    /// Service: the gift code is none, was used, or is for somebody else. Then: ask for
+    /// it again (ZV_WS_assignGiftCertificateToUser).
     ZV_WS_Status_verify_userid_gift_code = -1019,
     /// Service: what was typed cannot be a gift code. Then: ask for it again (ZV_WS_assignGiftCertificateToUser).
     ZV_WS_Status_verify_inputs = -1020,
     /// Service: the price is not the one that it reckons with. Then: ask for the price anew and show it, before the
     /// customer buys again (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_discrepancy_in_total_amount = -1021,
-    /// Service: the product does not go with this device, or with what the customer has. Then: offer another one
-    /// (ZV_WS_doPurchaseSavedBilling).
+    /// Service: the product does not go with this device, or with what the customer has. Then: offer
+    /// another one (ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_incompatible_products = -1022,
     /// Service: there is no such product. Then: show the title anew (ZV_WS_calcOrderTax).
     ZV_WS_Status_product_not_found = -1023,
@@ -79,14 +79,14 @@ enum ZV_WS_Status : int {
     ZV_WS_Status_user_not_found = -1024,
     /// Service: the customer may not buy. Then: send the customer to the service (ZV_WS_calcOrderTax).
     ZV_WS_Status_user_cant_transact = -1025,
-    /// Service: the customer has given no way to pay. Then: let the customer give one at the service
-    /// (ZV_WS_calcOrderTax).
+    /// Service: the customer has given no way to pay. Then: let the customer give one at
+    /// the service (ZV_WS_calcOrderTax).
     ZV_WS_Status_payment_details_not_found = -1026,
-    /// Service: the customer's way to pay does not do. Then: let the customer mend it at the service
-    /// (ZV_WS_calcOrderTax).
+    /// Service: the customer's way to pay does not do. Then: let the customer mend it at
+    /// the service (ZV_WS_calcOrderTax).
     ZV_WS_Status_payment_details_invalid = -1027,
-    /// Service: the product cannot be had now. Then: show the title anew (ZV_WS_calcOrderTax,
-    /// ZV_WS_doPurchaseSavedBilling).
+    /// Service: the product cannot be had now. Then: show the title
+    /// anew (ZV_WS_calcOrderTax, ZV_WS_doPurchaseSavedBilling).
     ZV_WS_Status_product_not_available = -1028,
     /// Unused: of a download's progress reports: no such entry in the queue.
     ZV_WS_Status_dqid_not_found = -1051,
@@ -127,22 +127,22 @@ enum ZV_WS_Status : int {
     /// Device: a file or folder cannot be read or written: of the files and settings calls, the cache folder, the
     /// deployment file. Then: look after path, rights, space and the device key.
     ZV_WS_Status_file_operation_error = -1900,
-    /// Service: there is no such image, or no file to measure bandwidth with. Then: show a stand-in; do without the
-    /// measurement.
+    /// Service: there is no such image, or no file to measure bandwidth with. Then: show a stand-in; do
+    /// without the measurement.
     ZV_WS_Status_file_not_found_on_server = -1901,
-    /// Service: the image host said "not modified" without having been asked. Then: show a stand-in, and have the host
-    /// mended.
+    /// Service: the image host said "not modified" without having been asked. Then: show a stand-in, and have
+    /// the host mended.
     ZV_WS_Status_file_not_modified_on_server = -1902,
     /// Device: the settings file has no such key, or is none. Then: use the default.
     ZV_WS_Status_setting_key_not_found = -1906,
     /// Device: a protected value cannot be deciphered, as one from another device; or the value to be kept cannot be.
     /// Then: write it anew; mend the value.
     ZV_WS_Status_setting_invalid_value = -1907,
-    /// Device: the cache's file cannot be opened, not even made anew. Then: set up without a cache; look after the
-    /// disk.
+    /// Device: the cache's file cannot be opened, not even made anew. Then: set up without a cache; look
+    /// after the disk.
     ZV_WS_Status_local_cache_error = -1910,
-    /// Device: there is no cache folder and it cannot be made. Then: set up without a cache; look after path and
-    /// rights.
+    /// Device: there is no cache folder and it cannot be made. Then: set up without a cache; look after
+    /// path and rights.
     ZV_WS_Status_failed_to_create_cache_folder = -1911,
     /// Service: its configuration has no address to measure bandwidth at. Then: do without the measurement.
     ZV_WS_Status_failed_to_get_bandwidth_check_url = -1920,

@@ -5,8 +5,8 @@
 // As an argument of a request only listed numbers can be sent; a call refuses the others (ZV_WS_Status_invalid_param).
 //
 // Records. Everything derived from ZV_WS_Object. The rules for all of them:
-//  1. Who owns them: the caller, from the call's return on, whatever its status. ZV_WS_release frees what they point
-//     to.
+//  1. Who owns them: the caller, from the call's return on, whatever its status. ZV_WS_release frees what
+//     they point to.
 //  2. char* members are UTF-8 texts with a terminator, owned by the record; null when the service sent none, "" when it
 //     sent an empty one.
 //  3. Arrays are `size` elements behind a pointer, which is null when `size` is 0. They are owned by the record, too,
@@ -145,8 +145,8 @@ enum ZV_WS_BoxArtSize : int {
 /// list, which has PRODUCTION's addresses.
 enum ZV_WS_EnvID : int { ENVID_APISTG = 0, ENVID_INTERNALSTG = 1, ENVID_PRODUCTION = 2 };
 
-/// The environment asked for at set-up; ENVNUM_DEFAULT, and every other number outside of the first three, asks the
-/// service.
+/// The environment asked for at set-up; ENVNUM_DEFAULT, and every other number outside of the first three,
+/// asks the service.
 enum ZV_WS_EnvNum : int { ENVNUM_APISTG = 0, ENVNUM_INTERNALSTG = 1, ENVNUM_PRODUCTION = 2, ENVNUM_DEFAULT = 3 };
 
 /// The general catalogue or the one for adults, which has addresses of its own.
@@ -159,6 +159,7 @@ enum CacheType : int { CacheType_None = 0, CacheType_Memory = 1, CacheType_File 
 // ---- Set-up, filled by the caller. Texts are borrowed for the call: nothing of them is kept. A null text is one that
 // is not given, and so is "" unless something else is said.
 
+/// What a session keeps of its answers, and where (docs/cache.md).
 struct ZV_WS_CacheParam {
     /// Which kinds of answer are cached: bits of `Data`. The last three are the cache's own names of the same bits.
     enum CacheData : unsigned int {
@@ -172,8 +173,8 @@ struct ZV_WS_CacheParam {
 
     CacheType Type = CacheType_None;
     unsigned int Data = 0;
-    /// Bytes for everything cached; 0 is no limit, else at least 358400 (350 KiB). Shared out between the kinds in
-    /// `Data`.
+    /// Bytes for everything cached; 0 is no limit, else at least 358400 (350 KiB). Shared out between the
+    /// kinds in `Data`.
     unsigned int Limit = 0;
     /// Cache folder of CacheType_File, which needs one; "" is the current folder. Made when absent, with the folders
     /// above it, for the owner alone. The folder is the cache's own: images in it of which no cache knows are removed,
@@ -185,11 +186,12 @@ struct ZV_WS_CacheParam {
 /// refuses is a status of the HTTP family (407: ask for other credentials).
 struct ZV_WS_ProxyParam {
     const char* Host = nullptr;
-    int Port = 0;
+    int Port = 0;                    ///< Of the proxy; not looked at without a Host.
     const char* UserName = nullptr;  ///< Not given: no credentials are sent.
     const char* Password = nullptr;  ///< Sent to the proxy unprotected ("Basic"), as proxies want it.
 };
 
+/// All that a session needs. APIKey, AuthToken, identifier and UserName are sent, and hold nothing that XML cannot.
 struct ZV_WS_SetupParams {
     const char* APIKey = nullptr;               ///< Required. Which application this is, for the service.
     const char* AuthToken = nullptr;            ///< What ZV_WS_authorizeDevice answered last; not given before that.
@@ -198,8 +200,8 @@ struct ZV_WS_SetupParams {
     const char* UserName = nullptr;             ///< Required; with Password, what every request is signed with.
     const char* Password = nullptr;             ///< Required. Never sent itself, only as part of a digest.
     const char* ServiceBaseURL = nullptr;       ///< Not used: discovery decides.
-    ContentType Type = ContentType_ZV;
-    ZV_WS_EnvNum EnvNum = ENVNUM_DEFAULT;
+    ContentType Type = ContentType_ZV;          ///< Which catalogue's addresses the session uses.
+    ZV_WS_EnvNum EnvNum = ENVNUM_DEFAULT;       ///< Default: the service is asked for the environment.
     ZV_WS_CacheParam CacheParam;
     ZV_WS_ProxyParam ProxyParam;
     ZV_WS_AccessType AccessType = ACCESS_TYPE_UNKNOWN;  ///< Unknown: the service is asked (ZV_WS_getFileType).
@@ -215,6 +217,7 @@ struct ZV_WS_Pagination {
     unsigned int ItemsPerPage = 0;
 };
 
+/// An environment that can be chosen at set-up.
 struct ZV_WS_Environment {
     ZV_WS_EnvNum envNum;   ///< For ZV_WS_SetupParams.
     const char* endpoint;  ///< Name to show, such as "production".
@@ -240,6 +243,7 @@ struct ZV_WS_Session : ZV_WS_Object {
     SessionImpl* _pSessionImpl = nullptr;  ///< The library's own; null when there is no session.
 };
 
+/// A text that a call hands out by itself.
 struct ZV_WS_String : ZV_WS_Object {
     unsigned int size = 0;  ///< Bytes, without the terminator.
     char* data = nullptr;
@@ -251,6 +255,7 @@ struct ZV_WS_Image : ZV_WS_Object {
     unsigned char* data = nullptr;
 };
 
+/// A version MAJOR.MINOR.REVISION.
 struct ZV_WS_VersionInfo : ZV_WS_Object {
     int Major = 0;
     int Minor = 0;
@@ -278,6 +283,7 @@ struct ZV_WS_GenreArray : ZV_WS_Object {
     ZV_WS_Genre* Genre = nullptr;
 };
 
+/// Texts for the head of a genre's pages.
 struct ZV_WS_GenreLabelResponse : ZV_WS_StandardResponse {
     char* Label = nullptr;
     char* LabelMessage = nullptr;  ///< Explains the label.
@@ -300,9 +306,10 @@ struct ZV_WS_FileProfileArray : ZV_WS_Object {
     ZV_WS_FileProfile* FileProfile = nullptr;
 };
 
+/// One of the sounds that there are of a film.
 struct ZV_WS_AudioFile : ZV_WS_Object {
     int AssetAudioID = 0;
-    char* FileLocation = nullptr;
+    char* FileLocation = nullptr;  ///< As the service names it.
     bool ContainsVideo = false;
     ZV_WS_AudioProfile AudioAssetProfile = AUDIO_PROFILE_STEREO_STANDARD;
 };
@@ -319,8 +326,8 @@ struct ZV_WS_ProductListing : ZV_WS_Object {
     char* Price = nullptr;                   ///< Decimal text as the service sent it, without currency: "12.99".
     ZV_WS_FileProfileArray AvailableAssets;  ///< The pictures that there are of it.
     char* ExpireDate = nullptr;              ///< "YYYY/MM/DD HH:MM:SS", in the customer's time. Anything else: no date.
-    ZV_WS_AudioFileArray AvailableAudioProfiles;
-    int RentalPeriod = 0;  ///< As the service counts it; players show it.
+    ZV_WS_AudioFileArray AvailableAudioProfiles;  ///< The sounds likewise.
+    int RentalPeriod = 0;                         ///< As the service counts it; players show it.
 };
 
 struct ZV_WS_ProductListingArray : ZV_WS_Object {
@@ -332,15 +339,15 @@ struct ZV_WS_ProductListingArray : ZV_WS_Object {
 struct ZV_WS_TitleListing : ZV_WS_Object {
     int TitleID = 0;
     char* TitleName = nullptr;
-    char* BoxArtPrefix = nullptr;  ///< For ZV_WS_getBoxArtImage.
-    short TitlePosition = 0;       ///< Its place in the whole listing; the first is 1.
-    int EpisodeNumber = 0;         ///< Of an episode, within its season.
-    ZV_WS_BonusAssetArray BonusAssets;
-    bool IsTvListing = false;    ///< A season, whose episodes are titles of their own.
+    char* BoxArtPrefix = nullptr;       ///< For ZV_WS_getBoxArtImage.
+    short TitlePosition = 0;            ///< Its place in the whole listing; the first is 1.
+    int EpisodeNumber = 0;              ///< Of an episode, within its season.
+    ZV_WS_BonusAssetArray BonusAssets;  ///< Trailers.
+    bool IsTvListing = false;           ///< A season, whose episodes are titles of their own.
     char* MPAARating = nullptr;  ///< The ages that it is for, by the scale of the United States; CHVRS: of Canada.
-    ZV_WS_ProductListingArray AvailableProducts;
-    bool IsTHXMediaDirectorEnabled = false;  ///< Whether ZV_WS_getTHXMediaDirector has something for it.
-    bool IsTHXMediaDirectorEnabledForTrailer = false;
+    ZV_WS_ProductListingArray AvailableProducts;       ///< The ways to buy or rent it.
+    bool IsTHXMediaDirectorEnabled = false;            ///< Whether ZV_WS_getTHXMediaDirector has something for it.
+    bool IsTHXMediaDirectorEnabledForTrailer = false;  ///< Likewise ZV_WS_getTHXMediaDirectorBonusAsset.
     char* CHVRSRating = nullptr;
     char* LoyaltyPointsForBuy = nullptr;  ///< Texts to show.
     char* LoyaltyPointsForRent = nullptr;
@@ -388,6 +395,7 @@ struct ZV_WS_TitlesResponseArray : ZV_WS_Object {
     ZV_WS_TitlesResponse* TitlesResponse = nullptr;
 };
 
+/// An episode by name and number; ZV_WS_getTvEpisodeListing tells the rest.
 struct ZV_WS_TvEpisode : ZV_WS_Object {
     int EpisodeID = 0;  ///< For ZV_WS_getTvEpisodeListing.
     char* EpisodeName = nullptr;
@@ -399,19 +407,23 @@ struct ZV_WS_TvEpisodeArray : ZV_WS_Object {
     ZV_WS_TvEpisode* TvEpisode = nullptr;
 };
 
+/// The episodes of a season.
 struct ZV_WS_TvEpisodeListResponse : ZV_WS_StandardResponse {
     ZV_WS_TvEpisodeArray Episodes;
 };
 
+/// The title that a product belongs to.
 struct ZV_WS_TranslateSkuIDResponse : ZV_WS_StandardResponse {
     int TitleID = 0;
 };
 
+/// The title that another guide knows by an identifier of its own.
 struct ZV_WS_TranslateTivoExternalIDResponse : ZV_WS_StandardResponse {
     char* TivoExternalID = nullptr;  ///< The one asked about.
     int TitleID = 0;
 };
 
+/// Titles like another one, all on one page.
 struct ZV_WS_RecommendedTitlesResponse : ZV_WS_StandardResponse {
     ZV_WS_TitleListingArray Titles;
 };
@@ -445,6 +457,7 @@ struct ZV_WS_MyVideosResponse : ZV_WS_StandardResponse {
     ZV_WS_TitleListingPurchasedArray Titles;
 };
 
+/// A page of the wish list.
 struct ZV_WS_WishlistItemsResponse : ZV_WS_MyVideosResponse {
     int SortOrder = 0;  ///< A ZV_WS_SortOrder.
 };
@@ -455,6 +468,7 @@ struct ZV_WS_TitlesInWishlist : ZV_WS_Object {
     bool* IsAvailInUserWishlist = nullptr;
 };
 
+/// What a gift code has made of the prepaid money.
 struct ZV_WS_GiftCertificateResponse : ZV_WS_StandardResponse {
     int Balance = 0;  ///< Prepaid money in cents, with the gift.
 };
@@ -464,23 +478,25 @@ struct ZV_WS_CheckAdultVerificationEnabledResponse : ZV_WS_StandardResponse {
 };
 
 struct ZV_WS_CheckAdultVerificationPinResponse : ZV_WS_StandardResponse {
-    bool IsPinVerified = false;
+    bool IsPinVerified = false;  ///< false: the PIN is wrong, which is no failure of the call.
 };
 
+/// What a purchase has given the customer.
 struct ZV_WS_PurchaseResponse : ZV_WS_StandardResponse {
-    int PassID = 0;  ///< For the playback calls.
-    int TransactionID = 0;
-    char* TransactionAuthNum = nullptr;
+    int PassID = 0;                      ///< For the playback calls.
+    int TransactionID = 0;               ///< The payment's, for questions to the service.
+    char* TransactionAuthNum = nullptr;  ///< Likewise, as text.
 };
 
 struct ZV_WS_PPCardBalanceResponse : ZV_WS_StandardResponse {
     int Balance = 0;  ///< Prepaid money in cents.
 };
 
+/// The card on file, as far as it may be shown.
 struct ZV_WS_BillingInfoResponse : ZV_WS_StandardResponse {
     char* CCLastFour = nullptr;  ///< The last four digits of the card on file.
-    int CCTypeID = 0;
-    char* CCType = nullptr;  ///< Name to show.
+    int CCTypeID = 0;            ///< The kind of card, by the service's number.
+    char* CCType = nullptr;      ///< Name to show.
 };
 
 /// Each of the two has a response code of its own.
@@ -500,6 +516,7 @@ struct ZV_WS_CalcOrderTaxResponse : ZV_WS_StandardResponse {
     char* Tax = nullptr;
 };
 
+/// How long a rental lasts.
 struct ZV_WS_RentalExpirationResponse : ZV_WS_StandardResponse {
     bool ShouldDisplay = false;  ///< Whether to warn the customer.
     int HoursRemaining = 0;
@@ -507,6 +524,7 @@ struct ZV_WS_RentalExpirationResponse : ZV_WS_StandardResponse {
 
 // ---- The device
 
+/// One of the service's values for its players; what a key means is between service and player.
 struct ZV_WS_ConfigurationItem : ZV_WS_Object {
     char* Key = nullptr;
     char* Value = nullptr;
