@@ -108,10 +108,10 @@ ZV_WS_Status ZV_WS_duplicate(ZV_WS_Session* newHandle, const ZV_WS_Session* sour
 /// ZV_WS_abort ends that first.
 ZV_WS_Status ZV_WS_release(ZV_WS_Object* any);
 
-/// Breaks off the call that another thread makes with the session, and lets no further one reach the network: the call
-/// returns within 200 ms as after a failed exchange. For ending a session that may hang in the network; ZV_WS_release
-/// still has to follow, after that thread's call has returned. Any thread. An empty handle is fine. A null one breaks
-/// off every ZV_WS_getServerTime that is under way, and lets others begin.
+/// Breaks off what another thread's call with the session does in the network, and lets no further one reach it: the
+/// call returns within 200 ms as after a failed exchange, later only if it waits for the disk or the system's name
+/// lookup. For ending a session that may hang; ZV_WS_release has to follow, after that call has returned. Any thread.
+/// An empty handle is fine. A null one breaks off every ZV_WS_getServerTime under way, and lets others begin.
 void ZV_WS_abort(const ZV_WS_Session* handle);
 
 /// The library's version, 1.3.1. Always ZV_WS_Status_ok but for memory exhaustion.
