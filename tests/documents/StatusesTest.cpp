@@ -21,7 +21,12 @@ std::set<std::string> RefusalsOf(const std::string& call)
         const ZV_WS_Status status = ZVUtilities::To_ZV_WS_Status(0, code, call.c_str());
         const auto known = std::find_if(PublicStatuses().begin(), PublicStatuses().end(),
                                         [=](const PublicStatus& candidate) { return candidate.value == status; });
-        if (status != ZV_WS_Status_general_error) refusals.insert(known->name);
+        if (status == ZV_WS_Status_general_error) continue;
+        if (known == PublicStatuses().end()) {
+            ADD_FAILURE() << call << ": " << status;
+        } else {
+            refusals.insert(known->name);
+        }
     }
     return refusals;
 }

@@ -56,7 +56,7 @@ PublicStatus StatusOf(const std::string& name, int value, const std::string& com
 
 std::vector<PublicCall> PublicCalls(const std::string& prefix)
 {
-    const std::regex declaration("\\w[\\w ]*[ *](" + prefix + "\\w+)\\(.*");
+    const std::regex declaration("\\w[\\w ]*[ *]+(" + prefix + "\\w+)\\(.*");
     std::vector<std::string> headers;
     for (const auto& entry : std::filesystem::directory_iterator(SourceFile("Public")))
         headers.push_back(entry.path().filename().string());
