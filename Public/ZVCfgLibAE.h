@@ -30,6 +30,7 @@ public:
         kWrongArguments = -3,  ///< An argument is missing or of the wrong kind, or a text holds a NUL character.
     };
 
+    // What the runtime asks of a class (stagecraft/ASExtensionClass.h).
     static const char* GetClassName();
     static bool FiresEvents();
     static void GetMethods(AEArray<ae::stagecraft::ASExtensionClass::Method>& methodArrayToFill);
@@ -54,5 +55,5 @@ private:
     ZVCFGLIBAE_METHODS(ZVCFGLIBAE_DECLARE)
 #undef ZVCFGLIBAE_DECLARE
 
-    AEString m_File;
+    AEString m_File;  // what "setFile" was given; empty before
 };

@@ -20,6 +20,39 @@
 // kWrongArguments, and nothing is sent: its getter throws, or its value or an element of it cannot be converted
 // (valueOf or toString throws, a symbol).
 //
+// What they mean and answer is said at the library's call of that name (ZVWSLib.h); the properties, in the order in
+// which they are read:
+//   init                         APIKey, UserName, Password, DestinationTypeID, AuthToken, DestinationUniqueID,
+//                                ServiceBaseURL, Type, CacheType, CacheData, CachePath, CacheLimit, ProxyHost,
+//                                ProxyUserName, ProxyPort, ProxyPassword, AccessType, ApplicationRevision, EnvNum,
+//                                firmwareVersion, modelNumber: set-up (ZV_WS_initialize)
+//   getTitles                    genreid, CurrentPageNumber, ItemsPerPage, purchasetype
+//   searchForTitle               CurrentPageNumber, ItemsPerPage, purchasetype, typefilter, query
+//   getMyVideos                  CurrentPageNumber, ItemsPerPage, purchasetype, typefilter, watchstatus
+//   getWishlistItems             sortorder, CurrentPageNumber, ItemsPerPage, typefilter
+//   getBoxArtImage               boxartsize, boxartprefix
+//   doPurchaseSavedBilling       skuid, ipaddress, useprepaidfund
+//   assignGiftCertificateToUser  giftcertificatecode
+//   manageStreamingInstanceStatus   streamid, streamstatus, stoptimeSeconds
+//   getTHXMediaDirector          passid, fileprofile, audioprofile
+//   getTHXMediaDirectorBonusAsset   bonusassetid, fileprofile, bonusassettype
+//   checkTitlesInWishlist        titleids, typefilter
+//   setAudioDefaultProperty      audioprofile
+//   updateLocalCache             operations
+//   authorizeDevice, checkAdultVerificationPin                         pin
+//   getStreamingAssetLocation, loadLastStreamingAssetLocation          passid, fileprofile
+//   getStreamingBonusAssetLocation                                     bonusassetid
+//   checkRentalExpiration                                              passid
+//   getTvEpisodeListing                                                episodeid
+//   translateSkuID, calcOrderTax, checkForPurchasedSku                 skuid
+//   getTitleListing, getRecommendedTitles, getTvEpisodeListByTitleID, getAllTvEpisodeListings, addItemToWishlist,
+//   removeItemFromWishlist, checkTitleInWishlist, checkForPurchasedTitle   titleid
+//   all others                   none
+//
+// A result is what the call hands out: a record is an object with its members by name, an array record an Array, a text
+// a String or null, a number or a flag itself; "init" and "updateLocalCache" answer whether they succeeded. ExpireDate
+// is a Date in local time, null when it cannot be read, and a file profile in an Array an object {FileProfile}.
+//
 // Methods that answer at once, with arguments of their own. None of them waits for the network; those that take a path
 // and "clone", which opens the cache, block on the disk.
 //   clone(instance)             a session like that of another instance, which may have a call under way; ReturnCode
@@ -121,6 +154,7 @@ public:
         kDuplicateFailed = -5,     ///< "clone" only: a session of its own could not be made.
     };
 
+    // What the runtime asks of a class (stagecraft/ASExtensionClass.h).
     static const char* GetClassName();
     static bool FiresEvents();
     static void GetMethods(AEArray<ae::stagecraft::ASExtensionClass::Method>& methodArrayToFill);

@@ -1,13 +1,28 @@
-// The records of ZVWSLib.h as data: tag, base, members in order.
+// The records of ZV_WS_Types.h as data: tag, base, members in order.
 //
-// For code that treats records alike, such as releasing them or turning them into script objects. Header only; any
-// thread.
+// For code that treats records alike, such as releasing them or turning them into script objects. Header
+// only; any thread.
 //
 //   ZV_WS_RecordTraits<Record>::kTag          the number behind `_pImpl`
 //   ZV_WS_RecordTraits<Record>::Base          the record it extends, ZV_WS_Object at the root
-//   ZV_WS_RecordTraits<Record>::Visit(r, v)   for its own members, not the base's, in order: v.Member("Name", r.Name),
-//   or
+//   ZV_WS_RecordTraits<Record>::Visit(r, v)   for its own members, not the base's, in order: v.Member("Name", r.Name);
 //                                             v.Elements("Name", r.size, r.Name) for the array of an array record
+//
+// A visitor has a Member for each kind of member that it wants to see (bool, numbers, enumerations, char*, embedded
+// records) and an Elements for arrays, both usually templates. Embedded records come as members, and it is the visitor
+// that goes on into them; so it does with the base:
+//
+//     template <class Record, class Visitor>
+//     void VisitAll(Record& record, Visitor& visitor)
+//     {
+//         if constexpr (!std::is_same_v<Record, ZV_WS_Object>) {
+//             VisitAll<typename ZV_WS_RecordTraits<Record>::Base>(record, visitor);
+//             ZV_WS_RecordTraits<Record>::Visit(record, visitor);
+//         }
+//     }
+//
+// Tags are stored behind `_pImpl` of every record that is handed out: a tag is never given to another record. 1 is the
+// session's; 48, 49 and 51 to 54 belong to nothing, and releasing such a record frees its tag alone.
 #pragma once
 
 #include <tuple>
@@ -52,8 +67,12 @@ struct ZV_WS_RecordTraits;
             visits                                     \
         }                                              \
     };
+
+/// One row: a record, the record it extends, its tag, its own members in the order of the struct.
 #define ZV_WS_RECORD(Record, base, tag, ...) \
     ZV_WS_RECORD_TRAITS(Record, base, tag, ZV_WS_EACH(ZV_WS_VISIT_MEMBER, __VA_ARGS__))
+
+/// One row: a record with an array of `size` elements behind the pointer `elements`, and no other member of its own.
 #define ZV_WS_ARRAY_RECORD(Record, base, tag, elements) \
     ZV_WS_RECORD_TRAITS(Record, base, tag, v.Elements(#elements, r.size, r.elements);)
 
