@@ -1,6 +1,6 @@
 #include "PlainService.h"
 
-#include <cctype>
+#include <algorithm>
 #include <ctime>
 
 namespace simulator {
@@ -25,11 +25,12 @@ std::string Clock(time_t now)
     return text;
 }
 
-HttpResponse NotFound()
+HttpResponse NotFound(LoggedRequest& log, const std::string& why)
 {
+    log.violation = why;
     HttpResponse response;
     response.status = 404;
-    response.body = "not found";
+    response.body = "not found: " + why;
     return response;
 }
 
@@ -46,18 +47,21 @@ const char* SizeOf(const std::string& folder)
     return nullptr;
 }
 
-HttpResponse BoxArt(const HttpRequest& request, const Fault& fault, LoggedRequest& log)
+HttpResponse BoxArt(const HttpRequest& request, Database& database, const Fault& fault, LoggedRequest& log)
 {
     const std::string path = UrlDecode(request.Path());
     const size_t start = sizeof kBoxArt - 1;
-    const size_t slash = path.find('/', start);
-    const char* size = slash == std::string::npos ? nullptr : SizeOf(path.substr(start, slash - start));
-    if (!size) return NotFound();
+    const size_t slash = std::min(path.find('/', start), path.size());
+    const char* size = SizeOf(path.substr(start, slash - start));
+    if (!size) return NotFound(log, "box art has no size " + path.substr(start, slash - start));
     const std::string end = std::string(size) + ".jpg";
-    std::string name = path.substr(slash + 1);
-    if (name.size() <= end.size() || name.compare(name.size() - end.size(), end.size(), end) != 0) return NotFound();
+    std::string name = path.substr(std::min(slash + 1, path.size()));
+    if (name.size() <= end.size() || name.compare(name.size() - end.size(), end.size(), end) != 0)
+        return NotFound(log, "box art of that size ends with " + end);
     name.resize(name.size() - end.size());
     log.operation = name;
+    if (database.Int("SELECT COUNT(*) FROM title WHERE prefix = ?", {name}) == 0)
+        return NotFound(log, "no title has box art " + name);
     HttpResponse response;
     response.headers = {{"Last-Modified", fault.Is("modified") ? kLaterModified : kLastModified}};
     const bool known = request.Header("if-modified-since") == kLastModified && !fault.Is("modified");
@@ -65,8 +69,6 @@ HttpResponse BoxArt(const HttpRequest& request, const Fault& fault, LoggedReques
         response.status = 304;
         return response;
     }
-    // Prefixes of the catalogue: "ZV" and digits.
-    if (name.compare(0, 2, "ZV") != 0) return NotFound();
     response.contentType = "image/jpeg";
     response.body = MakeBoxArt(name, atoi(size));
     return response;
@@ -78,7 +80,8 @@ HttpResponse Discovery(const HttpRequest& request, int environment, LoggedReques
         log.children.emplace_back(name, request.Parameter(name));
     HttpResponse response;
     response.body = std::to_string(environment);
-    if (request.Parameter("d").empty() || request.Parameter("dt").empty()) return NotFound();
+    if (request.Parameter("d").empty() || request.Parameter("dt").empty())
+        return NotFound(log, "discovery wants d and dt");
     return response;
 }
 
@@ -93,13 +96,13 @@ std::string PlainServiceName(const std::string& path)
     return "";
 }
 
-HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, time_t now,
-                         const Fault& fault, LoggedRequest& log)
+HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, Database& database, int environment,
+                         time_t now, const Fault& fault, LoggedRequest& log)
 {
     log.service = service;
     log.operation = service;
     if (service == "discovery") return Discovery(request, environment, log);
-    if (service == "boxart") return BoxArt(request, fault, log);
+    if (service == "boxart") return BoxArt(request, database, fault, log);
     HttpResponse response;
     if (service == "clock") {
         response.body = Clock(now);

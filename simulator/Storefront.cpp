@@ -278,6 +278,12 @@ HttpResponse Simulator::Answer(const HttpRequest& request, const Connection& con
     const auto take = [&](const std::string& operation) { return fault = m_Faults.Take(operation); };
     const std::string path = request.Path();
     HttpResponse response;
+    log.violation = m_Hosts->Check(request, connection.channel.IsTls());
+    if (!log.violation.empty()) {
+        response.status = 400;
+        response.body = log.violation;
+        return response;
+    }
     if (connection.channel.IsTls() && AnswerContract(request, "https://" + m_Hosts->Https() + path, response)) {
         log.service = log.operation = "contract";
         return response;
@@ -290,7 +296,7 @@ HttpResponse Simulator::Answer(const HttpRequest& request, const Connection& con
     }
     const std::string plain = PlainServiceName(path);
     if (!plain.empty() && (plain == "bandwidth" || connection.channel.IsTls() == (plain == "discovery"))) {
-        return AnswerPlain(plain, request, m_Options.environment, m_Clock.Now(), take(plain), log);
+        return AnswerPlain(plain, request, *m_Database, m_Options.environment, m_Clock.Now(), take(plain), log);
     }
     log.violation = "nothing is at " + path;
     response.status = 404;

@@ -23,12 +23,21 @@ TEST_F(ServerTest, WhatIsNotThereIsSaid)
     Order("boxart=modified");
     EXPECT_EQ(200, Plain(image, known).status);
     EXPECT_NE(first.body, Plain("/images/boxart/135s/ZV00013135.jpg").body);
-    for (const char* path :
-         {"/images/boxart/135/ZV00012135.jpg", "/images/boxart/135s/ZV00012136.jpg", "/images/boxart/96/ZV0001296.jpg",
-          "/images/boxart/95/95.jpg", "/images/boxart/95", "/device/env/?d=x&dt=48", "/elsewhere"}) {
-        EXPECT_EQ(404, Plain(path).status) << path;
+    const std::pair<const char*, const char*> rows[] = {
+        {"/images/boxart/135/ZV00012135.jpg", "box art has no size 135"},
+        {"/images/boxart/96/ZV0001296.jpg", "box art has no size 96"},
+        {"/images/boxart/", "box art has no size "},
+        {"/images/boxart/135s/ZV00012136.jpg", "box art of that size ends with 135.jpg"},
+        {"/images/boxart/95/95.jpg", "box art of that size ends with 95.jpg"},
+        {"/images/boxart/95", "box art of that size ends with 95.jpg"},
+        {"/images/boxart/95/ZV9999995.jpg", "no title has box art ZV99999"},
+        {"/images/boxart/95/zv0001295.jpg", "no title has box art zv00012"},
+        {"/device/env/?d=x&dt=48", "nothing is at /device/env/"},
+        {"/elsewhere", "nothing is at /elsewhere"}};
+    for (const auto& [path, violation] : rows) {
+        EXPECT_EQ(404, Plain(path, known).status) << path;
+        EXPECT_EQ(violation, LastLogged().violation) << path;
     }
-    EXPECT_EQ("nothing is at /elsewhere", LastLogged().violation);
 }
 
 // The end comes at once in whatever state connections are.
