@@ -248,10 +248,10 @@ std::string CheckHttp(const HttpRequest& request)
 
 }  // namespace
 
-bool RequestCheck::IsNewNonce(const std::string& nonce)
+bool RequestCheck::IsNewNonce(const std::string& digest)
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    const auto [place, isNew] = m_Nonces.insert(nonce);
+    const auto [place, isNew] = m_Nonces.insert(digest);
     if (isNew) m_InOrder.push_back(place);
     if (m_InOrder.size() > m_Remembered) {
         m_Nonces.erase(m_InOrder.front());
@@ -325,7 +325,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     const std::string secret =
         m_Database.Text("SELECT password FROM service WHERE user = ?", {token.Child(kSecurity, "Username").Content()});
     if (secret.empty() || password.Value() != Sha1(nonce + created + secret)) return "authentication failed";
-    if (!IsNewNonce(nonce)) return "the nonce was used before";
+    if (!IsNewNonce(Sha1(nonce))) return "the nonce was used before";
 
     wrong = CheckSettings(blocks[5], m_Database.Text("SELECT api_key FROM service"));
     return wrong.empty() ? CheckChildren(body, *checked.operation, checked.arguments) : wrong;

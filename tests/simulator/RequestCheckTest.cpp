@@ -434,6 +434,28 @@ TEST_F(RequestCheckTest, OnlyTheLastRequestsAreRemembered)
     EXPECT_EQ(8u, store->Log().at(0).number);
 }
 
+// However much a client sends: an entry stays small, and is cut between two letters.
+TEST_F(RequestCheckTest, WhatIsRememberedOfARequestIsBounded)
+{
+    std::string children = "<z:Query>";
+    for (int i = 0; i < 40000; ++i)
+        children += "\u00e9\u6771";
+    children += "</z:Query>";
+    for (int i = 0; i < 1000; ++i)
+        children += "<z:Extra/>";
+    Send({"RealTimeBrowse", "searchForTitle", children});
+    const LoggedRequest entry = LastLogged();
+    EXPECT_EQ(100u, entry.children.size());
+    const std::string query = Value(entry.children, "Query");
+    EXPECT_EQ(4095u, query.size());
+    EXPECT_EQ("\u6771", query.substr(query.size() - 3));
+    SoapRequest request = Titles();
+    request.nonce = std::string(400000, 'n');
+    EXPECT_EQ(200, Send(request).status);
+    EXPECT_EQ(500, Send(request).status);
+    EXPECT_EQ("the nonce was used before", LastLogged().violation);
+}
+
 TEST_F(RequestCheckTest, OptionalChildrenMayBeLeftOutAndStagingHasAPathOfItsOwn)
 {
     SoapRequest request = Titles();
