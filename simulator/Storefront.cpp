@@ -184,10 +184,11 @@ bool Simulator::Begin(std::string& error)
         if (!m_Faults.Add(fault, error)) return false;
     }
     if (!OpenFolder(error) || !OpenPorts(error)) return false;
-    m_Certificates = Certificates::Open(m_Folder, error);
-    if (!m_Certificates) return false;
+    // First of all that writes: a folder that is refused stays as it is.
     m_Database = Database::Open(m_Folder + "/storefront.db", error);
     if (!m_Database || !FillCatalogue(*m_Database, error)) return false;
+    m_Certificates = Certificates::Open(m_Folder, error);
+    if (!m_Certificates) return false;
     xmlInitParser();
     m_Soap = std::make_unique<SoapService>(*m_Database, *m_Hosts, m_Clock, m_Options);
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.certificateDates, m_Options.oldTls);
