@@ -20,6 +20,8 @@ const struct {
     const char* statement;
 } kMigrations[] = {
     {2, "CREATE UNIQUE INDEX title_prefix ON title (prefix)"},
+    {2, "DROP INDEX product_title"},
+    {2, "CREATE INDEX product_title_type ON product (title, type)"},
 };
 
 const char kSchema[][512] = {
@@ -33,7 +35,7 @@ const char kSchema[][512] = {
     "CREATE TABLE title_genre (genre INTEGER, title INTEGER, PRIMARY KEY (genre, title)) WITHOUT ROWID",
     "CREATE TABLE product (sku INTEGER PRIMARY KEY, title INTEGER, type INTEGER, price TEXT, expires TEXT, period "
     "INTEGER)",
-    "CREATE INDEX product_title ON product (title)",
+    "CREATE INDEX product_title_type ON product (title, type)",
     "CREATE TABLE bonus (id INTEGER PRIMARY KEY, title INTEGER, profile INTEGER)",
     "CREATE INDEX bonus_title ON bonus (title)",
     "CREATE INDEX title_season ON title (season)",

@@ -43,7 +43,7 @@ private:
     const SimulatedClock& m_Clock;
     std::mutex m_Mutex;
     const size_t m_Remembered;
-    std::set<std::string> m_Nonces;  // their digests, as a nonce may be long
+    std::set<std::string> m_Nonces;                         // their digests, as a nonce may be long
     std::deque<std::set<std::string>::iterator> m_InOrder;  // the oldest first
 };
 

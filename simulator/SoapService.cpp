@@ -104,29 +104,21 @@ std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& 
                     m_PlainAddress, checked.account,   checked.device, m_LargestPage};
     };
     Call call = into(xml);
-    const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
-    if (fault.ClaimsFailure()) {
-        m_Database.Run("SAVEPOINT request");
-        checked.operation->handle(call);
-        m_Database.Run("ROLLBACK TO request");
-        m_Database.Run("RELEASE request");
-    } else {
-        checked.operation->handle(call);
-    }
-    if (!fault.Is("code") || checked.operation->bare) return xml.Text();
+    checked.operation->handle(call);
+    if (!fault.Is("code") || checked.operation->bare) return xml.Take();
     into(refusal).Refuse(fault.Number(1), "refused as asked");
-    return refusal.Text();
+    return refusal.Take();
 }
 
-HttpResponse SoapService::Respond(const CheckedRequest& checked, const Fault& fault)
+HttpResponse SoapService::Respond(const CheckedRequest& checked, std::string result, const Fault& fault)
 {
     const std::string name = checked.operation->name;
-    std::string result = RunHandler(checked, fault);
     if (fault.Is("fault11") || fault.Is("fault12")) return Refuse("Server", "the shop is closed", fault.Is("fault12"));
     if (fault.Is("unknown-enum")) result = WithUnknownEnum(result);
 
     std::string body = "<" + name + "Response xmlns=\"" + kService + "\">";
-    if (!fault.Is("missing-result")) body += "<" + name + "Result>" + result + "</" + name + "Result>";
+    body.reserve(body.size() + result.size() + 4 * name.size() + 64);
+    if (!fault.Is("missing-result")) body.append("<" + name + "Result>").append(result).append("</" + name + "Result>");
     body += "</" + name + "Response>";
     std::string header;
     if (fault.Is("must-understand") || fault.Is("extra-header")) {

@@ -4,6 +4,7 @@
 #include <chrono>
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <map>
 
 #include "Database.h"
@@ -116,6 +117,8 @@ TEST_F(DataFolderTest, OfTheVersionBeforeIsBroughtUpToDate)
     const std::string version = store->Query("PRAGMA user_version");
     store.reset();
     Run("DROP INDEX title_prefix");
+    Run("DROP INDEX product_title_type");
+    Run("CREATE INDEX product_title ON product (title)");
     Run("PRAGMA user_version = 2");
     Begin(options);
     EXPECT_EQ(made, schema());
@@ -142,6 +145,30 @@ TEST_F(DataFolderTest, OfAnotherVersionIsRefusedAndStaysAsItIs)
         EXPECT_EQ(std::string::npos, error.find('\n'));
         EXPECT_TRUE(before == Files());
     }
+}
+
+// Statements are kept, and are no other's when they are used inside of themselves.
+TEST(DatabaseTest, AStatementMayBeUsedInsideOfItself)
+{
+    std::string error;
+    const auto database = simulator::Database::Open(":memory:", error);
+    database->Run("CREATE TABLE number (value INTEGER)");
+    for (const int value : {1, 2, 3})
+        database->Run("INSERT INTO number VALUES (?)", {value});
+    std::function<std::string(int)> below = [&](int most) {
+        std::string text;
+        database->Each("SELECT value FROM number WHERE value < ? ORDER BY value", {most},
+                       [&](const simulator::Database::Row& row) { text += row.Text(0) + below(row.Int(0)); });
+        return text;
+    };
+    for (int i = 0; i < 2; ++i)
+        EXPECT_EQ("1213121", below(4));
+    {
+        simulator::Database::Transaction transaction(*database);
+        database->Run("DELETE FROM number");
+        transaction.Undo();
+    }
+    EXPECT_EQ("1213121", below(4));
 }
 
 TEST(ProgramTest, SaysWhereItServesAndEndsOnATermSignal)
