@@ -7,7 +7,7 @@ namespace simulator {
 
 namespace {
 
-const char kBoxArt[] = "/images/boxart/";
+const char kBoxArtPath[] = "/images/boxart/";
 constexpr size_t kBandwidthFile = 1000000;
 const char kLastModified[] = "Mon, 02 Nov 2026 06:00:00 GMT";
 const char kLaterModified[] = "Tue, 03 Nov 2026 06:00:00 GMT";
@@ -50,7 +50,7 @@ const char* SizeOf(const std::string& folder)
 HttpResponse BoxArt(const HttpRequest& request, Database& database, const Fault& fault, LoggedRequest& log)
 {
     const std::string path = UrlDecode(request.Path());
-    const size_t start = sizeof kBoxArt - 1;
+    const size_t start = sizeof kBoxArtPath - 1;
     const size_t slash = std::min(path.find('/', start), path.size());
     const char* size = SizeOf(path.substr(start, slash - start));
     if (!size) return NotFound(log, "box art has no size " + path.substr(start, slash - start));
@@ -62,10 +62,22 @@ HttpResponse BoxArt(const HttpRequest& request, Database& database, const Fault&
     log.operation = name;
     if (database.Int("SELECT COUNT(*) FROM title WHERE prefix = ?", {name}) == 0)
         return NotFound(log, "no title has box art " + name);
+    const char* modified = kLastModified;
+    bool isKnown = request.Header("if-modified-since") == kLastModified;
+    if (const Picture* kind = fault.As<Picture>()) {
+        switch (*kind) {
+            case Picture::NotModified:
+                isKnown = true;
+                break;
+            case Picture::Modified:
+                modified = kLaterModified;
+                isKnown = false;
+                break;
+        }
+    }
     HttpResponse response;
-    response.headers = {{"Last-Modified", fault.Is("modified") ? kLaterModified : kLastModified}};
-    const bool known = request.Header("if-modified-since") == kLastModified && !fault.Is("modified");
-    if (known || fault.Is("not-modified")) {
+    response.headers = {{"Last-Modified", modified}};
+    if (isKnown) {
         response.status = 304;
         return response;
     }
@@ -92,7 +104,7 @@ std::string PlainServiceName(const std::string& path)
     if (path == "/device/env/") return "discovery";
     if (path == "/device/time/") return "clock";
     if (path == "/bandwidth/test.bin") return "bandwidth";
-    if (path.rfind(kBoxArt, 0) == 0) return "boxart";
+    if (path.rfind(kBoxArtPath, 0) == 0) return "boxart";
     return "";
 }
 

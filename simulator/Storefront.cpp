@@ -226,12 +226,38 @@ void Simulator::Serve(Connection& connection, bool tls)
                   [&](const HttpRequest& request, const std::string&) { return ServeOne(connection, request); });
 }
 
+// What comes in the place of a handshake.
+void Spoil(Channel& channel, const Fault& fault)
+{
+    if (const Opening* kind = fault.As<Opening>()) {
+        switch (*kind) {
+            case Opening::Close:
+                return;
+            case Opening::StallHandshake:
+                // A handshake record of 74 bytes, of which the first two come.
+                channel.WriteBare(std::string("\x16\x03\x03\x00\x4a\x02\x00", 7));
+                return channel.Stall();
+        }
+    }
+    if (const Breaking* kind = fault.As<Breaking>()) {
+        switch (*kind) {
+            case Breaking::Reset:
+                return channel.Reset();
+            case Breaking::Stall:
+                return channel.Stall();
+            case Breaking::NoHttp:
+                channel.WriteBare("no handshake that anyone speaks\r\n");
+                return;
+        }
+    }
+}
+
 // False when the connection has come to its end.
 bool Simulator::Handshake(Connection& connection)
 {
     const Fault fault = m_Faults.Take("connect");
     Channel& channel = connection.channel;
-    if (!fault.kind.empty() || fault.delay) {
+    if (fault.row || fault.delay) {
         LoggedRequest log = BeginEntry(connection, m_Log);
         log.service = log.operation = "connect";
         log.tls = true;
@@ -239,14 +265,7 @@ bool Simulator::Handshake(Connection& connection)
         m_Log.Add(std::move(log));
     }
     if (!m_Server.Pause(fault.delay)) return false;
-    if (!fault.kind.empty()) {
-        // A handshake record of 74 bytes, of which the first two come.
-        if (fault.Is("stall-handshake")) channel.WriteBare(std::string("\x16\x03\x03\x00\x4a\x02\x00", 7));
-        if (fault.Is("no-http")) channel.WriteBare("no handshake that anyone speaks\r\n");
-        if (fault.Is("stall") || fault.Is("stall-handshake")) channel.Stall();
-        if (fault.Is("reset")) channel.Reset();
-        return false;
-    }
+    if (fault.row) return Spoil(channel, fault), false;
     SSL_CTX* context;
     {
         const std::lock_guard<std::mutex> lock(m_Mutex);
