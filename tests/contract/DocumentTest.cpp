@@ -11,10 +11,10 @@
 #include "Calls.h"
 #include "ContractSchema.h"
 #include "Deployment.h"
+#include "DocumentBlock.h"
 #include "Exchanges.h"
 #include "ReadLimits.h"
 #include "Service.h"
-#include "TempFolder.h"
 #include "ZVUtilities.h"
 
 namespace {
@@ -36,35 +36,11 @@ std::string Named(int status)
     return name == kNames.end() ? std::to_string(status) : name->second + " (" + std::to_string(status) + ")";
 }
 
-std::string Row(std::initializer_list<std::string> cells)
-{
-    std::string row = "|";
-    for (const std::string& cell : cells)
-        row.append(" ").append(cell).append(" |");
-    return row + "\n";
-}
-
-std::string Code(const std::string& text)
-{
-    return "`" + text + "`";
-}
-
 class Document : public Exchanges {
 protected:
-    // The part of the document between the comments that name it.
-    void ExpectBlock(const std::string& name, const std::string& content)
+    static void ExpectBlock(const std::string& name, const std::string& content)
     {
-        std::string text = ContentOf(kDocument);
-        const std::string begin = "<!-- " + name + " -->\n", end = "<!-- end -->";
-        size_t start = text.find(begin);
-        ASSERT_NE(std::string::npos, start) << name;
-        start += begin.size();
-        const size_t size = text.find(end, start) - start;
-        if (getenv("ZV_WRITE_DOCUMENTS")) {
-            std::ofstream(kDocument, std::ios::binary) << text.replace(start, size, content);
-        } else {
-            EXPECT_EQ(content, text.substr(start, size)) << "ZV_WRITE_DOCUMENTS=1 brings it up to date";
-        }
+        ::ExpectBlock(kDocument, name, content);
     }
 
     // The status of the call after the service refused the operation with that code.
