@@ -18,7 +18,8 @@
 
 namespace {
 
-const char kAction[] = "http://api.zorvane.example/api/getTitlesByNavigation";
+const std::string kNamespace = "http://api.zorvane.example/api/";
+const std::string kTitles = "getTitlesByNavigation";
 const char kAnonymous[] = "http://schemas.xmlsoap.org/ws/2004/08/addressing/role/anonymous";
 
 std::string Endpoint()
@@ -67,7 +68,7 @@ public:
         settings.DestinationUniqueID = const_cast<char*>("bench");
         settings.DestinationTypeID = 48;
         m_Proxy.header = nullptr;
-        soap_wsa_request(&m_Proxy, "uuid:getTitlesByNavigation", m_Endpoint.c_str(), kAction);
+        soap_wsa_request(&m_Proxy, ("uuid:" + kTitles).c_str(), m_Endpoint.c_str(), (kNamespace + kTitles).c_str());
         soap_wsa_add_ReplyTo(&m_Proxy, kAnonymous);
         soap_wsse_add_UsernameTokenDigest(&m_Proxy, "User", StorefrontAccount::kUser, StorefrontAccount::kPassword);
         m_Proxy.header->ZV1__DeviceSettings_ = &settings;
@@ -125,24 +126,27 @@ std::string Token()
            Base64(nonce, sizeof nonce) + "</wsse:Nonce><wsu:Created>" + created + "</wsu:Created></wsse:UsernameToken>";
 }
 
-std::string Envelope(const std::string& endpoint)
+std::string Page()
+{
+    return "<z:GenreID>1</z:GenreID><z:CurrentPageNumber>1</z:CurrentPageNumber><z:ItemsPerPage>" +
+           std::to_string(kItems) + "</z:ItemsPerPage><z:PurchaseType>rent</z:PurchaseType>";
+}
+
+std::string Envelope(const std::string& endpoint, const std::string& operation, const std::string& children)
 {
     return "<s:Envelope xmlns:s=\"http://schemas.xmlsoap.org/soap/envelope/\" "
            "xmlns:a=\"http://schemas.xmlsoap.org/ws/2004/08/addressing\" "
            "xmlns:wsse=\"http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-secext-1.0.xsd\" "
            "xmlns:wsu=\"http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-utility-1.0.xsd\" "
            "xmlns:z=\"http://api.zorvane.example/api/\"><s:Header><wsse:Security s:mustUnderstand=\"1\">" +
-           Token() +
-           "</wsse:Security><a:MessageID>uuid:getTitlesByNavigation</a:MessageID><a:ReplyTo s:mustUnderstand=\"1\">"
-           "<a:Address>" +
-           kAnonymous + "</a:Address></a:ReplyTo><a:To s:mustUnderstand=\"1\">" + endpoint +
-           "</a:To><a:Action s:mustUnderstand=\"1\">" + kAction +
+           Token() + "</wsse:Security><a:MessageID>uuid:" + operation +
+           "</a:MessageID><a:ReplyTo s:mustUnderstand=\"1\"><a:Address>" + kAnonymous +
+           "</a:Address></a:ReplyTo><a:To s:mustUnderstand=\"1\">" + endpoint +
+           "</a:To><a:Action s:mustUnderstand=\"1\">" + kNamespace + operation +
            "</a:Action><z:DeviceSettings s:mustUnderstand=\"1\"><z:APIKey>" + StorefrontAccount::kApiKey +
            "</z:APIKey><z:DestinationUniqueID>bench</z:DestinationUniqueID><z:DestinationTypeID>48"
-           "</z:DestinationTypeID></z:DeviceSettings></s:Header><s:Body><z:getTitlesByNavigation><z:GenreID>1"
-           "</z:GenreID><z:CurrentPageNumber>1</z:CurrentPageNumber><z:ItemsPerPage>" +
-           std::to_string(kItems) +
-           "</z:ItemsPerPage><z:PurchaseType>rent</z:PurchaseType></z:getTitlesByNavigation></s:Body></s:Envelope>";
+           "</z:DestinationTypeID></z:DeviceSettings></s:Header><s:Body><z:" +
+           operation + ">" + children + "</z:" + operation + "></s:Body></s:Envelope>";
 }
 
 unsigned int CountTitles(xmlNodePtr node)
@@ -180,12 +184,23 @@ unsigned int CountWithPugi(std::string& answer)
     return document.load_buffer_inplace(answer.data(), answer.size()) ? CountTitles(document) : 0;
 }
 
+// An answer that is not read: what it takes to ask and to be answered.
+unsigned int CountOfWhatCame(std::string& answer)
+{
+    return answer.find("Result>") != std::string::npos ? kItems : 0;
+}
+
 class Curl {
 public:
-    Curl() : m_Endpoint(Endpoint()), m_Authorities(Authorities()), m_Curl(curl_easy_init())
+    explicit Curl(const std::string& operation = kTitles, const std::string& children = Page())
+        : m_Operation(operation),
+          m_Children(children),
+          m_Endpoint(Endpoint()),
+          m_Authorities(Authorities()),
+          m_Curl(curl_easy_init())
     {
         m_Headers = curl_slist_append(nullptr, "Content-Type: text/xml; charset=utf-8");
-        m_Headers = curl_slist_append(m_Headers, (std::string("SOAPAction: \"") + kAction + "\"").c_str());
+        m_Headers = curl_slist_append(m_Headers, ("SOAPAction: \"" + kNamespace + operation + "\"").c_str());
         curl_easy_setopt(m_Curl, CURLOPT_URL, m_Endpoint.c_str());
         curl_easy_setopt(m_Curl, CURLOPT_CAINFO, m_Authorities.c_str());
         curl_easy_setopt(m_Curl, CURLOPT_HTTPHEADER, m_Headers);
@@ -200,9 +215,9 @@ public:
         curl_easy_cleanup(m_Curl);
     }
 
-    void GetTitles(unsigned int (*count)(std::string& answer))
+    void Get(unsigned int (*count)(std::string& answer))
     {
-        const std::string envelope = Envelope(m_Endpoint);
+        const std::string envelope = Envelope(m_Endpoint, m_Operation, m_Children);
         m_Answer.clear();
         curl_easy_setopt(m_Curl, CURLOPT_POSTFIELDS, envelope.data());
         curl_easy_setopt(m_Curl, CURLOPT_POSTFIELDSIZE, static_cast<long>(envelope.size()));
@@ -217,6 +232,8 @@ private:
         return length;
     }
 
+    const std::string m_Operation;
+    const std::string m_Children;
     const std::string m_Endpoint;
     const std::string m_Authorities;
     CURL* m_Curl;
@@ -227,9 +244,18 @@ private:
 void CurlAndParser(benchmark::State& state, unsigned int (*count)(std::string&))
 {
     Curl curl;
-    curl.GetTitles(count);
+    curl.Get(count);
     while (state.KeepRunning())
-        curl.GetTitles(count);
+        curl.Get(count);
+}
+
+// What the simulator itself takes, and the measuring of it: a page, and as little as an answer can be.
+void Simulator(benchmark::State& state, bool page)
+{
+    Curl curl(page ? kTitles : "getLastCacheLoadTimeUTC", page ? Page() : "");
+    curl.Get(CountOfWhatCame);
+    while (state.KeepRunning())
+        curl.Get(CountOfWhatCame);
 }
 
 }  // namespace
@@ -238,3 +264,5 @@ BENCHMARK(Library)->Name("warm/library");
 BENCHMARK(BareToolkit)->Name("warm/toolkit");
 BENCHMARK_CAPTURE(CurlAndParser, xml, CountWithXml)->Name("warm/curl");
 BENCHMARK_CAPTURE(CurlAndParser, pugi, CountWithPugi)->Name("warm/curl-pugixml");
+BENCHMARK_CAPTURE(Simulator, page, true)->Name("simulator/page");
+BENCHMARK_CAPTURE(Simulator, text, false)->Name("simulator/text");

@@ -87,6 +87,8 @@ const struct {
      0, true},
     {"Bare SOAP toolkit, connection kept", "warm/toolkit", "libcurl with libxml2, connection kept", "warm/curl", 0,
      true},
+    {"The simulator's page of 20 titles, unread", "simulator/page", "its answer of one text, unread", "simulator/text",
+     0, false},
     {"Cached `ZV_WS_getTitles`, 20 titles", "cached/library", "open, select, close + inflate + parse + convert",
      "cached/database+cached/inflate+cached/parse+cached/convert", 1.3, true},
     {"of which open, select, close", "cached/database", "the cached call", "cached/library", 0, true},

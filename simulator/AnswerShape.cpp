@@ -1,8 +1,5 @@
 #include "AnswerShape.h"
 
-#include <algorithm>
-#include <iterator>
-
 #include "Namespaces.h"
 #include "Records.h"
 #include "Xml.h"
@@ -11,9 +8,6 @@
 namespace simulator {
 
 namespace {
-
-const char* const kKinds[] = {"prefixes", "nil",  "absent-arrays", "latin1",  "bom", "xsi-types",
-                              "cdata",    "text", "boolean",       "counter", "enum"};
 
 const char kBoolean[] = "xsd:boolean";
 const char kFlag[] = "xsd:anyType";  // the contract's only element of any type holds a yes or a no
@@ -48,10 +42,11 @@ std::string WithAll(std::string text, const std::string& from, const std::string
 // Writes a document anew, in one form.
 class ShapeWriter {
 public:
-    explicit ShapeWriter(const Fault& fault) : m_Fault(fault)
+    /// `value`: the fault's.
+    ShapeWriter(Shape shape, const std::string& value) : m_Shape(shape), m_Value(value)
     {
         // Prefixes that mean something else wherever people write envelopes by hand.
-        if (fault.Is("prefixes")) m_Envelope = "xsd:", m_Service = "SOAP-ENV:";
+        if (shape == Shape::Prefixes) m_Envelope = "xsd:", m_Service = "SOAP-ENV:";
     }
 
     std::string Write(const Node& envelope)
@@ -67,15 +62,16 @@ private:
     void WriteNamespaces();
     void WriteAttribute(const std::string& name, const std::string& value);
     std::string Leaf(const Node& element, const std::string& type) const;
-    std::string Given(const char* standard) const { return m_Fault.value.empty() ? standard : m_Fault.value; }
+    std::string Given(const char* standard) const { return m_Value.empty() ? standard : m_Value; }
     // What stands between two elements, of a record or elsewhere.
     std::string Gap(bool record) const
     {
-        if (m_Fault.Is("text") && record) return "stray text";
-        return m_Fault.Is("prefixes") ? "\n\t<!-- <next> -->\r\n" : "";
+        if (m_Shape == Shape::Text && record) return "stray text";
+        return m_Shape == Shape::Prefixes ? "\n\t<!-- <next> -->\r\n" : "";
     }
 
-    const Fault& m_Fault;
+    const Shape m_Shape;
+    const std::string m_Value;
     std::string m_Envelope = "soap:";
     std::string m_Service;
     std::string m_Text;
@@ -107,7 +103,7 @@ void ShapeWriter::WriteRecord(const Node& record, const std::string& type)
 {
     const std::vector<Node> children = record.Children();
     // An answer without its result is no right one.
-    const bool leavesOut = m_Fault.Is("absent-arrays") && type[0] != '_';
+    const bool leavesOut = m_Shape == Shape::AbsentArrays && type[0] != '_';
     auto next = children.begin();
     for (const Field& field : *FindRecord(type)) {
         if (field.occurs == '@') continue;
@@ -118,7 +114,7 @@ void ShapeWriter::WriteRecord(const Node& record, const std::string& type)
             m_Text += Gap(true);
             WriteElement(*next, field.type);
         }
-        if (absent && field.occurs == '?' && m_Fault.Is("nil")) {
+        if (absent && field.occurs == '?' && m_Shape == Shape::Nil) {
             m_Text += "<" + m_Service + field.name + " xsi:nil=\"true\"/>";
         }
     }
@@ -132,15 +128,15 @@ void ShapeWriter::WriteNamespaces()
     };
     declare(m_Envelope, kSoap11);
     declare(m_Service, kService);
-    if (m_Fault.Is("nil") || m_Fault.Is("xsi-types")) declare("xsi", kSchemaInstance);
-    if (!m_Fault.Is("xsi-types")) return;
+    if (m_Shape == Shape::Nil || m_Shape == Shape::XsiTypes) declare("xsi", kSchemaInstance);
+    if (m_Shape != Shape::XsiTypes) return;
     declare("xsd", kSchema);
     declare("tns", kService);
 }
 
 void ShapeWriter::WriteAttributes(const Node& element, const std::string& type)
 {
-    if (m_Fault.Is("xsi-types") && !type.empty() && type[0] != '_') {
+    if (m_Shape == Shape::XsiTypes && !type.empty() && type[0] != '_') {
         const bool hasPrefix = type.find(':') != std::string::npos;
         WriteAttribute("xsi:type", type == kFlag ? kBoolean : (hasPrefix ? "" : "tns:") + type);
     }
@@ -149,13 +145,13 @@ void ShapeWriter::WriteAttributes(const Node& element, const std::string& type)
         bool replaced = false;
         for (size_t i = 0; fields && i < fields->size(); ++i)
             replaced = replaced || ((*fields)[i].name == name && IsEnumeration((*fields)[i].type));
-        WriteAttribute(name, replaced && m_Fault.Is("enum") ? Given("NEW_TEXT") : value);
+        WriteAttribute(name, replaced && m_Shape == Shape::Enum ? Given("NEW_TEXT") : value);
     }
 }
 
 void ShapeWriter::WriteAttribute(const std::string& name, const std::string& value)
 {
-    const bool single = m_Fault.Is("prefixes");
+    const bool single = m_Shape == Shape::Prefixes;
     const std::string quote = single ? "'" : "\"";
     const std::string text = single ? WithAll(XmlEscape(value), "'", "&#39;") : XmlEscape(value);
     m_Text += (single ? "\n" : " ") + name + (single ? " = " : "=") + quote + text + quote;
@@ -164,10 +160,28 @@ void ShapeWriter::WriteAttribute(const std::string& name, const std::string& val
 std::string ShapeWriter::Leaf(const Node& element, const std::string& type) const
 {
     const std::string text = element.Content();
-    if (m_Fault.Is("boolean") && (type == kBoolean || type == kFlag)) return Given(text == "true" ? "1" : "0");
-    if (m_Fault.Is("enum") && IsEnumeration(type)) return Given("NEW_TEXT");
-    if (m_Fault.Is("counter") && element.Name() == "TotalItems") return Given("40000");
-    if (m_Fault.Is("cdata")) return "<![CDATA[" + WithAll(text, "]]>", "]]]]><![CDATA[>") + "]]>";
+    switch (m_Shape) {
+        case Shape::Boolean:
+            if (type == kBoolean || type == kFlag) return Given(text == "true" ? "1" : "0");
+            break;
+        case Shape::Enum:
+            if (IsEnumeration(type)) return Given("NEW_TEXT");
+            break;
+        case Shape::Counter:
+            if (element.Name() == "TotalItems") return Given("40000");
+            break;
+        case Shape::Cdata:
+            return "<![CDATA[" + WithAll(text, "]]>", "]]]]><![CDATA[>") + "]]>";
+        // What stands around it is another's, or all of the document.
+        case Shape::Prefixes:
+        case Shape::Nil:
+        case Shape::AbsentArrays:
+        case Shape::Latin1:
+        case Shape::Bom:
+        case Shape::XsiTypes:
+        case Shape::Text:
+            break;
+    }
     return XmlEscape(text);
 }
 
@@ -175,13 +189,12 @@ std::string ShapeWriter::Leaf(const Node& element, const std::string& type) cons
 
 HttpResponse Reshaped(HttpResponse response, const Fault& fault)
 {
-    if (std::none_of(std::begin(kKinds), std::end(kKinds), [&](const char* kind) { return fault.Is(kind); })) {
-        return response;
-    }
+    const Shape* shape = fault.As<Shape>();
+    if (!shape) return response;
     const Document document = ReadXml(response.body);
-    const bool latin1 = fault.Is("latin1");
-    const std::string envelope = ShapeWriter(fault).Write(Node(document));
-    response.body = std::string(fault.Is("bom") ? "\xef\xbb\xbf" : "") + "<?xml version=\"1.0\" encoding=\"" +
+    const bool latin1 = *shape == Shape::Latin1;
+    const std::string envelope = ShapeWriter(*shape, fault.value).Write(Node(document));
+    response.body = std::string(*shape == Shape::Bom ? "\xef\xbb\xbf" : "") + "<?xml version=\"1.0\" encoding=\"" +
                     (latin1 ? "ISO-8859-1" : "utf-8") + "\"?>" + (latin1 ? Latin1(envelope) : envelope);
     if (latin1) response.contentType = "text/xml; charset=ISO-8859-1";
     return response;

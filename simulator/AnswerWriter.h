@@ -21,11 +21,9 @@ public:
 
 private:
     struct Answer;
-    struct Way;
-    static const Way kWays[];
 
     void AddHeaders(HttpResponse& response, const Fault& fault) const;
-    void Encode(HttpResponse& response, bool accepted, const Fault& fault) const;
+    static void Fill(HttpResponse& response, bool packed, const Fault& fault);
     bool Drip(Channel& channel, const std::string& bytes, int pause);
 
     Server& m_Server;

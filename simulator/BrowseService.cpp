@@ -7,26 +7,28 @@ namespace {
 
 constexpr int kMostPerPage = 200;
 
-// A page of the titles that `where` selects, narrowed by purchase type and, for searches, by title type.
-void WriteTitles(Call& call, const std::string& where, const Database::Values& values, int genre)
+// A page of the titles whose ids `titles` selects, narrowed by purchase type.
+void WriteTitles(Call& call, const std::string& titles, Database::Values values, int genre)
 {
     const int page = call.Int("CurrentPageNumber");
     const int perPage = std::min(call.PageSize(), kMostPerPage);
     if (page < 1 || perPage < 1 || page > kHighestPage) return call.Refuse(2, "pages start at 1 and hold an item");
-    std::string sql = " FROM title WHERE " + where;
-    const int type = call.Int("PurchaseType");
-    if (type != 2) sql += " AND id IN (SELECT title FROM product WHERE type = " + std::to_string(type) + ")";
-    const int total = call.database.Int("SELECT COUNT(*)" + sql, values);
+    std::string from = " FROM (" + titles + ") AS listed";
+    if (const int type = call.Int("PurchaseType"); type != 2) {
+        from += " WHERE EXISTS (SELECT 1 FROM product WHERE title = listed.id AND type = ?)";
+        values.emplace_back(type);
+    }
+    const int total = call.database.Int("SELECT COUNT(*)" + from, values);
     call.Standard();
     call.xml.Element("GenreID", genre);
     WritePage(call, page, perPage, total);
+    int position = (page - 1) * perPage;
+    values.emplace_back(perPage);
+    values.emplace_back(position);
     call.xml.Group("Titles", [&] {
-        int position = (page - 1) * perPage;
-        call.database.Each(
-            "SELECT id" + sql + " ORDER BY id LIMIT " + std::to_string(perPage) + " OFFSET " + std::to_string(position),
-            values, [&](const Database::Row& row) {
-                call.xml.Group("TitleListing", [&] { WriteTitle(call, row.Int(0), ++position); });
-            });
+        call.database.Each("SELECT id" + from + " ORDER BY id LIMIT ? OFFSET ?", values, [&](const Database::Row& row) {
+            call.xml.Group("TitleListing", [&] { WriteTitle(call, row.Int(0), ++position); });
+        });
     });
 }
 
@@ -35,7 +37,7 @@ void WriteGenreTitles(Call& call, int genre)
     if (call.database.Int("SELECT COUNT(*) FROM genre WHERE id = ?", {genre}) == 0) {
         return call.Refuse(1, "no such genre");
     }
-    WriteTitles(call, "id IN (SELECT title FROM title_genre WHERE genre = ?)", {genre}, genre);
+    WriteTitles(call, "SELECT title AS id FROM title_genre WHERE genre = ?", {genre}, genre);
 }
 
 void getNavigation(Call& call)
@@ -74,8 +76,10 @@ void getTitlesByGenreArray(Call& call)
 void Search(Call& call, const char* columns)
 {
     static const char* const kByType[] = {"", " AND is_tv = 1", " AND is_tv = 0 AND season = 0"};
-    const std::string where = std::string("instr(fold(") + columns + "), fold(?)) > 0" + kByType[call.Int("TitleType")];
-    WriteTitles(call, where, {call.Text("Query")}, 0);
+    WriteTitles(call,
+                std::string("SELECT id FROM title WHERE instr(fold(") + columns + "), fold(?)) > 0" +
+                    kByType[call.Int("TitleType")],
+                {call.Text("Query")}, 0);
 }
 
 void searchForTitle(Call& call)

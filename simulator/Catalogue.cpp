@@ -11,8 +11,18 @@ namespace simulator {
 
 namespace {
 
-// Counted up with every change of the tables, or of what fills them.
-constexpr int kSchemaVersion = 2;
+// Counted up with every change of the tables, or of what fills them; a row of kMigrations tells what that is to data
+// that is there already.
+constexpr int kSchemaVersion = 3;
+
+const struct {
+    int from;  // the version that it makes one more of; data from before the first is not brought along
+    const char* statement;
+} kMigrations[] = {
+    {2, "CREATE UNIQUE INDEX title_prefix ON title (prefix)"},
+    {2, "DROP INDEX product_title"},
+    {2, "CREATE INDEX product_title_type ON product (title, type)"},
+};
 
 const char kSchema[][512] = {
     "CREATE TABLE genre (id INTEGER PRIMARY KEY, name TEXT, visible INTEGER, parent INTEGER, label TEXT)",
@@ -25,10 +35,11 @@ const char kSchema[][512] = {
     "CREATE TABLE title_genre (genre INTEGER, title INTEGER, PRIMARY KEY (genre, title)) WITHOUT ROWID",
     "CREATE TABLE product (sku INTEGER PRIMARY KEY, title INTEGER, type INTEGER, price TEXT, expires TEXT, period "
     "INTEGER)",
-    "CREATE INDEX product_title ON product (title)",
+    "CREATE INDEX product_title_type ON product (title, type)",
     "CREATE TABLE bonus (id INTEGER PRIMARY KEY, title INTEGER, profile INTEGER)",
     "CREATE INDEX bonus_title ON bonus (title)",
     "CREATE INDEX title_season ON title (season)",
+    "CREATE UNIQUE INDEX title_prefix ON title (prefix)",
     // One row: what players sign in with, whoever is the customer, and when the catalogue was loaded.
     "CREATE TABLE service (user TEXT, password TEXT, api_key TEXT, load_time TEXT)",
     // A row for each customer, with the PIN that activates a player for it. Wishes, passes and tokens name their
@@ -273,26 +284,51 @@ private:
     int m_Title = 0;
 };
 
+std::string WhyRefused(int version)
+{
+    const std::string known = std::to_string(kSchemaVersion);
+    const std::string has = "has tables of version " + std::to_string(version);
+    if (version > kSchemaVersion) {
+        return has + ", and this simulator knows " + known +
+               ": run the newer one that made them, or name another folder with --data";
+    }
+    return has + ", which cannot be brought to " + known +
+           ": remove it to start with new data, or name another folder with --data";
+}
+
+bool Make(Database& database)
+{
+    for (const char* statement : kSchema) {
+        if (database.Run(statement) < 0) return false;
+    }
+    Filler(database).Fill();
+    return true;
+}
+
+bool Migrate(Database& database, int version)
+{
+    for (const auto& step : kMigrations) {
+        if (step.from >= version && database.Run(step.statement) < 0) return false;
+    }
+    return true;
+}
+
 }  // namespace
 
 bool FillCatalogue(Database& database, std::string& error)
 {
     const bool isNew = database.Int("SELECT COUNT(*) FROM sqlite_master") == 0;
     const int version = isNew ? kSchemaVersion : database.Int("PRAGMA user_version");
-    if (version != kSchemaVersion) {
-        error = database.File() + ": has tables of version " + std::to_string(version) + ", not " +
-                std::to_string(kSchemaVersion) +
-                "; remove it to start with new data, or name another folder with --data";
+    if (version < kMigrations[0].from || version > kSchemaVersion) {
+        error = database.File() + ": " + WhyRefused(version);
         return false;
     }
+    if (!isNew && version == kSchemaVersion) return true;
     database.Run("BEGIN");
-    bool isWritten = database.Run("PRAGMA user_version = " + std::to_string(kSchemaVersion)) >= 0;
-    if (isNew) {
-        for (const char* statement : kSchema)
-            isWritten = isWritten && database.Run(statement) >= 0;
-        Filler(database).Fill();
+    if ((isNew ? Make(database) : Migrate(database, version)) &&
+        database.Run("PRAGMA user_version = " + std::to_string(kSchemaVersion)) >= 0 && database.Run("COMMIT") >= 0) {
+        return true;
     }
-    if (isWritten && database.Run("COMMIT") >= 0) return true;
     database.Run("ROLLBACK");
     error = database.File() + ": cannot write the database; name a folder that can be written with --data";
     return false;

@@ -5,8 +5,9 @@
 
 namespace simulator {
 
-/// Makes the tables of a new database and fills them; within a second. False, with the reason and what to do, when the
-/// database has tables of another version, which stay as they are, or cannot be written.
+/// Makes the tables of a new database and fills them, within a second; brings those of an older version up to date with
+/// all that is in them. False, with the reason and what to do, when the database is of a version that is too old for
+/// that or newer than this, and then nothing of it changes, or cannot be written.
 bool FillCatalogue(Database& database, std::string& error);
 
 }  // namespace simulator

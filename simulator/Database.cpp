@@ -56,41 +56,80 @@ std::unique_ptr<Database> Database::Open(const std::string& file, std::string& e
     return nullptr;
 }
 
-Database::Statement Database::Prepare(const std::string& sql, const Values& values)
+Database::Transaction::Transaction(Database& database) : m_Database(database), m_Lock(database.m_Mutex)
 {
-    sqlite3_stmt* prepared = nullptr;
-    sqlite3_prepare_v2(m_Database.get(), sql.c_str(), static_cast<int>(sql.size()), &prepared, nullptr);
+    m_Database.Run("BEGIN");
+}
+
+Database::Transaction::~Transaction()
+{
+    if (!m_Undone) m_Database.Run("COMMIT");
+}
+
+void Database::Transaction::Undo()
+{
+    m_Database.Run("ROLLBACK");
+    m_Undone = true;
+}
+
+Database::Statement Database::Take(const std::string& sql, const Values& values)
+{
+    Statement statement;
+    std::vector<Statement>& idle = m_Prepared[sql];
+    if (idle.empty()) {
+        sqlite3_stmt* prepared = nullptr;
+        sqlite3_prepare_v3(m_Database.get(), sql.c_str(), static_cast<int>(sql.size()) + 1, SQLITE_PREPARE_PERSISTENT,
+                           &prepared, nullptr);
+        statement.reset(prepared);
+    } else {
+        statement = std::move(idle.back());
+        idle.pop_back();
+    }
     int place = 0;
     for (const Value& value : values) {
         ++place;
         if (value.isText) {
-            sqlite3_bind_text(prepared, place, value.text.data(), static_cast<int>(value.text.size()),
-                              SQLITE_TRANSIENT);
+            // The values live until the statement is given back.
+            sqlite3_bind_text(statement.get(), place, value.text.data(), static_cast<int>(value.text.size()),
+                              SQLITE_STATIC);
         } else {
-            sqlite3_bind_int(prepared, place, value.number);
+            sqlite3_bind_int(statement.get(), place, value.number);
         }
     }
-    return Statement(prepared);
+    return statement;
+}
+
+void Database::GiveBack(const std::string& sql, Statement statement)
+{
+    constexpr size_t kMost = 200;  // the simulator's own, and some of those who look into the database
+    sqlite3_reset(statement.get());
+    sqlite3_clear_bindings(statement.get());
+    if (m_Prepared.size() > kMost) m_Prepared.clear();
+    m_Prepared[sql].push_back(std::move(statement));
 }
 
 int Database::Run(const std::string& sql, const Values& values)
 {
     const std::lock_guard<std::recursive_mutex> lock(m_Mutex);
-    const Statement statement = Prepare(sql, values);
+    Statement statement = Take(sql, values);
     if (!statement) return -1;
     int result;
     do {
         result = sqlite3_step(statement.get());
     } while (result == SQLITE_ROW);
-    return result == SQLITE_DONE ? sqlite3_changes(m_Database.get()) : -1;
+    const int changed = result == SQLITE_DONE ? sqlite3_changes(m_Database.get()) : -1;
+    GiveBack(sql, std::move(statement));
+    return changed;
 }
 
 void Database::Each(const std::string& sql, const Values& values, const std::function<void(const Row&)>& use)
 {
     const std::lock_guard<std::recursive_mutex> lock(m_Mutex);
-    const Statement statement = Prepare(sql, values);
-    while (statement && sqlite3_step(statement.get()) == SQLITE_ROW)
+    Statement statement = Take(sql, values);
+    if (!statement) return;
+    while (sqlite3_step(statement.get()) == SQLITE_ROW)
         use(Row(statement.get()));
+    GiveBack(sql, std::move(statement));
 }
 
 int Database::Int(const std::string& sql, const Values& values, int standard)

@@ -1,4 +1,5 @@
-// A small wrapper of SQLite: one connection, one lock, statements that bind their arguments in order.
+// A small wrapper of SQLite: one connection, one lock, statements that bind their arguments in order and are prepared
+// once. Every member may be called from any thread.
 #pragma once
 
 #include <sqlite3.h>
@@ -7,6 +8,7 @@
 #include <memory>
 #include <mutex>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 namespace simulator {
@@ -51,8 +53,21 @@ public:
     std::string File() { return sqlite3_db_filename(m_Database.get(), "main"); }
     int LastId() { return static_cast<int>(sqlite3_last_insert_rowid(m_Database.get())); }
 
-    /// Held for the whole of one request, so that requests see each other's effects whole.
-    std::recursive_mutex& Mutex() { return m_Mutex; }
+    /// One request's: what is read and written meanwhile is a whole, into which no other thread comes.
+    class Transaction {
+    public:
+        explicit Transaction(Database& database);
+        ~Transaction();
+        Transaction(const Transaction&) = delete;
+        Transaction& operator=(const Transaction&) = delete;
+        /// Nothing was written; what follows is no part of it any more.
+        void Undo();
+
+    private:
+        Database& m_Database;
+        const std::lock_guard<std::recursive_mutex> m_Lock;
+        bool m_Undone = false;
+    };
 
 private:
     struct Closer {
@@ -60,10 +75,14 @@ private:
         void operator()(sqlite3_stmt* statement) const { sqlite3_finalize(statement); }
     };
     using Statement = std::unique_ptr<sqlite3_stmt, Closer>;
-    Statement Prepare(const std::string& sql, const Values& values);
+    /// Null when it cannot be prepared.
+    Statement Take(const std::string& sql, const Values& values);
+    void GiveBack(const std::string& sql, Statement statement);
 
     std::recursive_mutex m_Mutex;
     std::unique_ptr<sqlite3, Closer> m_Database;
+    // Those that are not in use, by their text: several when one has been used while another was.
+    std::unordered_map<std::string, std::vector<Statement>> m_Prepared;
 };
 
 }  // namespace simulator

@@ -7,10 +7,12 @@
 #include <mutex>
 #include <string>
 
+#include "FaultKinds.h"
+
 namespace simulator {
 
 struct Fault {
-    std::string kind;  ///< Empty: none.
+    const KindRow* row = nullptr;  ///< Null: none.
     std::string value;
     int delay = 0;        ///< Milliseconds before the answer.
     int retryAfter = -1;  ///< Seconds after which the client may try again; -1: it is not told.
@@ -18,12 +20,25 @@ struct Fault {
     bool afterEffect = false;  ///< What the request asks for is done although the answer claims otherwise.
     unsigned long clears = 0;  ///< How often the lists had been cleared when it was taken.
 
-    bool Is(const char* name) const { return kind == name; }
+    FaultKind Kind() const { return row ? row->kind : FaultKind(); }
+    /// The kind when it is one of these, else null.
+    template <class Kinds>
+    const Kinds* As() const
+    {
+        return row ? std::get_if<Kinds>(&row->kind) : nullptr;
+    }
+    template <class Kinds>
+    bool Is(Kinds kind) const
+    {
+        const Kinds* own = As<Kinds>();
+        return own && *own == kind;
+    }
     int Number(int standard) const;
     long long Seconds(long long standard) const;
-    std::string Text() const { return value.empty() ? kind : kind + ":" + value; }
+    /// As it was ordered; empty for none.
+    std::string Text() const;
     /// Whether what the client gets says that the request was not carried out, and it was not.
-    bool ClaimsFailure() const;
+    bool ClaimsFailure() const { return row && row->effect == kUndone && !afterEffect; }
 };
 
 class Faults {

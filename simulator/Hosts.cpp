@@ -32,9 +32,27 @@ Address Hosts::Resolve(const Address& address) const
     return address;
 }
 
-bool Hosts::IsService(const std::string& authority) const
+bool Hosts::IsOurs(const std::string& authority, bool tls) const
 {
-    return Resolve(ReadAddress(authority, 443)) == Address{"127.0.0.1", m_HttpsPort};
+    const Address own = {"127.0.0.1", tls ? m_HttpsPort : m_HttpPort};
+    return Resolve(ReadAddress(authority, tls ? 443 : 80)) == own;
+}
+
+std::string Hosts::Check(const HttpRequest& request, bool tls) const
+{
+    const auto isHost = [](const auto& header) { return header.first == "host"; };
+    const auto count = std::count_if(request.headers.begin(), request.headers.end(), isHost);
+    const std::string own = tls ? Https() : Http();
+    if (count > 1) return "more than one Host";
+    if (count == 0 && request.version != "HTTP/1.0") return "no Host: " + own + " expected";
+    // A target that is a whole address goes before what the header says.
+    std::string host = request.Header("host");
+    const std::string scheme = tls ? "https://" : "http://";
+    const bool isWhole = request.target.find("://") < request.target.find('/');
+    if (isWhole && request.target.rfind(scheme, 0) != 0) return request.target + " is not at " + own;
+    if (isWhole)
+        host = request.target.substr(scheme.size(), request.target.find_first_of("/?", scheme.size()) - scheme.size());
+    return (count == 0 && !isWhole) || IsOurs(host, tls) ? "" : "Host " + host + " is not " + own;
 }
 
 }  // namespace simulator

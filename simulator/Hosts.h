@@ -3,6 +3,8 @@
 
 #include <string>
 
+#include "Http.h"
+
 namespace simulator {
 
 struct HostRow {
@@ -37,8 +39,11 @@ public:
     /// Where the bytes for an address go: one of the simulator's is on this machine, its standard port is the
     /// simulator's own. Every other one stays as it is.
     Address Resolve(const Address& address) const;
-    /// Whether "https://" and the text before the path of an address are those of the SOAP services.
-    bool IsService(const std::string& authority) const;
+    /// Whether what stands between "https://" or, without `tls`, "http://" and the path of an address is one of the
+    /// simulator's.
+    bool IsOurs(const std::string& authority, bool tls) const;
+    /// Empty when the request says once which host it is for, and that is one of the simulator's; else what is wrong.
+    std::string Check(const HttpRequest& request, bool tls) const;
 
     std::string Https() const { return "localhost:" + std::to_string(m_HttpsPort); }
     std::string Http() const { return "localhost:" + std::to_string(m_HttpPort); }

@@ -1,13 +1,13 @@
 #include "PlainService.h"
 
-#include <cctype>
+#include <algorithm>
 #include <ctime>
 
 namespace simulator {
 
 namespace {
 
-const char kBoxArt[] = "/images/boxart/";
+const char kBoxArtPath[] = "/images/boxart/";
 constexpr size_t kBandwidthFile = 1000000;
 const char kLastModified[] = "Mon, 02 Nov 2026 06:00:00 GMT";
 const char kLaterModified[] = "Tue, 03 Nov 2026 06:00:00 GMT";
@@ -25,11 +25,12 @@ std::string Clock(time_t now)
     return text;
 }
 
-HttpResponse NotFound()
+HttpResponse NotFound(LoggedRequest& log, const std::string& why)
 {
+    log.violation = why;
     HttpResponse response;
     response.status = 404;
-    response.body = "not found";
+    response.body = "not found: " + why;
     return response;
 }
 
@@ -46,27 +47,40 @@ const char* SizeOf(const std::string& folder)
     return nullptr;
 }
 
-HttpResponse BoxArt(const HttpRequest& request, const Fault& fault, LoggedRequest& log)
+HttpResponse BoxArt(const HttpRequest& request, Database& database, const Fault& fault, LoggedRequest& log)
 {
     const std::string path = UrlDecode(request.Path());
-    const size_t start = sizeof kBoxArt - 1;
-    const size_t slash = path.find('/', start);
-    const char* size = slash == std::string::npos ? nullptr : SizeOf(path.substr(start, slash - start));
-    if (!size) return NotFound();
+    const size_t start = sizeof kBoxArtPath - 1;
+    const size_t slash = std::min(path.find('/', start), path.size());
+    const char* size = SizeOf(path.substr(start, slash - start));
+    if (!size) return NotFound(log, "box art has no size " + path.substr(start, slash - start));
     const std::string end = std::string(size) + ".jpg";
-    std::string name = path.substr(slash + 1);
-    if (name.size() <= end.size() || name.compare(name.size() - end.size(), end.size(), end) != 0) return NotFound();
+    std::string name = path.substr(std::min(slash + 1, path.size()));
+    if (name.size() <= end.size() || name.compare(name.size() - end.size(), end.size(), end) != 0)
+        return NotFound(log, "box art of that size ends with " + end);
     name.resize(name.size() - end.size());
     log.operation = name;
+    if (database.Int("SELECT COUNT(*) FROM title WHERE prefix = ?", {name}) == 0)
+        return NotFound(log, "no title has box art " + name);
+    const char* modified = kLastModified;
+    bool isKnown = request.Header("if-modified-since") == kLastModified;
+    if (const Picture* kind = fault.As<Picture>()) {
+        switch (*kind) {
+            case Picture::NotModified:
+                isKnown = true;
+                break;
+            case Picture::Modified:
+                modified = kLaterModified;
+                isKnown = false;
+                break;
+        }
+    }
     HttpResponse response;
-    response.headers = {{"Last-Modified", fault.Is("modified") ? kLaterModified : kLastModified}};
-    const bool known = request.Header("if-modified-since") == kLastModified && !fault.Is("modified");
-    if (known || fault.Is("not-modified")) {
+    response.headers = {{"Last-Modified", modified}};
+    if (isKnown) {
         response.status = 304;
         return response;
     }
-    // Prefixes of the catalogue: "ZV" and digits.
-    if (name.compare(0, 2, "ZV") != 0) return NotFound();
     response.contentType = "image/jpeg";
     response.body = MakeBoxArt(name, atoi(size));
     return response;
@@ -78,7 +92,8 @@ HttpResponse Discovery(const HttpRequest& request, int environment, LoggedReques
         log.children.emplace_back(name, request.Parameter(name));
     HttpResponse response;
     response.body = std::to_string(environment);
-    if (request.Parameter("d").empty() || request.Parameter("dt").empty()) return NotFound();
+    if (request.Parameter("d").empty() || request.Parameter("dt").empty())
+        return NotFound(log, "discovery wants d and dt");
     return response;
 }
 
@@ -89,17 +104,17 @@ std::string PlainServiceName(const std::string& path)
     if (path == "/device/env/") return "discovery";
     if (path == "/device/time/") return "clock";
     if (path == "/bandwidth/test.bin") return "bandwidth";
-    if (path.rfind(kBoxArt, 0) == 0) return "boxart";
+    if (path.rfind(kBoxArtPath, 0) == 0) return "boxart";
     return "";
 }
 
-HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, int environment, time_t now,
-                         const Fault& fault, LoggedRequest& log)
+HttpResponse AnswerPlain(const std::string& service, const HttpRequest& request, Database& database, int environment,
+                         time_t now, const Fault& fault, LoggedRequest& log)
 {
     log.service = service;
     log.operation = service;
     if (service == "discovery") return Discovery(request, environment, log);
-    if (service == "boxart") return BoxArt(request, fault, log);
+    if (service == "boxart") return BoxArt(request, database, fault, log);
     HttpResponse response;
     if (service == "clock") {
         response.body = Clock(now);

@@ -69,9 +69,7 @@ ssize_t ReadPiece(int descriptor, std::string& bytes, size_t size)
 // Counts what comes back to the client, for the faults that end a tunnel.
 class Budget {
 public:
-    explicit Budget(const Fault& fault)
-        : m_Counts(fault.Is("cut-tunnel") || fault.Is("stall-tunnel")), m_Left(fault.Number(0))
-    {}
+    explicit Budget(const Fault& fault) : m_Counts(fault.As<TunnelEnd>() != nullptr), m_Left(fault.Number(0)) {}
     bool Counts() const { return m_Counts; }
     bool IsSpent() const { return m_Counts && m_Left <= 0; }
     size_t Next() const { return m_Counts ? std::min<size_t>(kPiece, static_cast<size_t>(m_Left)) : kPiece; }
@@ -84,7 +82,13 @@ private:
 
 void EndAsOrdered(Channel& client, const Fault& fault)
 {
-    if (fault.Is("stall-tunnel")) client.Stall();
+    switch (*fault.As<TunnelEnd>()) {
+        case TunnelEnd::Stall:
+            client.Stall();
+            break;
+        case TunnelEnd::Cut:
+            break;
+    }
     client.Close();
 }
 
@@ -227,7 +231,7 @@ HttpResponse Proxy::Check(const Connection& client, const HttpRequest& request, 
         log.violation = log.credentials == "none" ? "no credentials" : "wrong credentials";
         response.status = 407;
     }
-    if (response.status == 407 || (fault.Is("http") && fault.Number(0) == 407)) {
+    if (response.status == 407 || (fault.Is(Content::Status) && fault.Number(0) == 407)) {
         response.headers.emplace_back("Proxy-Authenticate", "Basic realm=\"storefront\"");
     }
     response.body = log.violation;
@@ -245,8 +249,8 @@ bool Proxy::ServeOne(Connection& client, const HttpRequest& request, const std::
     if (!m_Server.Pause(fault.delay)) return false;
     if (response.status != 200) return m_Writer.Send(client.channel, request, response, fault);
     // A length in the answer that opens a tunnel means nothing.
-    const bool claimsFailure = fault.ClaimsFailure() && !(goal.isTunnel && fault.Is("zero-length"));
-    if (claimsFailure) return m_Writer.Send(client.channel, request, response, fault) && fault.Is("http");
+    const bool claimsFailure = fault.ClaimsFailure() && !(goal.isTunnel && fault.Is(Bounding::ZeroLength));
+    if (claimsFailure) return m_Writer.Send(client.channel, request, response, fault) && fault.Is(Content::Status);
     if (!goal.isTunnel) return Forward(client, request, goal, kept, fault);
     FarSide far(*this, goal.address, client.number);
     if (!far) return m_Writer.Send(client.channel, request, Unreachable(goal), fault);
@@ -295,7 +299,7 @@ bool Proxy::Forward(Connection& client, const HttpRequest& request, const Goal& 
     }
     if (!*far) return m_Writer.Send(client.channel, request, Unreachable(goal), fault);
     // An answer that a fault spoils is the proxy's own, made of what has come whole.
-    const bool passes = fault.kind.empty() || Budget(fault).Counts();
+    const bool passes = !fault.row || Budget(fault).Counts();
     AnswerReader answer(request.method == "HEAD");
     (**far).Write(OwnRequest(request, goal, request.KeepAlive() && passes));
     if (!Fetch(client.channel, **far, answer, passes, fault)) return false;

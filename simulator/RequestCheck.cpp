@@ -10,6 +10,7 @@
 #include <memory>
 
 #include "Base64.h"
+#include "MessageForm.h"
 #include "Namespaces.h"
 #include "Tokens.h"
 #include "XmlNode.h"
@@ -18,13 +19,11 @@ namespace simulator {
 
 namespace {
 
-const char kAddressing[] = "http://schemas.xmlsoap.org/ws/2004/08/addressing";
-const char kSecurity[] = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-secext-1.0.xsd";
-const char kUtility[] = "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-wssecurity-utility-1.0.xsd";
 const char kDigestType[] =
     "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-username-token-profile-1.0#PasswordDigest";
 const char kNonceType[] =
     "http://docs.oasis-open.org/wss/2004/01/oasis-200401-wss-soap-message-security-1.0#Base64Binary";
+const char kNextActor[] = "http://schemas.xmlsoap.org/soap/actor/next";
 constexpr int kFreshSeconds = 300;
 
 std::string Sha1(const std::string& text)
@@ -58,9 +57,20 @@ std::string Joined(std::string text)
 // A header block as it must stand.
 struct Block {
     const char* space;
-    std::string name;
+    const char* name;
     bool mustUnderstand;
 };
+
+// Who a block is for, and whether it must be understood.
+std::string CheckMarks(const Node& block, bool mustUnderstand)
+{
+    const std::string marked = block.Attribute("mustUnderstand", kSoap11);
+    const bool isYes = marked == "1" || marked == "true";
+    const bool isNo = marked == "0" || marked == "false" || !block.HasAttribute("mustUnderstand", kSoap11);
+    if (mustUnderstand ? !isYes : !isNo) return "mustUnderstand of " + block.Name() + " is wrong";
+    const std::string actor = block.Attribute("actor", kSoap11);
+    return actor.empty() || actor == kNextActor ? "" : "header block " + block.Name() + " is for another actor";
+}
 
 std::string CheckBlocks(const std::vector<Node>& blocks, const std::vector<Block>& wanted)
 {
@@ -69,10 +79,8 @@ std::string CheckBlocks(const std::vector<Node>& blocks, const std::vector<Block
         if (i >= blocks.size() || !blocks[i].Is(wanted[i].space, wanted[i].name)) {
             return "header block " + std::to_string(i + 1) + " must be " + wanted[i].name;
         }
-        const std::string marked = blocks[i].Attribute("mustUnderstand", kSoap11);
-        if (wanted[i].mustUnderstand != (marked == "1" || marked == "true")) {
-            return "mustUnderstand of " + wanted[i].name + " is wrong";
-        }
+        std::string wrong = CheckMarks(blocks[i], wanted[i].mustUnderstand);
+        if (!wrong.empty()) return wrong;
     }
     return "";
 }
@@ -94,10 +102,9 @@ std::string CheckSettings(const Node& settings, const std::string& apiKey)
     return "";
 }
 
-bool IsFresh(const std::string& created, time_t now)
+bool IsFresh(time_t when, time_t now)
 {
-    time_t when;
-    return ReadDateTime(created, when) && std::llabs(static_cast<long long>(when) - now) <= kFreshSeconds;
+    return std::llabs(static_cast<long long>(when) - now) <= kFreshSeconds;
 }
 
 // ---- Body
@@ -115,7 +122,6 @@ std::string CheckValue(const Child& wanted, const Node& child, Arguments& argume
 {
     const std::string text = child.Content();
     if (wanted.type == ChildType::IntArray) return CheckIntArray(child, arguments.arrays[wanted.name]);
-    if (!child.Children().empty()) return std::string(wanted.name) + " has children";
     arguments.texts[wanted.name] = text;
     if (wanted.type == ChildType::Int) {
         if (!IsInt(text)) return std::string(wanted.name) + " is no xsd:int";
@@ -131,7 +137,6 @@ std::string CheckValue(const Child& wanted, const Node& child, Arguments& argume
 
 std::string CheckChildren(const Node& body, const OperationRow& operation, Arguments& arguments)
 {
-    if (body.HasText()) return body.Name() + " holds text beside its children";
     const std::vector<Node> children = body.Children();
     size_t at = 0;
     for (const Child& wanted : operation.children) {
@@ -177,17 +182,22 @@ void NoteHeader(const Node& header, Database& database, CheckedRequest& checked,
     }
 }
 
-// How long the message may be used; empty when that is not over.
+// When the message was made, and how long it may be used: each once at most, in this order, before what others add.
 std::string CheckTimestamp(const Node& timestamp, time_t now)
 {
     time_t created = now, expires = now;
-    const Node first = timestamp.Child(kUtility, "Created");
-    const Node last = timestamp.Child(kUtility, "Expires");
-    if ((first && !ReadDateTime(first.Value(), created)) || (last && !ReadDateTime(last.Value(), expires))) {
-        return "the message's timestamp holds no time";
+    const std::vector<Node> children = timestamp.Children();
+    size_t next = 0;
+    for (const auto& [name, when] : {std::pair<const char*, time_t*>("Created", &created), {"Expires", &expires}}) {
+        if (next == children.size() || !children[next].Is(kUtility, name)) continue;
+        if (!ReadDateTime(children[next++].Value(), *when)) return "the message's timestamp holds no time";
+        if (when == &created) expires = std::max(expires, created);
     }
-    if (created - now > kFreshSeconds) return "the message was made later than now";
-    return expires < now ? "the message has expired" : "";
+    for (; next < children.size(); ++next) {
+        if (children[next].Namespace() == kUtility) return "the message's timestamp is out of order";
+    }
+    if (!IsFresh(created, now)) return "the message is not fresh";
+    return expires < std::max(created, now) ? "the message has expired" : "";
 }
 
 std::string CheckToken(const Node& security, time_t now)
@@ -209,8 +219,9 @@ std::string CheckToken(const Node& security, time_t now)
     if (children[1].Attribute("Type", nullptr) != kDigestType) return "the password is no digest";
     if (children[2].Attribute("EncodingType", nullptr) != kNonceType) return "the nonce is no Base64Binary";
     if (Unbase64(Joined(children[2].Content())).empty()) return "the nonce is no base64 text";
-    if (!IsFresh(children[3].Value(), now)) return "the token is not fresh";
-    return "";
+    time_t created;
+    const bool isTime = ReadDateTime(children[3].Value(), created);
+    return isTime && IsFresh(created, now) ? "" : "the token is not fresh";
 }
 
 // The charset that the content type names, in lower case; "utf-8" when it names none, and "" when it is no text/xml.
@@ -237,10 +248,10 @@ std::string CheckHttp(const HttpRequest& request)
 
 }  // namespace
 
-bool RequestCheck::IsNewNonce(const std::string& nonce)
+bool RequestCheck::IsNewNonce(const std::string& digest)
 {
     const std::lock_guard<std::mutex> lock(m_Mutex);
-    const auto [place, isNew] = m_Nonces.insert(nonce);
+    const auto [place, isNew] = m_Nonces.insert(digest);
     if (isNew) m_InOrder.push_back(place);
     if (m_InOrder.size() > m_Remembered) {
         m_Nonces.erase(m_InOrder.front());
@@ -255,7 +266,7 @@ bool RequestCheck::IsEndpoint(const std::string& text, const std::string& path) 
     const std::string scheme = "https://";
     const size_t slash = text.find('/', scheme.size());
     return text.compare(0, scheme.size(), scheme) == 0 && slash != std::string::npos && text.substr(slash) == path &&
-           m_Hosts.IsService(text.substr(scheme.size(), slash - scheme.size()));
+           m_Hosts.IsOurs(text.substr(scheme.size(), slash - scheme.size()), true);
 }
 
 std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& service, CheckedRequest& checked,
@@ -278,6 +289,8 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     if (!document) return "the body is no XML";
     if (document->intSubset) return "the body has a document type declaration";
     if (!envelope.Is(kSoap11, "Envelope")) return "the body is no SOAP 1.1 envelope";
+    wrong = CheckForm(document);
+    if (!wrong.empty()) return wrong;
     if (bodies.size() != 1 || body.Namespace() != kService)
         return "the SOAP body holds no single element of the service";
     checked.operation = FindOperation(service, body.Name());
@@ -294,8 +307,10 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
                                  {kService, service.settingsBlock, true}});
     if (!wrong.empty()) return wrong;
     if (blocks[1].Value() != "uuid:" + body.Name()) return "wsa:MessageID is not uuid:" + body.Name();
-    if (blocks[2].Child(kAddressing, "Address").Value() != std::string(kAddressing) + "/role/anonymous") {
-        return "wsa:ReplyTo is not anonymous";
+    const std::vector<Node> address = blocks[2].Children();
+    if (address.size() != 1 || !address[0].Is(kAddressing, "Address") ||
+        address[0].Value() != std::string(kAddressing) + "/role/anonymous") {
+        return "wsa:ReplyTo is not the anonymous role alone";
     }
     if (!IsEndpoint(blocks[3].Value(), request.Path()))
         return "wsa:To is not https://" + m_Hosts.Https() + request.Path();
@@ -310,7 +325,7 @@ std::string RequestCheck::Check(const HttpRequest& request, const ServiceRow& se
     const std::string secret =
         m_Database.Text("SELECT password FROM service WHERE user = ?", {token.Child(kSecurity, "Username").Content()});
     if (secret.empty() || password.Value() != Sha1(nonce + created + secret)) return "authentication failed";
-    if (!IsNewNonce(nonce)) return "the nonce was used before";
+    if (!IsNewNonce(Sha1(nonce))) return "the nonce was used before";
 
     wrong = CheckSettings(blocks[5], m_Database.Text("SELECT api_key FROM service"));
     return wrong.empty() ? CheckChildren(body, *checked.operation, checked.arguments) : wrong;

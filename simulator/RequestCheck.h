@@ -36,14 +36,14 @@ public:
 
 private:
     bool IsEndpoint(const std::string& text, const std::string& path) const;
-    bool IsNewNonce(const std::string& nonce);
+    bool IsNewNonce(const std::string& digest);
 
     Database& m_Database;
     const Hosts& m_Hosts;
     const SimulatedClock& m_Clock;
     std::mutex m_Mutex;
     const size_t m_Remembered;
-    std::set<std::string> m_Nonces;
+    std::set<std::string> m_Nonces;                         // their digests, as a nonce may be long
     std::deque<std::set<std::string>::iterator> m_InOrder;  // the oldest first
 };
 

@@ -1,10 +1,39 @@
 #include "RequestLog.h"
 
+#include <algorithm>
 #include <cstdio>
 
 namespace simulator {
 
 namespace {
+
+// What a client may send is larger than what is worth to be kept.
+constexpr size_t kLongestText = 4096;
+constexpr size_t kMostPairs = 100;
+
+void Cut(std::string& text)
+{
+    if (text.size() <= kLongestText) return;
+    size_t end = kLongestText;
+    while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0) == 0x80)
+        --end;
+    text.resize(end);
+    text.shrink_to_fit();
+}
+
+void Cut(LoggedRequest& request)
+{
+    for (std::string* text : {&request.operation, &request.method, &request.target, &request.violation})
+        Cut(*text);
+    for (auto* pairs : {&request.headers, &request.soap, &request.children}) {
+        pairs->resize(std::min(pairs->size(), kMostPairs));
+        pairs->shrink_to_fit();
+        for (auto& [name, value] : *pairs) {
+            Cut(name);
+            Cut(value);
+        }
+    }
+}
 
 std::string Quoted(const std::string& text)
 {
@@ -51,6 +80,7 @@ std::string Line(const LoggedRequest& request)
 
 void RequestLog::Add(LoggedRequest request)
 {
+    Cut(request);
     const std::lock_guard<std::mutex> lock(m_Mutex);
     request.number = ++m_Count;
     m_Requests.push_back(std::move(request));

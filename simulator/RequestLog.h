@@ -12,7 +12,7 @@ namespace simulator {
 
 class RequestLog {
 public:
-    /// Keeps the last `most` entries.
+    /// Keeps the last `most` entries; of each, the first 4 KiB of a text and the first hundred of a list.
     explicit RequestLog(size_t most) : m_Most(most) {}
 
     /// Seconds since the start.

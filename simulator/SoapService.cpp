@@ -8,11 +8,18 @@ namespace simulator {
 namespace {
 
 const char kXmlType[] = "text/xml; charset=utf-8";
+const char kSoap12Type[] = "application/soap+xml; charset=utf-8";
 
 std::string Envelope(const std::string& header, const std::string& body, bool soap12)
 {
     return std::string("<?xml version=\"1.0\" encoding=\"utf-8\"?><soap:Envelope xmlns:soap=\"") +
            (soap12 ? kSoap12 : kSoap11) + "\">" + header + "<soap:Body>" + body + "</soap:Body></soap:Envelope>";
+}
+
+// A header with a block that no client knows; `mark`: a further attribute.
+std::string UnknownBlock(const std::string& mark)
+{
+    return "<soap:Header><x:Trace xmlns:x=\"urn:trace\"" + mark + ">1</x:Trace></soap:Header>";
 }
 
 // Damages the first enumeration text of an answer.
@@ -96,46 +103,65 @@ const ServiceRow* SoapService::Find(const std::string& path)
     return nullptr;
 }
 
-std::string SoapService::RunHandler(const CheckedRequest& checked, const Fault& fault)
+Call SoapService::CallOf(const CheckedRequest& checked, XmlWriter& xml)
 {
-    XmlWriter xml, refusal;
-    const auto into = [&](XmlWriter& writer) {
-        return Call{m_Database,     checked.arguments, writer,         checked.operation->refusal,
-                    m_PlainAddress, checked.account,   checked.device, m_LargestPage};
-    };
-    Call call = into(xml);
-    const std::lock_guard<std::recursive_mutex> lock(m_Database.Mutex());
-    if (fault.ClaimsFailure()) {
-        m_Database.Run("SAVEPOINT request");
-        checked.operation->handle(call);
-        m_Database.Run("ROLLBACK TO request");
-        m_Database.Run("RELEASE request");
-    } else {
-        checked.operation->handle(call);
-    }
-    if (!fault.Is("code") || checked.operation->bare) return xml.Text();
-    into(refusal).Refuse(fault.Number(1), "refused as asked");
-    return refusal.Text();
+    return {m_Database,      checked.arguments, xml,          checked.operation->refusal, m_PlainAddress,
+            checked.account, checked.device,    m_LargestPage};
 }
 
-HttpResponse SoapService::Respond(const CheckedRequest& checked, const Fault& fault)
+std::string SoapService::RunHandler(const CheckedRequest& checked)
 {
-    const std::string name = checked.operation->name;
-    std::string result = RunHandler(checked, fault);
-    if (fault.Is("fault11") || fault.Is("fault12")) return Refuse("Server", "the shop is closed", fault.Is("fault12"));
-    if (fault.Is("unknown-enum")) result = WithUnknownEnum(result);
+    XmlWriter xml;
+    Call call = CallOf(checked, xml);
+    checked.operation->handle(call);
+    return xml.Take();
+}
 
-    std::string body = "<" + name + "Response xmlns=\"" + kService + "\">";
-    if (!fault.Is("missing-result")) body += "<" + name + "Result>" + result + "</" + name + "Result>";
-    body += "</" + name + "Response>";
+std::string SoapService::RefuseAsAsked(const CheckedRequest& checked, int code)
+{
+    XmlWriter xml;
+    CallOf(checked, xml).Refuse(code, "refused as asked");
+    return xml.Take();
+}
+
+HttpResponse SoapService::Respond(const CheckedRequest& checked, std::string result, const Fault& fault)
+{
     std::string header;
-    if (fault.Is("must-understand") || fault.Is("extra-header")) {
-        header = std::string("<soap:Header><x:Trace xmlns:x=\"urn:trace\"") +
-                 (fault.Is("must-understand") ? " soap:mustUnderstand=\"1\"" : "") + ">1</x:Trace></soap:Header>";
+    bool hasResult = true, isSoap12 = false;
+    if (const Result* kind = fault.As<Result>()) {
+        switch (*kind) {
+            case Result::Code:
+                if (!checked.operation->bare) result = RefuseAsAsked(checked, fault.Number(1));
+                break;
+            case Result::Fault11:
+                return Refuse("Server", "the shop is closed", false);
+            case Result::Fault12:
+                return Refuse("Server", "the shop is closed", true);
+            case Result::Soap12:
+                isSoap12 = true;
+                break;
+            case Result::MissingResult:
+                hasResult = false;
+                break;
+            case Result::MustUnderstand:
+                header = UnknownBlock(" soap:mustUnderstand=\"1\"");
+                break;
+            case Result::ExtraHeader:
+                header = UnknownBlock("");
+                break;
+            case Result::UnknownEnum:
+                result = WithUnknownEnum(std::move(result));
+                break;
+        }
     }
+    const std::string name = checked.operation->name;
+    std::string body = "<" + name + "Response xmlns=\"" + kService + "\">";
+    body.reserve(body.size() + result.size() + 4 * name.size() + 64);
+    if (hasResult) body.append("<" + name + "Result>").append(result).append("</" + name + "Result>");
+    body += "</" + name + "Response>";
     HttpResponse response;
-    response.contentType = fault.Is("soap12") ? "application/soap+xml; charset=utf-8" : kXmlType;
-    response.body = Envelope(header, body, fault.Is("soap12"));
+    response.contentType = isSoap12 ? kSoap12Type : kXmlType;
+    response.body = Envelope(header, body, isSoap12);
     return Reshaped(std::move(response), fault);
 }
 
@@ -143,7 +169,7 @@ HttpResponse SoapService::Refuse(const std::string& code, const std::string& tex
 {
     HttpResponse response;
     response.status = 500;
-    response.contentType = soap12 ? "application/soap+xml; charset=utf-8" : kXmlType;
+    response.contentType = soap12 ? kSoap12Type : kXmlType;
     const std::string fault =
         soap12 ? "<soap:Fault><soap:Code><soap:Value>soap:" + std::string(code == "Client" ? "Sender" : "Receiver") +
                      "</soap:Value></soap:Code><soap:Reason><soap:Text xml:lang=\"en\">" + XmlEscape(text) +

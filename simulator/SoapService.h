@@ -24,14 +24,21 @@ public:
     {
         CheckedRequest checked;
         log.service = service.name;
+        Database::Transaction transaction(m_Database);
         log.violation = m_Check.Check(request, service, checked, log);
         const Fault fault = takeFault(log.operation);
-        return log.violation.empty() ? Respond(checked, fault) : Refuse("Client", log.violation, false);
+        if (!log.violation.empty()) return Refuse("Client", log.violation, false);
+        std::string result = RunHandler(checked);
+        if (fault.ClaimsFailure()) transaction.Undo();
+        return Respond(checked, std::move(result), fault);
     }
 
 private:
-    HttpResponse Respond(const CheckedRequest& checked, const Fault& fault);
-    std::string RunHandler(const CheckedRequest& checked, const Fault& fault);
+    HttpResponse Respond(const CheckedRequest& checked, std::string result, const Fault& fault);
+    Call CallOf(const CheckedRequest& checked, XmlWriter& xml);
+    /// The content of the result element.
+    std::string RunHandler(const CheckedRequest& checked);
+    std::string RefuseAsAsked(const CheckedRequest& checked, int code);
     static HttpResponse Refuse(const std::string& code, const std::string& text, bool soap12);
 
     Database& m_Database;

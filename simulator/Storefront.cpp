@@ -185,10 +185,11 @@ bool Simulator::Begin(std::string& error)
         if (!m_Faults.Add(fault, error)) return false;
     }
     if (!OpenFolder(error) || !OpenPorts(error)) return false;
-    m_Certificates = Certificates::Open(m_Folder, error);
-    if (!m_Certificates) return false;
+    // First of all that writes: a folder that is refused stays as it is.
     m_Database = Database::Open(m_Folder + "/storefront.db", error);
     if (!m_Database || !FillCatalogue(*m_Database, error)) return false;
+    m_Certificates = Certificates::Open(m_Folder, error);
+    if (!m_Certificates) return false;
     xmlInitParser();
     m_Soap = std::make_unique<SoapService>(*m_Database, *m_Hosts, m_Clock, m_Options);
     m_Tls = m_Certificates->Context(m_Options.certificate, m_Options.certificateDates, m_Options.oldTls);
@@ -226,12 +227,38 @@ void Simulator::Serve(Connection& connection, bool tls)
                   [&](const HttpRequest& request, const std::string&) { return ServeOne(connection, request); });
 }
 
+// What comes in the place of a handshake.
+void Spoil(Channel& channel, const Fault& fault)
+{
+    if (const Opening* kind = fault.As<Opening>()) {
+        switch (*kind) {
+            case Opening::Close:
+                return;
+            case Opening::StallHandshake:
+                // A handshake record of 74 bytes, of which the first two come.
+                channel.WriteBare(std::string("\x16\x03\x03\x00\x4a\x02\x00", 7));
+                return channel.Stall();
+        }
+    }
+    if (const Breaking* kind = fault.As<Breaking>()) {
+        switch (*kind) {
+            case Breaking::Reset:
+                return channel.Reset();
+            case Breaking::Stall:
+                return channel.Stall();
+            case Breaking::NoHttp:
+                channel.WriteBare("no handshake that anyone speaks\r\n");
+                return;
+        }
+    }
+}
+
 // False when the connection has come to its end.
 bool Simulator::Handshake(Connection& connection)
 {
     const Fault fault = m_Faults.Take("connect");
     Channel& channel = connection.channel;
-    if (!fault.kind.empty() || fault.delay) {
+    if (fault.row || fault.delay) {
         LoggedRequest log = BeginEntry(connection, m_Log);
         log.service = log.operation = "connect";
         log.tls = true;
@@ -239,14 +266,7 @@ bool Simulator::Handshake(Connection& connection)
         m_Log.Add(std::move(log));
     }
     if (!m_Server.Pause(fault.delay)) return false;
-    if (!fault.kind.empty()) {
-        // A handshake record of 74 bytes, of which the first two come.
-        if (fault.Is("stall-handshake")) channel.WriteBare(std::string("\x16\x03\x03\x00\x4a\x02\x00", 7));
-        if (fault.Is("no-http")) channel.WriteBare("no handshake that anyone speaks\r\n");
-        if (fault.Is("stall") || fault.Is("stall-handshake")) channel.Stall();
-        if (fault.Is("reset")) channel.Reset();
-        return false;
-    }
+    if (fault.row) return Spoil(channel, fault), false;
     SSL_CTX* context;
     {
         const std::lock_guard<std::mutex> lock(m_Mutex);
@@ -279,6 +299,12 @@ HttpResponse Simulator::Answer(const HttpRequest& request, const Connection& con
     const auto take = [&](const std::string& operation) { return fault = m_Faults.Take(operation); };
     const std::string path = request.Path();
     HttpResponse response;
+    log.violation = m_Hosts->Check(request, connection.channel.IsTls());
+    if (!log.violation.empty()) {
+        response.status = 400;
+        response.body = log.violation;
+        return response;
+    }
     if (connection.channel.IsTls() && AnswerContract(request, "https://" + m_Hosts->Https() + path, response)) {
         log.service = log.operation = "contract";
         return response;
@@ -291,7 +317,7 @@ HttpResponse Simulator::Answer(const HttpRequest& request, const Connection& con
     }
     const std::string plain = PlainServiceName(path);
     if (!plain.empty() && (plain == "bandwidth" || connection.channel.IsTls() == (plain == "discovery"))) {
-        return AnswerPlain(plain, request, m_Options.environment, m_Clock.Now(), take(plain), log);
+        return AnswerPlain(plain, request, *m_Database, m_Options.environment, m_Clock.Now(), take(plain), log);
     }
     log.violation = "nothing is at " + path;
     response.status = 404;

@@ -65,7 +65,8 @@ struct StorefrontOptions {
     bool gzip = true;        ///< Compress answers for clients that accept it.
     int environment = 2;     ///< What discovery answers.
     int largestPage = 0;     ///< Items that a page holds at most, whatever is asked for; 0: only the catalogue has one.
-    int remembered = 50000;  ///< Requests whose log entries, and whose nonces, are kept: the last ones.
+    int remembered = 50000;  ///< Requests whose log entries, and whose nonces, are kept: the last ones. An entry is cut
+                             ///< where it is long.
     std::vector<std::string> faults;
     /// Called with every exchange before its answer is sent, on the thread of its connection: for tests in the same
     /// process.

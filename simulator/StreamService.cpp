@@ -187,12 +187,12 @@ bool WritePurchaseList(Call& call, const std::string& from, const std::string& t
     int position = (page - 1) * perPage;
     call.Standard();
     call.xml.Group("Titles", [&] {
-        call.database.Each("SELECT " + titleColumn + ", " + passColumn + " FROM " + from + " ORDER BY " + order +
-                               " LIMIT " + std::to_string(perPage) + " OFFSET " + std::to_string(position),
-                           {}, [&](const Database::Row& row) {
-                               call.xml.Group("TitleListingPurchased",
-                                              [&] { WritePurchased(call, row.Int(0), row.Int(1), ++position); });
-                           });
+        call.database.Each(
+            "SELECT " + titleColumn + ", " + passColumn + " FROM " + from + " ORDER BY " + order + " LIMIT ? OFFSET ?",
+            {perPage, position}, [&](const Database::Row& row) {
+                call.xml.Group("TitleListingPurchased",
+                               [&] { WritePurchased(call, row.Int(0), row.Int(1), ++position); });
+            });
     });
     WritePage(call, page, perPage, call.database.Int("SELECT COUNT(*) FROM " + from));
     return true;

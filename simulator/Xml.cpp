@@ -1,42 +1,54 @@
 #include "Xml.h"
 
+#include <algorithm>
+
 namespace simulator {
+
+namespace {
+
+void AppendEscaped(std::string& xml, const std::string& text)
+{
+    for (size_t at = 0; at < text.size();) {
+        const size_t end = std::min(text.find_first_of("&<>\"", at), text.size());
+        xml.append(text, at, end - at);
+        at = end + 1;
+        if (end == text.size()) return;
+        switch (text[end]) {
+            case '&':
+                xml += "&amp;";
+                break;
+            case '<':
+                xml += "&lt;";
+                break;
+            case '>':
+                xml += "&gt;";
+                break;
+            default:
+                xml += "&quot;";
+        }
+    }
+}
+
+}  // namespace
 
 std::string XmlEscape(const std::string& text)
 {
     std::string escaped;
-    for (const char c : text) {
-        switch (c) {
-            case '&':
-                escaped += "&amp;";
-                break;
-            case '<':
-                escaped += "&lt;";
-                break;
-            case '>':
-                escaped += "&gt;";
-                break;
-            case '"':
-                escaped += "&quot;";
-                break;
-            default:
-                escaped += c;
-        }
-    }
+    AppendEscaped(escaped, text);
     return escaped;
+}
+
+XmlWriter& XmlWriter::Tag(const char* open, const char* name)
+{
+    m_Text.append(open).append(name).append(">");
+    return *this;
 }
 
 XmlWriter& XmlWriter::Element(const char* name, const std::string& text)
 {
-    return Group(name, [&] { m_Text += XmlEscape(text); });
-}
-
-XmlWriter& XmlWriter::Group(const char* name, const std::function<void()>& content)
-{
-    m_Text += std::string("<") + name + ">";
-    content();
-    m_Text += std::string("</") + name + ">";
-    return *this;
+    Tag("<", name);
+    AppendEscaped(m_Text, text);
+    return Tag("</", name);
 }
 
 XmlWriter& XmlWriter::Empty(const char* name, const std::string& attributes)

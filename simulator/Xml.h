@@ -1,7 +1,6 @@
 // Writes XML: elements of the service's namespace, which is the default one of every answer's body.
 #pragma once
 
-#include <functional>
 #include <string>
 
 namespace simulator {
@@ -11,6 +10,8 @@ std::string XmlEscape(const std::string& text);
 class XmlWriter {
 public:
     const std::string& Text() const { return m_Text; }
+    /// The writer is empty after that.
+    std::string Take() { return std::move(m_Text); }
 
     XmlWriter& Element(const char* name, const std::string& text);
     XmlWriter& Element(const char* name, const char* text) { return Element(name, std::string(text)); }
@@ -21,12 +22,20 @@ public:
     {
         return text.empty() ? *this : Element(name, text);
     }
-    XmlWriter& Group(const char* name, const std::function<void()>& content);
+    template <class Content>
+    XmlWriter& Group(const char* name, const Content& content)
+    {
+        Tag("<", name);
+        content();
+        return Tag("</", name);
+    }
     /// An element without content; `attributes` as they stand in the tag.
     XmlWriter& Empty(const char* name, const std::string& attributes);
     XmlWriter& Raw(const std::string& xml);
 
 private:
+    XmlWriter& Tag(const char* open, const char* name);
+
     std::string m_Text;
 };
 

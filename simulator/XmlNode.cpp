@@ -1,5 +1,7 @@
 #include "XmlNode.h"
 
+#include <cstring>
+
 #include "Http.h"
 
 namespace simulator {
@@ -18,6 +20,15 @@ std::string Taken(xmlChar* text)
     return owned ? Text(owned.get()) : "";
 }
 
+bool HasInstruction(xmlNodePtr first)
+{
+    for (xmlNodePtr node = first; node; node = node->next) {
+        if (node->type == XML_PI_NODE || (node->type == XML_ELEMENT_NODE && HasInstruction(node->children)))
+            return true;
+    }
+    return false;
+}
+
 }  // namespace
 
 Document ReadXml(const std::string& text, const char* encoding)
@@ -25,6 +36,11 @@ Document ReadXml(const std::string& text, const char* encoding)
     return {xmlReadMemory(text.data(), static_cast<int>(text.size()), nullptr, encoding,
                           XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING),
             xmlFreeDoc};
+}
+
+bool HasInstruction(const Document& document)
+{
+    return document && HasInstruction(document->children);
 }
 
 std::string Node::Name() const
@@ -35,6 +51,11 @@ std::string Node::Name() const
 std::string Node::Namespace() const
 {
     return m_Node && m_Node->ns ? Text(m_Node->ns->href) : "";
+}
+
+bool Node::Is(const char* space, const char* name) const
+{
+    return m_Node && m_Node->ns && strcmp(Text(m_Node->name), name) == 0 && strcmp(Text(m_Node->ns->href), space) == 0;
 }
 
 std::vector<Node> Node::Children() const
@@ -76,6 +97,27 @@ std::string Node::Attribute(const char* name, const char* space) const
 {
     const auto* n = reinterpret_cast<const xmlChar*>(name);
     return Taken(space ? xmlGetNsProp(m_Node, n, reinterpret_cast<const xmlChar*>(space)) : xmlGetNoNsProp(m_Node, n));
+}
+
+bool Node::HasAttribute(const char* name, const char* space) const
+{
+    return m_Node &&
+           xmlHasNsProp(m_Node, reinterpret_cast<const xmlChar*>(name), reinterpret_cast<const xmlChar*>(space));
+}
+
+std::string Node::AttributeOutside(const char* space) const
+{
+    for (const xmlAttr* one = m_Node ? m_Node->properties : nullptr; one; one = one->next) {
+        if (!one->ns || strcmp(Text(one->ns->href), space) != 0) return Text(one->name);
+    }
+    return "";
+}
+
+std::string Node::NamespaceOf(const std::string& prefix) const
+{
+    const auto* name = prefix.empty() ? nullptr : reinterpret_cast<const xmlChar*>(prefix.c_str());
+    const xmlNs* space = m_Node ? xmlSearchNs(m_Node->doc, m_Node, name) : nullptr;
+    return space && space->href ? Text(space->href) : "";
 }
 
 std::vector<std::pair<std::string, std::string>> Node::Attributes() const

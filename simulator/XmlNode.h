@@ -14,6 +14,9 @@ using Document = std::unique_ptr<xmlDoc, void (*)(xmlDocPtr)>;
 /// Null when the text is no XML. `encoding`: what the text is in, whatever it says itself; null: what it says.
 Document ReadXml(const std::string& text, const char* encoding = nullptr);
 
+/// Whether a processing instruction stands anywhere in it.
+bool HasInstruction(const Document& document);
+
 /// An element, or none. Copies are cheap; the document must live.
 class Node {
 public:
@@ -24,7 +27,7 @@ public:
 
     std::string Name() const;
     std::string Namespace() const;
-    bool Is(const char* space, const std::string& name) const { return Name() == name && Namespace() == space; }
+    bool Is(const char* space, const char* name) const;
 
     std::vector<Node> Children() const;
     /// The first one of the name.
@@ -36,6 +39,11 @@ public:
     bool HasText() const;
     /// `space` null: of no namespace. Empty when there is none.
     std::string Attribute(const char* name, const char* space) const;
+    bool HasAttribute(const char* name, const char* space) const;
+    /// The name of one that is not of the namespace; empty when there is none.
+    std::string AttributeOutside(const char* space) const;
+    /// The namespace that a prefix stands for here, "" being the default one; empty when it stands for none.
+    std::string NamespaceOf(const std::string& prefix) const;
     /// Names and values of those without a namespace.
     std::vector<std::pair<std::string, std::string>> Attributes() const;
 

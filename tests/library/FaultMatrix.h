@@ -65,19 +65,24 @@ inline Outcome Bandwidth(ZV_WS_Session& session, int)
     return {status, bits > 0, bits == 0};
 }
 
+// Of the catalogue's title with that number.
+inline std::string PrefixOf(int n)
+{
+    const std::string digits = std::to_string(n);
+    return "ZV" + std::string(5 - digits.size(), '0') + digits;
+}
+
 inline Outcome BoxArtFile(ZV_WS_Session& session, int n)
 {
     Owned<ZV_WS_String> file;
-    const std::string prefix = "ZV" + std::to_string(n);
-    const ZV_WS_Status status = ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, prefix.c_str(), &file);
+    const ZV_WS_Status status = ZV_WS_getBoxArtImage(&session, BOX_ART_SIZE_95, PrefixOf(n).c_str(), &file);
     return {status, file.data && std::filesystem::file_size(file.data) > 0, !file.data};
 }
 
 inline Outcome BoxArtBytes(ZV_WS_Session& session, int n)
 {
     Owned<ZV_WS_Image> image;
-    const std::string prefix = "ZV" + std::to_string(n);
-    const ZV_WS_Status status = ZV_WS_getBoxArtImageData(&session, BOX_ART_SIZE_95, prefix.c_str(), &image);
+    const ZV_WS_Status status = ZV_WS_getBoxArtImageData(&session, BOX_ART_SIZE_95, PrefixOf(n).c_str(), &image);
     return {status, image.size > 0, image.size == 0};
 }
 

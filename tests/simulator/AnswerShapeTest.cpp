@@ -240,7 +240,7 @@ TEST_F(AnswerShapeTest, HttpReadsTheSame)
 
     Order("clock=connection-close");
     RawClient client(store->HttpPort(), false);
-    ASSERT_TRUE(client.Send("GET /device/time/ HTTP/1.1\r\n\r\n"));
+    ASSERT_TRUE(client.Send(TimeRequest()));
     EXPECT_EQ("close", client.Receive().Header("Connection")) << "and the end comes without being asked for";
 }
 

@@ -25,7 +25,10 @@ protected:
     }
     Reply Secure(const std::string& path)
     {
-        return SendBytes(store->HttpsPort(), true, "GET " + path + " HTTP/1.1\r\nConnection: close\r\n\r\n");
+        const int port = store->HttpsPort();
+        return SendBytes(
+            port, true,
+            "GET " + path + " HTTP/1.1\r\nHost: localhost:" + std::to_string(port) + "\r\nConnection: close\r\n\r\n");
     }
     Reply Titles(long long offset)
     {

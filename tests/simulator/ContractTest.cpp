@@ -176,11 +176,12 @@ TEST_F(ContractTest, FaultsAreOnesOfTheContract)
 TEST_F(ContractTest, TheContractIsServedWithTheAddressInUse)
 {
     Begin();
-    const auto get = [this](const std::string& target, const char* method = "GET") {
-        return SendBytes(store->HttpsPort(), true,
-                         method + (" " + target) + " HTTP/1.1\r\nHost: localhost\r\nConnection: close\r\n\r\n");
-    };
     const std::string host = "https://localhost:" + std::to_string(store->HttpsPort());
+    const auto get = [&](const std::string& target, const char* method = "GET") {
+        return SendBytes(store->HttpsPort(), true,
+                         method + (" " + target) + " HTTP/1.1\r\nHost: " + host.substr(strlen("https://")) +
+                             "\r\nConnection: close\r\n\r\n");
+    };
     for (const std::string base : {"/api/", "/kac/api/"}) {
         for (const std::string service : {kBrowse, kAccount, kStream}) {
             for (const char* query : {"?wsdl", "?WSDL"}) {

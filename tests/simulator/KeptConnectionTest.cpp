@@ -22,7 +22,7 @@ protected:
     std::unique_ptr<Clients> Answered()
     {
         std::unique_ptr<Clients> clients(new Clients{{store->HttpsPort(), true}, {store->HttpPort(), false}});
-        EXPECT_TRUE(clients->tls.Send(Request()) && clients->plain.Send("GET /device/time/ HTTP/1.1\r\n\r\n"));
+        EXPECT_TRUE(clients->tls.Send(Request()) && clients->plain.Send(TimeRequest()));
         EXPECT_EQ(200, clients->tls.ReceiveOne().status);
         EXPECT_EQ(200, clients->plain.ReceiveOne().status);
         EXPECT_TRUE(store->WaitForIdle(2));
@@ -43,7 +43,7 @@ TEST_F(KeptConnectionTest, BytesComeUnasked)
     EXPECT_EQ(200, clients->tls.ReceiveOne().status) << "the connection still works";
 
     Order("clock=stray");
-    ASSERT_TRUE(clients->plain.Send("GET /device/time/ HTTP/1.1\r\n\r\n"));
+    ASSERT_TRUE(clients->plain.Send(TimeRequest()));
     EXPECT_EQ(200, clients->plain.ReceiveOne().status);
     EXPECT_EQ(408, clients->plain.ReceiveOne().status);
 }
@@ -64,7 +64,7 @@ TEST_F(KeptConnectionTest, SilenceIsForEver)
     const auto clients = Answered();
     EXPECT_EQ("2\n", Plain("/control/idle", "", "POST", "silence").body);
     EXPECT_EQ(0u, store->ActOnIdle(IdleAction::Write));
-    ASSERT_TRUE(clients->tls.Send(Request()) && clients->plain.Send("GET /device/time/ HTTP/1.1\r\n\r\n"));
+    ASSERT_TRUE(clients->tls.Send(Request()) && clients->plain.Send(TimeRequest()));
     store->ClearLog();
     const auto others = Answered();
     EXPECT_EQ(2u, store->Log().size());
@@ -87,14 +87,14 @@ TEST_F(KeptConnectionTest, OnlyWhatWaitsIsReached)
 {
     Order("clock=hold");
     RawClient fresh(store->HttpPort(), false), held(store->HttpPort(), false);
-    ASSERT_TRUE(held.Send("GET /device/time/ HTTP/1.1\r\n\r\n"));
+    ASSERT_TRUE(held.Send(TimeRequest()));
     ASSERT_TRUE(store->WaitForRequests(1));
     EXPECT_EQ(0u, store->ActOnIdle(IdleAction::Close));
     store->ClearFaults();
     EXPECT_EQ(200, held.ReceiveOne().status);
     ASSERT_TRUE(store->WaitForIdle(1));
     EXPECT_EQ(1u, store->ActOnIdle(IdleAction::Close));
-    ASSERT_TRUE(fresh.Send("GET /device/time/ HTTP/1.1\r\n\r\n"));
+    ASSERT_TRUE(fresh.Send(TimeRequest()));
     EXPECT_EQ(200, fresh.ReceiveOne().status);
     EXPECT_EQ(400, Plain("/control/idle", "", "POST", "shout").status);
 }

@@ -251,13 +251,16 @@ protected:
     {
         return Send({service, operation, children});
     }
+    /// The header line that the plain port wants.
+    std::string PlainHost() const { return "Host: localhost:" + std::to_string(store->HttpPort()) + "\r\n"; }
+    /// A request for the time that keeps its connection.
+    std::string TimeRequest() const { return "GET /device/time/ HTTP/1.1\r\n" + PlainHost() + "\r\n"; }
     Reply Plain(const std::string& path, const std::string& headers = "", const std::string& method = "GET",
                 const std::string& body = "")
     {
         return SendBytes(store->HttpPort(), false,
-                         method + " " + path + " HTTP/1.1\r\n" + headers +
-                             "Host: localhost\r\nConnection: close\r\nContent-Length: " + std::to_string(body.size()) +
-                             "\r\n\r\n" + body);
+                         method + " " + path + " HTTP/1.1\r\n" + headers + PlainHost() +
+                             "Connection: close\r\nContent-Length: " + std::to_string(body.size()) + "\r\n\r\n" + body);
     }
     LoggedRequest LastLogged() { return store->Log().back(); }
 

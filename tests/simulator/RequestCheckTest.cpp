@@ -12,6 +12,8 @@ void Replace(std::string& text, const std::string& from, const std::string& to)
     text.replace(place, from.size(), to);
 }
 
+#define INSTANCE "xmlns:i=\"http://www.w3.org/2001/XMLSchema-instance\""
+
 class RequestCheckTest : public StorefrontTest {
 protected:
     void SetUp() override { Begin(); }
@@ -66,7 +68,7 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
         {"<s:UsernameToken", "<u:Timestamp><u:Expires>2010-01-01T00:00:00Z</u:Expires></u:Timestamp><s:UsernameToken",
          "the message has expired"},
         {"<s:UsernameToken", "<u:Timestamp><u:Created>2100-01-01T00:00:00Z</u:Created></u:Timestamp><s:UsernameToken",
-         "later than now"},
+         "the message is not fresh"},
         {"<s:UsernameToken", "<u:Timestamp><u:Created>today</u:Created></u:Timestamp><s:UsernameToken", "no time"},
         {"<s:UsernameToken", "<u:Timestamp/><u:Timestamp/><s:UsernameToken", "user-name token"},
         {"#PasswordDigest", "#PasswordText", "no digest"},
@@ -93,6 +95,42 @@ TEST_F(RequestCheckTest, EachDepartureIsRefusedByName)
          "<z:CurrentPageNumber>1</z:CurrentPageNumber><z:GenreID>1</z:GenreID>", "GenreID is missing or out of order"},
         {"<z:GenreID>1</z:GenreID>", "text<z:GenreID>1</z:GenreID>", "text beside"},
         {"<e:Body>", "<e:Body><z:getNavigation/>", "no single element"},
+        // The envelope's own elements.
+        {"<e:Header>", "<e:Body/><e:Header>", "part 1 of the envelope must be Header"},
+        {"<e:Header>", "<e:Header/><e:Header>", "part 2 of the envelope must be Body"},
+        {"<e:Header>", "<z:Extra/><e:Header>", "part 1 of the envelope must be Header"},
+        {"</e:Body>", "</e:Body><e:Body/>", "the envelope holds Body behind its body"},
+        {"</e:Body>", "</e:Body><z:Extra/>", "the envelope holds Extra behind its body"},
+        {"<e:Header>", "text<e:Header>", "Envelope holds text"},
+        {"<e:Header>", "<e:Header>text", "Header holds text"},
+        {"<e:Body>", "<e:Body>text", "Body holds text"},
+        {"<e:Envelope", "<e:Envelope e:encodingStyle=\"\"", "attribute encodingStyle of the SOAP Envelope"},
+        {"<e:Header>", "<e:Header u:Id=\"h\">", "attribute Id of the SOAP Header"},
+        {"<e:Body>", "<e:Body id=\"b\">", "attribute id of the SOAP Body"},
+        {"<e:Body>", "<e:Body " INSTANCE " i:type=\"z:Body\">", "xsi:type of Body is wrong"},
+        {"<e:Header>", "<e:Header><?go on?>", "processing instruction"},
+        // The blocks.
+        {"<a:To e:mustUnderstand=\"true\"", "<a:To e:mustUnderstand=\"yes\"", "mustUnderstand of To"},
+        {"<a:MessageID>", "<a:MessageID e:mustUnderstand=\"no\">", "mustUnderstand of MessageID"},
+        {"<a:To ", "<a:To e:actor=\"urn:other\" ", "header block To is for another actor"},
+        {"<s:UsernameToken", "text<s:UsernameToken", "Security holds text"},
+        {"</s:Username>", "</s:Username>text", "UsernameToken holds text"},
+        {"<s:Username>", "<s:Username><z:x/>", "Username has children"},
+        {"<a:MessageID>", "<a:MessageID><z:x/>", "MessageID has children"},
+        {"<a:Address>", "text<a:Address>", "ReplyTo holds text"},
+        {"</a:Address>", "</a:Address><a:ReferenceProperties/>", "ReplyTo is not the anonymous role alone"},
+        {"<z:APIKey>", "text<z:APIKey>", "DeviceSettings holds text"},
+        {"<z:APIKey>", "<z:APIKey><z:x/>", "APIKey has children"},
+        // What an element says of its own type.
+        {"<z:GenreID>", "<z:GenreID " INSTANCE " i:type=\"x\">", "xsi:type of GenreID"},
+        {"<z:GenreID>", "<z:GenreID " INSTANCE " i:type=\"z:int\">", "xsi:type of GenreID"},
+        {"<z:GenreID>", "<z:GenreID " INSTANCE " xmlns=\"http://www.w3.org/2001/XMLSchema\" i:type=\"string\">",
+         "xsi:type of GenreID"},
+        {"<z:PurchaseType>", "<z:PurchaseType " INSTANCE " i:type=\"z:TitleTypeFilter\">", "xsi:type of PurchaseType"},
+        {"<z:DestinationTypeID>", "<z:DestinationTypeID " INSTANCE " i:type=\"z:int\">",
+         "xsi:type of DestinationTypeID"},
+        {"<a:MessageID>", "<a:MessageID " INSTANCE " i:type=\"s:AttributedURI\">", "xsi:type of MessageID"},
+        {"<z:GenreID>", "<z:GenreID " INSTANCE " i:nil=\"true\">", "GenreID cannot be nil"},
     };
     const int port = store->HttpsPort();
     for (const auto& row : rows) {
@@ -119,7 +157,6 @@ TEST_F(RequestCheckTest, EverySpellingOfTheStandardsIsTaken)
 {
     const std::pair<const char*, const char*> rows[] = {
         {"POST /", "\r\nPOST /"},
-        {"POST /", "POST https://localhost/"},
         {"Host: ", "HOST:\t"},
         {"text/xml; charset=utf-8", "Text/XML;charset=UTF-8"},
         {"text/xml; charset=utf-8", "text/xml ; action=x ; charset=\"utf-8\" \t"},
@@ -134,15 +171,22 @@ TEST_F(RequestCheckTest, EverySpellingOfTheStandardsIsTaken)
         {"/role/anonymous<", "/role/anonymous\n<"},
         {"<s:UsernameToken", "<u:Timestamp u:Id=\"t\"/><s:UsernameToken"},
         {"</s:UsernameToken>",
-         "</s:UsernameToken><u:Timestamp><u:Created>2020-02-29T24:00:00.5-09:30</u:Created>"
-         "<u:Expires> 2100-01-01T00:00:00Z </u:Expires></u:Timestamp>"},
+         "</s:UsernameToken><u:Timestamp><u:Expires> 2104-02-29T24:00:00.5-09:30 </u:Expires><z:x/></u:Timestamp>"},
+        {"<e:Envelope", "<e:Envelope " INSTANCE " i:schemaLocation=\"urn:x x.xsd\""},
+        {"<a:To ", "<a:To e:actor=\"http://schemas.xmlsoap.org/soap/actor/next\" u:Id=\"to\" "},
+        {"<a:MessageID>", "<a:MessageID " INSTANCE " i:type=\"a:AttributedURI\">"},
+        {"<s:Username>", "<s:Username " INSTANCE " i:type=' s:AttributedString '>"},
+        {"<z:GenreID>", "<z:GenreID " INSTANCE " xmlns:d=\"http://www.w3.org/2001/XMLSchema\" i:type=\"d:int\">"},
+        {"<z:PurchaseType>",
+         "<z:PurchaseType " INSTANCE " xmlns=\"http://api.zorvane.example/api/\" i:type=\"StreamAPIPurchaseType\">"},
+        {"<z:getTitlesByNavigation>", "<z:getTitlesByNavigation " INSTANCE " i:type=\"z:getTitlesByNavigation\">"},
         {"</s:Password>", "\n</s:Password>"},
         {"<u:Created>", "<u:Created>\n\t"},
         {"<z:DestinationTypeID>48<", "<z:DestinationTypeID> +48 <"},
         {"<z:GenreID>1<", "<z:GenreID>\n\t&#x31; <"},
         {"<z:GenreID>1<", "<z:GenreID><![CDATA[1]]><"},
         {"<z:GenreID>1</z:GenreID>", "<q:GenreID xmlns:q='http://api.zorvane.example/api/'>1</q:GenreID>"},
-        {"<z:GenreID>", "<!-- genre --><z:GenreID xmlns:i=\"http://www.w3.org/2001/XMLSchema-instance\" i:type='x'>"},
+        {"<z:GenreID>", "<!-- genre --><z:GenreID>"},
     };
     const int port = store->HttpsPort();
     for (const auto& [from, to] : rows) {
@@ -156,6 +200,78 @@ TEST_F(RequestCheckTest, EverySpellingOfTheStandardsIsTaken)
         EXPECT_EQ("", LastLogged().violation);
         EXPECT_EQ("getTitlesByNavigation", LastLogged().operation);
     }
+}
+
+// The message's own time, beside the token's: by the simulator's clock, five minutes either way.
+TEST_F(RequestCheckTest, AMessageIsFreshByTheSimulatorsClock)
+{
+    constexpr long long kAhead = 86400;
+    store->SetClock(kAhead);
+    for (const auto& [offset, violation] : {std::pair<long long, const char*>(0, ""),
+                                            {290, ""},
+                                            {-290, ""},
+                                            {310, "the message is not fresh"},
+                                            {-310, "the message is not fresh"}}) {
+        const time_t when = time(nullptr) + kAhead + offset;
+        tm parts = {};
+        char created[64];
+        strftime(created, sizeof created, "<u:Created>%Y-%m-%dT%H:%M:%SZ</u:Created>", gmtime_r(&when, &parts));
+        SoapRequest request = Titles();
+        request.created_offset = kAhead;
+        std::string envelope = request.Envelope(store->HttpsPort());
+        Replace(envelope, "<s:UsernameToken",
+                "<u:Timestamp>" + std::string(created) + "</u:Timestamp><s:UsernameToken");
+        SendText(request.Head(store->HttpsPort(), envelope.size()) + envelope);
+        EXPECT_EQ(violation, LastLogged().violation) << offset;
+    }
+}
+
+// One Host, and one of the simulator's own with the right port; what is not for it is no service's to answer.
+TEST_F(RequestCheckTest, ARequestSaysWhichHostItIsFor)
+{
+    const std::string https = std::to_string(store->HttpsPort()), http = std::to_string(store->HttpPort());
+    const struct {
+        std::string first;  // of the request: method and target
+        std::string headers;
+        std::string violation;
+    } rows[] = {
+        {"GET /", "Host: LocalHost:" + http + "\r\n", ""},
+        {"GET /", "Host: 127.0.0.1:" + http + "\r\n", ""},
+        {"GET /", "Host: images.zorvane.example\r\n", ""},
+        {"GET /", "Host: www.zorvane.example:80\r\n", ""},
+        {"GET http://localhost:" + http + "/", "Host: elsewhere\r\n", ""},
+        {"GET /", "", "no Host"},
+        {"GET /", "Host: localhost:" + http + "\r\nHost: localhost:" + http + "\r\n", "more than one Host"},
+        {"GET /", "Host: localhost\r\n", "Host localhost is not"},
+        {"GET /", "Host: localhost:" + https + "\r\n", "Host localhost:" + https + " is not"},
+        {"GET /", "Host: api.zorvane.example\r\n", "Host api.zorvane.example is not"},
+        {"GET /", "Host: \r\n", "Host  is not"},
+        {"GET http://elsewhere/", "Host: localhost:" + http + "\r\n", "Host elsewhere is not"},
+        {"GET https://localhost:" + http + "/", "Host: localhost:" + http + "\r\n", "https://localhost:"},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.first + " " + row.headers);
+        const Reply reply =
+            SendBytes(store->HttpPort(), false,
+                      row.first + "device/time/ HTTP/1.1\r\n" + row.headers + "Connection: close\r\n\r\n");
+        EXPECT_EQ(row.violation.empty() ? 200 : 400, reply.status);
+        EXPECT_EQ(0u, LastLogged().violation.find(row.violation)) << LastLogged().violation;
+        EXPECT_EQ(row.violation.empty(), LastLogged().violation.empty());
+    }
+    for (const auto& [host, status] : {std::pair<std::string, int>("api.zorvane.example", 200),
+                                       {"localhost:" + https, 200},
+                                       {"images.zorvane.example:443", 400},
+                                       {"localhost:" + http, 400},
+                                       {"localhost", 400}}) {
+        const SoapRequest request = Titles();
+        const std::string envelope = request.Envelope(store->HttpsPort());
+        std::string head = request.Head(store->HttpsPort(), envelope.size());
+        Replace(head, "Host: localhost:" + https, "Host: " + host);
+        EXPECT_EQ(status, SendText(head + envelope).status) << host;
+    }
+    std::string absolute = Titles().Text(store->HttpsPort());
+    Replace(absolute, "POST /", "POST https://localhost:" + https + "/");
+    EXPECT_EQ(200, SendText(absolute).status);
 }
 
 TEST_F(RequestCheckTest, EveryTimeWithAZoneIsTaken)
@@ -226,7 +342,7 @@ TEST_F(RequestCheckTest, ConnectionsEndWhenTheRequestSaysSo)
                 {"GET /device/time/ HTTP/1.0\r\nConnection: Keep-Alive\r\n", false}};
     for (const auto& row : rows) {
         RawClient client(store->HttpPort(), false);
-        ASSERT_TRUE(client.Send(std::string(row.request) + "\r\n"));
+        ASSERT_TRUE(client.Send(row.request + PlainHost() + "\r\n"));
         EXPECT_EQ(row.ends ? "close" : "keep-alive", client.ReceiveOne().Header("Connection")) << row.request;
         if (row.ends) {
             EXPECT_EQ("", client.Receive().head) << row.request;
@@ -316,6 +432,28 @@ TEST_F(RequestCheckTest, OnlyTheLastRequestsAreRemembered)
     ask("e");
     EXPECT_TRUE(store->WaitForRequests(1));
     EXPECT_EQ(8u, store->Log().at(0).number);
+}
+
+// However much a client sends: an entry stays small, and is cut between two letters.
+TEST_F(RequestCheckTest, WhatIsRememberedOfARequestIsBounded)
+{
+    std::string children = "<z:Query>";
+    for (int i = 0; i < 40000; ++i)
+        children += "\u00e9\u6771";
+    children += "</z:Query>";
+    for (int i = 0; i < 1000; ++i)
+        children += "<z:Extra/>";
+    Send({"RealTimeBrowse", "searchForTitle", children});
+    const LoggedRequest entry = LastLogged();
+    EXPECT_EQ(100u, entry.children.size());
+    const std::string query = Value(entry.children, "Query");
+    EXPECT_EQ(4095u, query.size());
+    EXPECT_EQ("\u6771", query.substr(query.size() - 3));
+    SoapRequest request = Titles();
+    request.nonce = std::string(400000, 'n');
+    EXPECT_EQ(200, Send(request).status);
+    EXPECT_EQ(500, Send(request).status);
+    EXPECT_EQ("the nonce was used before", LastLogged().violation);
 }
 
 TEST_F(RequestCheckTest, OptionalChildrenMayBeLeftOutAndStagingHasAPathOfItsOwn)

@@ -3,6 +3,9 @@
 
 #include <chrono>
 #include <filesystem>
+#include <fstream>
+#include <functional>
+#include <map>
 
 #include "Database.h"
 #include "Process.h"
@@ -23,12 +26,21 @@ TEST_F(ServerTest, WhatIsNotThereIsSaid)
     Order("boxart=modified");
     EXPECT_EQ(200, Plain(image, known).status);
     EXPECT_NE(first.body, Plain("/images/boxart/135s/ZV00013135.jpg").body);
-    for (const char* path :
-         {"/images/boxart/135/ZV00012135.jpg", "/images/boxart/135s/ZV00012136.jpg", "/images/boxart/96/ZV0001296.jpg",
-          "/images/boxart/95/95.jpg", "/images/boxart/95", "/device/env/?d=x&dt=48", "/elsewhere"}) {
-        EXPECT_EQ(404, Plain(path).status) << path;
+    const std::pair<const char*, const char*> rows[] = {
+        {"/images/boxart/135/ZV00012135.jpg", "box art has no size 135"},
+        {"/images/boxart/96/ZV0001296.jpg", "box art has no size 96"},
+        {"/images/boxart/", "box art has no size "},
+        {"/images/boxart/135s/ZV00012136.jpg", "box art of that size ends with 135.jpg"},
+        {"/images/boxart/95/95.jpg", "box art of that size ends with 95.jpg"},
+        {"/images/boxart/95", "box art of that size ends with 95.jpg"},
+        {"/images/boxart/95/ZV9999995.jpg", "no title has box art ZV99999"},
+        {"/images/boxart/95/zv0001295.jpg", "no title has box art zv00012"},
+        {"/device/env/?d=x&dt=48", "nothing is at /device/env/"},
+        {"/elsewhere", "nothing is at /elsewhere"}};
+    for (const auto& [path, violation] : rows) {
+        EXPECT_EQ(404, Plain(path, known).status) << path;
+        EXPECT_EQ(violation, LastLogged().violation) << path;
     }
-    EXPECT_EQ("nothing is at /elsewhere", LastLogged().violation);
 }
 
 // The end comes at once in whatever state connections are.
@@ -73,6 +85,92 @@ TEST_F(ServerTest, WhatChangedIsThereAfterARestart)
     store.reset();
 }
 
+class DataFolderTest : public ServerTest {
+protected:
+    DataFolderTest() { options.dataFolder = folder / "data"; }
+    // On the folder's database, while no simulator has it.
+    void Run(const char* statement)
+    {
+        std::string error;
+        EXPECT_LE(0, simulator::Database::Open(options.dataFolder + "/storefront.db", error)->Run(statement)) << error;
+    }
+    std::map<std::string, std::string> Files() const
+    {
+        std::map<std::string, std::string> files;
+        for (const auto& entry : std::filesystem::directory_iterator(options.dataFolder)) {
+            std::ifstream file(entry.path(), std::ios::binary);
+            files[entry.path().filename()].assign(std::istreambuf_iterator<char>(file), {});
+        }
+        return files;
+    }
+
+    const TempFolder folder;
+    StorefrontOptions options;
+};
+
+TEST_F(DataFolderTest, OfTheVersionBeforeIsBroughtUpToDate)
+{
+    Begin(options);
+    EXPECT_EQ("0", Ask("StreamAPI", "addItemToWishlist", Children({{"TitleID", "21"}})).Element("ResponseCode"));
+    const auto schema = [this] { return store->Rows("SELECT name, sql FROM sqlite_master ORDER BY name"); };
+    const auto made = schema();
+    const std::string version = store->Query("PRAGMA user_version");
+    store.reset();
+    Run("DROP INDEX title_prefix");
+    Run("DROP INDEX product_title_type");
+    Run("CREATE INDEX product_title ON product (title)");
+    Run("PRAGMA user_version = 2");
+    Begin(options);
+    EXPECT_EQ(made, schema());
+    EXPECT_EQ(version, store->Query("PRAGMA user_version"));
+    EXPECT_EQ("1", store->Query("SELECT COUNT(*) FROM wish WHERE title = 21"));
+    store.reset();
+}
+
+TEST_F(DataFolderTest, OfAnotherVersionIsRefusedAndStaysAsItIs)
+{
+    std::filesystem::create_directory(options.dataFolder);
+    Run("CREATE TABLE account (user TEXT)");
+    const std::pair<const char*, const char*> rows[] = {
+        {"PRAGMA user_version = 1", "storefront.db: has tables of version 1, which cannot be brought to 3: remove it"},
+        {"PRAGMA user_version = 4",
+         "storefront.db: has tables of version 4, and this simulator knows 3: run the newer"}};
+    for (const auto& [statement, reason] : rows) {
+        Run(statement);
+        const auto before = Files();
+        EXPECT_EQ(1u, before.size());
+        std::string error;
+        EXPECT_FALSE(Storefront::Start(options, error));
+        EXPECT_NE(std::string::npos, error.find(reason)) << error;
+        EXPECT_EQ(std::string::npos, error.find('\n'));
+        EXPECT_TRUE(before == Files());
+    }
+}
+
+// Statements are kept, and are no other's when they are used inside of themselves.
+TEST(DatabaseTest, AStatementMayBeUsedInsideOfItself)
+{
+    std::string error;
+    const auto database = simulator::Database::Open(":memory:", error);
+    database->Run("CREATE TABLE number (value INTEGER)");
+    for (const int value : {1, 2, 3})
+        database->Run("INSERT INTO number VALUES (?)", {value});
+    std::function<std::string(int)> below = [&](int most) {
+        std::string text;
+        database->Each("SELECT value FROM number WHERE value < ? ORDER BY value", {most},
+                       [&](const simulator::Database::Row& row) { text += row.Text(0) + below(row.Int(0)); });
+        return text;
+    };
+    for (int i = 0; i < 2; ++i)
+        EXPECT_EQ("1213121", below(4));
+    {
+        simulator::Database::Transaction transaction(*database);
+        database->Run("DELETE FROM number");
+        transaction.Undo();
+    }
+    EXPECT_EQ("1213121", below(4));
+}
+
 TEST(ProgramTest, SaysWhereItServesAndEndsOnATermSignal)
 {
     Process program({STOREFRONT_PROGRAM}, {});
@@ -89,12 +187,7 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
     Begin();
     const std::string taken = std::to_string(store->HttpPort());
     const TempFolder old;
-    const auto tables = [&] {
-        std::string error;
-        return simulator::Database::Open(old / "storefront.db", error);
-    };
-    tables()->Run("CREATE TABLE account (user TEXT)");
-    tables()->Run("PRAGMA user_version = 1");
+    std::ofstream(old / "storefront.db") << "no database";
     const struct {
         Lines arguments;
         int code;
@@ -112,15 +205,13 @@ TEST_F(ServerTest, TheProgramRefusesWithOneLineAndItsOwnCode)
                 {{"--http-port", taken}, 1, "port " + taken},
                 {{"--proxy-port", taken}, 1, "port " + taken},
                 {{"--data", "/proc/storefront"}, 1, "/proc/storefront"},
-                {{"--data", old / ""}, 1, "storefront.db: has tables of version 1"}};
+                {{"--data", old / ""}, 1, "storefront.db: cannot open the database"}};
     for (const auto& row : rows) {
         Process program(Lines{STOREFRONT_PROGRAM} + row.arguments, {});
         EXPECT_EQ(row.code, WEXITSTATUS(program.WaitForEnd())) << row.text;
         ASSERT_EQ(1u, program.Errors().size()) << row.text;
         EXPECT_NE(std::string::npos, program.Errors()[0].find(row.text)) << program.Errors()[0];
     }
-    EXPECT_EQ("account 1", tables()->Text("SELECT name || ' ' || user_version FROM sqlite_master, pragma_user_version"))
-        << "nothing is lost";
 }
 
 }  // namespace

@@ -17,19 +17,26 @@ std::string SourceText(const std::string& path)
     return ContentOf(SourceFile(path));
 }
 
+std::string BlockOf(const std::string& document, const std::string& name)
+{
+    const std::string text = SourceText(document), begin = "<!-- " + name + " -->\n";
+    const size_t start = text.find(begin);
+    EXPECT_NE(std::string::npos, start) << name;
+    const size_t content = start + begin.size();
+    return start == std::string::npos ? "" : text.substr(content, text.find("<!-- end -->", content) - content);
+}
+
 void ExpectBlock(const std::string& document, const std::string& name, const std::string& content)
 {
-    std::string text = SourceText(document);
-    const std::string begin = "<!-- " + name + " -->\n", end = "<!-- end -->";
-    size_t start = text.find(begin);
-    ASSERT_NE(std::string::npos, start) << name;
-    start += begin.size();
-    const size_t size = text.find(end, start) - start;
-    if (getenv("ZV_WRITE_DOCUMENTS")) {
-        std::ofstream(SourceFile(document), std::ios::binary) << text.replace(start, size, content);
-    } else {
-        EXPECT_EQ(content, text.substr(start, size)) << "ZV_WRITE_DOCUMENTS=1 brings it up to date";
+    const std::string before = BlockOf(document, name);
+    if (!getenv("ZV_WRITE_DOCUMENTS")) {
+        EXPECT_EQ(content, before) << "ZV_WRITE_DOCUMENTS=1 brings it up to date";
+        return;
     }
+    std::string text = SourceText(document);
+    const std::string begin = "<!-- " + name + " -->\n";
+    text.replace(text.find(begin) + begin.size(), before.size(), content);
+    std::ofstream(SourceFile(document), std::ios::binary) << text;
 }
 
 std::string Row(std::initializer_list<std::string> cells)

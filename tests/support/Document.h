@@ -9,6 +9,8 @@
 std::string SourceFile(const std::string& path);
 std::string SourceText(const std::string& path);
 
+/// What the block of that name in the document is.
+std::string BlockOf(const std::string& document, const std::string& name);
 /// Expects the block of that name in the document to be `content`.
 void ExpectBlock(const std::string& document, const std::string& name, const std::string& content);
 
