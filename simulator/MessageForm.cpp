@@ -27,13 +27,13 @@ const struct HeaderElement {
 };
 
 // The content of an element, and the type that it may say that it has.
-struct Content {
+struct Expected {
     std::string space;
     std::string type;
     bool isText;
 };
 
-std::string CheckElement(const Node& element, const Content& content)
+std::string CheckElement(const Node& element, const Expected& expected)
 {
     const std::string name = element.Name();
     if (element.HasAttribute("nil", kSchemaInstance)) return name + " cannot be nil";
@@ -41,12 +41,12 @@ std::string CheckElement(const Node& element, const Content& content)
         const std::string type = Trimmed(element.Attribute("type", kSchemaInstance));
         const size_t colon = type.find(':');
         const std::string prefix = colon == std::string::npos ? "" : type.substr(0, colon);
-        if (content.type.empty() || type.substr(colon + 1) != content.type ||
-            element.NamespaceOf(prefix) != content.space) {
+        if (expected.type.empty() || type.substr(colon + 1) != expected.type ||
+            element.NamespaceOf(prefix) != expected.space) {
             return "xsi:type of " + name + " is wrong";
         }
     }
-    if (content.isText) return element.Children().empty() ? "" : name + " has children";
+    if (expected.isText) return element.Children().empty() ? "" : name + " has children";
     return element.HasText() ? name + " holds text beside its children" : "";
 }
 
