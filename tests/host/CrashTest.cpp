@@ -28,7 +28,7 @@
 namespace {
 
 // The allocator of the C library ends the process in an order of its own; a sanitizer's does in another.
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+#ifdef ZV_SANITIZED
 constexpr bool kHasPlainHeap = false;
 #else
 constexpr bool kHasPlainHeap = true;

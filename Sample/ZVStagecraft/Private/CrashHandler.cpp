@@ -11,6 +11,8 @@
 #include <ucontext.h>
 #include <unistd.h>
 
+#include <new>
+
 #include "CrashConsole.h"
 #include "SignalStack.h"
 #include "ZV_LogImpl.h"
@@ -238,8 +240,8 @@ void sighandler(int signal, siginfo_t* info, void* context)
 
 void zv_dbg_init()
 {
-    static SignalStack& stack = *new SignalStack;  // main thread's, to its end
-    static_cast<void>(stack);
+    alignas(SignalStack) static char s_stack[sizeof(SignalStack)];
+    new (s_stack) SignalStack;  // main thread's, and never destructed: to its end
     void* frame;
     backtrace(&frame, 1);  // its first call loads a library, which a handler had better not
     struct sigaction action = {};
