@@ -7,8 +7,20 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "Clang")
     target_compile_options(zv_compile INTERFACE -Wthread-safety -Werror=thread-safety)
 endif()
 
-# __FILE__ reads relative to the repository root ("./Private/CacheMgr.cpp"), in assertions too.
-add_compile_options(-ffile-prefix-map=${PROJECT_SOURCE_DIR}/=./)
+# The rooms of the client's two halves, each importing only from those before it.
+set(ZV_PRIVATE_ROOMS foundation transport records services cache settings calls)
+set(ZV_SAMPLE_ROOMS glue bridge host)
+
+# __FILE__ reads relative to the repository root, without the room ("./Private/CacheMgr.cpp"), in assertions too. The last
+# map that fits counts. Debuggers see where files are.
+add_compile_options(-fdebug-prefix-map=${PROJECT_SOURCE_DIR}/=./ -fmacro-prefix-map=${PROJECT_SOURCE_DIR}/=./)
+foreach(room ${ZV_PRIVATE_ROOMS})
+    add_compile_options(-fmacro-prefix-map=${PROJECT_SOURCE_DIR}/Private/${room}/=./Private/)
+endforeach()
+set(sample Sample/ZVStagecraft/Private)
+foreach(room ${ZV_SAMPLE_ROOMS})
+    add_compile_options(-fmacro-prefix-map=${PROJECT_SOURCE_DIR}/${sample}/${room}/=./${sample}/)
+endforeach()
 
 if(ZV_SANITIZE)
     add_compile_options(-fsanitize=${ZV_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)

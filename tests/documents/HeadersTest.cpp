@@ -78,7 +78,7 @@ TEST_F(Headers, SayWhichServiceIsAsked)
 TEST_F(Headers, SayWhatIsSentOnce)
 {
     std::map<std::string, bool> once;
-    const std::string operations = SourceText("Private/Operations.h");
+    const std::string operations = SourceText("Private/services/Operations.h");
     const std::regex row("ZV_OPERATION\\(m_\\w+, +(\\w+), +(true|false)\\)");
     for (std::sregex_iterator at(operations.begin(), operations.end(), row), end; at != end; ++at)
         once[at->str(1)] = at->str(2) == "true";

@@ -6,6 +6,7 @@
 
 #include "Document.h"
 #include "PublicHeaders.h"
+#include "Status.h"
 #include "ZVUtilities.h"
 
 namespace {
@@ -31,13 +32,14 @@ std::set<std::string> RefusalsOf(const std::string& call)
     return refusals;
 }
 
-// The library's sources, without the codes of calls that it does not have.
+// The library's sources, without the codes of calls that it does not have and the texts, which name all.
 std::string LibrarySources()
 {
     std::string text;
-    for (const auto& entry : std::filesystem::directory_iterator(SourceFile("Private"))) {
+    for (const auto& entry : std::filesystem::recursive_directory_iterator(SourceFile("Private"))) {
         const std::string name = entry.path().filename().string();
-        if (entry.path().extension() == ".cpp") text += SourceText("Private/" + name);
+        if (entry.path().extension() != ".cpp" || name == "StatusText.cpp") continue;
+        text += SourceText(std::filesystem::relative(entry.path(), SourceFile("")).string());
     }
     const size_t begin = text.find("kResponseCodes[] = {"), end = text.find("};\n", begin);
     EXPECT_NE(std::string::npos, begin);

@@ -157,7 +157,7 @@ TEST(FileTest, ATemporaryFileIsWrittenWhateverItsNameBecomes)
 
 TEST(FileDeathTest, NullsAndPatternsWithoutWildcardStop)
 {
-    EXPECT_DEATH(ZVFile().Open(nullptr, "r"), "Private/ZVFile.cpp.*\"filename != 0\"");
+    EXPECT_DEATH(ZVFile().Open(nullptr, "r"), "\\./Private/ZVFile.cpp.*\"filename != 0\"");
     EXPECT_DEATH(ZVFile::RemoveWithWildcard("/none/x"), "strchr\\(filename, '\\?'\\) != 0");
 }
 

@@ -101,7 +101,7 @@ TEST(ThreadDeathTest, StartsOnce)
     std::atomic<int> count{0};
     ZVThread* thread = ZVThread::CreateThread();
     ASSERT_TRUE(thread->Run("count", Count, &count));
-    EXPECT_DEATH(thread->Run("count", Count, &count), "Private/ZVThread.*\"m_Impl->m_Thread == 0\"");
+    EXPECT_DEATH(thread->Run("count", Count, &count), "\\./Private/ZVThread.cpp.*\"m_Impl->m_Thread == 0\"");
     ZVThread::SafeDestroyThread(thread);
 }
 

@@ -3,6 +3,7 @@
 
 #include "MemoryFile.h"
 #include "Target.h"
+#include "Url.h"
 
 void TestInput(std::string_view input)
 {

@@ -8,6 +8,7 @@
 #include <thread>
 
 #include "BoxArtDownloader.h"
+#include "Discovery.h"
 #include "MemoryFile.h"
 #include "Peer.h"
 #include "Target.h"

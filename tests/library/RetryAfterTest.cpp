@@ -1,5 +1,5 @@
 // What a session hears of its services: whether they answered at all, and how long they want to be left alone.
-#include "RetryAfter.h"
+#include "ServiceTrouble.h"
 
 #include "Store.h"
 #include "TempFolder.h"
@@ -62,17 +62,17 @@ TEST_F(RetryAfterTest, TellsWhatTheLastCallMet)
     for (const auto& row : rows) {
         const bool renews = row.status == ZV_WS_Status_ok && *row.fault != '\0';
         if (renews) ZV_WS_updateLocalCache(&session, ZV_WS_CacheParam::CacheData_BoxArtImage);
-        RetryAfter::Take(session);
+        TakeHeard(session);
         if (*row.fault) Fault(row.fault);
         EXPECT_EQ(row.status, row.call(&session)) << row.fault;
-        const RetryAfter::Heard heard = RetryAfter::Take(session);
+        const RetryAfter::Heard heard = TakeHeard(session);
         EXPECT_EQ(row.heard, std::string(heard.answered ? "answered " : "") + (heard.silent ? "silent " : "") +
                                  (heard.unavailable ? "unavailable " : "") + std::to_string(heard.seconds))
             << row.fault;
         store->ClearFaults();
     }
     const ZV_WS_Session none;
-    EXPECT_FALSE(RetryAfter::Take(none).answered);
+    EXPECT_FALSE(TakeHeard(none).answered);
 }
 
 }  // namespace

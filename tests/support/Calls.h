@@ -16,6 +16,6 @@ struct CallResult {
 /// All of them, in a table.
 std::vector<std::string> CallNames();
 
-/// False when there is no such call ("getTitles" is ZV_WS_getTitles). `after` is called when it has returned, before its
-/// output is read.
+/// False when there is no such call ("getTitles" is ZV_WS_getTitles). `after` is called when it has returned, before
+/// its output is read.
 bool MakeCall(const std::string& name, ZV_WS_Session* session, CallResult& result, void (*after)() = nullptr);

@@ -97,11 +97,13 @@ std::string Replaced(std::string text, const std::string& from, const std::strin
 // It is well-formed, and says nothing; without it the rest of each record would not be read.
 TEST(Answer, TextBetweenElementsIsReadOver)
 {
-    for (const char* text : {" x ", "&amp;", "<![CDATA[<y>]]>", "<!-- c -->z<!-- d -->", "\xE2\x82\xAC>'\"", "<?p q?>"}) {
+    for (const char* text :
+         {" x ", "&amp;", "<![CDATA[<y>]]>", "<!-- c -->z<!-- d -->", "\xE2\x82\xAC>'\"", "<?p q?>"}) {
         SCOPED_TRACE(text);
         std::string body = kListing;
-        for (const char* tag : {"<getTitleListingResult>", "<TitleID>", "</TitleID>", "<BonusAsset ", "<ProductListing>",
-                                "</SkuID>", "<FileProfile>", "</AvailableAssets>", "</IsAvailInUserWishList>"}) {
+        for (const char* tag :
+             {"<getTitleListingResult>", "<TitleID>", "</TitleID>", "<BonusAsset ", "<ProductListing>", "</SkuID>",
+              "<FileProfile>", "</AvailableAssets>", "</IsAvailInUserWishList>"}) {
             const bool isBefore = tag[1] != '/' && strstr(tag, "Result>") == nullptr;
             body = Replaced(body, tag, isBefore ? text + std::string(tag) : tag + std::string(text));
         }
