@@ -26,11 +26,30 @@
 #pragma once
 
 #include <tuple>
+#include <utility>
 
 #include "ZVWSLib.h"
 
 template <class Record>
 struct ZV_WS_RecordTraits;
+
+/// Tags are below it.
+constexpr unsigned int ZV_WS_kTagCount = 56;
+
+/// The record of a tag, in a tuple that is empty when it has none. A row makes both, so that two rows with one tag are
+/// an error.
+template <unsigned int tag>
+struct ZV_WS_RecordOfTag {
+    using Type = std::tuple<>;
+};
+
+/// The records of several tags.
+template <class Tags>
+struct ZV_WS_RecordsOfTags;
+template <unsigned int... tags>
+struct ZV_WS_RecordsOfTags<std::integer_sequence<unsigned int, tags...>> {
+    using Type = decltype(std::tuple_cat(std::declval<typename ZV_WS_RecordOfTag<tags>::Type>()...));
+};
 
 #define ZV_WS_EACH_1(DO, x) DO(x)
 #define ZV_WS_EACH_2(DO, x, ...) DO(x) ZV_WS_EACH_1(DO, __VA_ARGS__)
@@ -61,11 +80,16 @@ struct ZV_WS_RecordTraits;
     struct ZV_WS_RecordTraits<Record> {                \
         using Base = base;                             \
         static constexpr unsigned int kTag = tag;      \
+        static_assert(tag < ZV_WS_kTagCount);          \
         template <class R, class V>                    \
         static void Visit(R& r, V&& v)                 \
         {                                              \
             visits                                     \
         }                                              \
+    };                                                 \
+    template <>                                        \
+    struct ZV_WS_RecordOfTag<tag> {                    \
+        using Type = std::tuple<Record>;               \
     };
 
 /// One row: a record, the record it extends, its tag, its own members in the order of the struct.
@@ -135,19 +159,5 @@ ZV_WS_RECORD(ZV_WS_VersionInfo, ZV_WS_Object, 50, Major, Minor, Revision)
 ZV_WS_RECORD(ZV_WS_THXMediaDirectorResponse, ZV_WS_StandardResponse, 55, LongFormat, ShortFormat)
 // clang-format on
 
-/// Every record but the session (tag 1), whose parts the library alone knows.
-using ZV_WS_AllRecords =
-    std::tuple<ZV_WS_String, ZV_WS_StandardResponse, ZV_WS_Genre, ZV_WS_GenreArray, ZV_WS_BonusAsset,
-               ZV_WS_BonusAssetArray, ZV_WS_FileProfileArray, ZV_WS_AudioFile, ZV_WS_AudioFileArray,
-               ZV_WS_ProductListing, ZV_WS_ProductListingArray, ZV_WS_GenreLabelResponse, ZV_WS_TitleListing,
-               ZV_WS_TitleListingArray, ZV_WS_TitleListingResponse, ZV_WS_TitleListingResponseArray,
-               ZV_WS_TitlesResponse, ZV_WS_TitlesResponseArray, ZV_WS_TvEpisode, ZV_WS_TvEpisodeArray,
-               ZV_WS_TvEpisodeListResponse, ZV_WS_TranslateSkuIDResponse, ZV_WS_TranslateTivoExternalIDResponse,
-               ZV_WS_RecommendedTitlesResponse, ZV_WS_TitleListingPurchased, ZV_WS_TitleListingPurchasedArray,
-               ZV_WS_MyVideosResponse, ZV_WS_WishlistItemsResponse, ZV_WS_TitlesInWishlist, ZV_WS_PurchaseResponse,
-               ZV_WS_StreamingAssetLocationResponse, ZV_WS_GiftCertificateResponse,
-               ZV_WS_CheckAdultVerificationEnabledResponse, ZV_WS_CheckAdultVerificationPinResponse,
-               ZV_WS_RentalExpirationResponse, ZV_WS_PPCardBalanceResponse, ZV_WS_ConfigurationItem,
-               ZV_WS_ConfigResponse, ZV_WS_BillingInfoResponse, ZV_WS_BillingInfoAndPPCBalanceResponse,
-               ZV_WS_SettingsPageInfoResponse, ZV_WS_EmailAddressResponse, ZV_WS_CalcOrderTaxResponse, ZV_WS_FileType,
-               ZV_WS_AuthorizeDeviceResponse, ZV_WS_Image, ZV_WS_VersionInfo, ZV_WS_THXMediaDirectorResponse>;
+/// Every record but the session (tag 1), whose parts the library alone knows: those of all rows, by tag.
+using ZV_WS_AllRecords = ZV_WS_RecordsOfTags<std::make_integer_sequence<unsigned int, ZV_WS_kTagCount>>::Type;

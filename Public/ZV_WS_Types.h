@@ -185,10 +185,11 @@ struct ZV_WS_CacheParam {
 /// Proxy for all connections of the session; none when Host is not given. TLS goes through it by CONNECT. A proxy that
 /// refuses is a status of the HTTP family (407: ask for other credentials).
 struct ZV_WS_ProxyParam {
-    const char* Host = nullptr;
-    int Port = 0;                    ///< Of the proxy; not looked at without a Host.
-    const char* UserName = nullptr;  ///< Not given: no credentials are sent.
-    const char* Password = nullptr;  ///< Sent to the proxy unprotected ("Basic"), as proxies want it.
+    const char* Host = nullptr;      ///< A name or an address.
+    int Port = 0;                    ///< Not looked at by set-up: with a wrong one no connection comes about.
+    const char* UserName = nullptr;  ///< Null or empty: the proxy is shown no credentials.
+    const char* Password =
+        nullptr;  ///< Sent to the proxy as HTTP's basic scheme has it, which anybody on the way reads.
 };
 
 /// All that a session needs. APIKey, AuthToken, identifier and UserName are sent, and hold nothing that XML cannot.

@@ -81,7 +81,7 @@ bool ReadCondition(const std::string& text, Fault& fault)
 
 }  // namespace
 
-std::string Fault::Text() const
+std::string Fault::Spelling() const
 {
     const std::string name = row ? row->name : "";
     return value.empty() ? name : name + ":" + value;
@@ -171,7 +171,7 @@ std::string Faults::Pending() const
     std::string lines;
     for (const auto& [operation, list] : m_Lists) {
         for (const Fault& fault : list)
-            lines += operation + "=" + fault.Text() + ",count=" + std::to_string(fault.count) + "\n";
+            lines += operation + "=" + fault.Spelling() + ",count=" + std::to_string(fault.count) + "\n";
     }
     return lines;
 }

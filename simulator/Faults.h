@@ -36,7 +36,7 @@ struct Fault {
     int Number(int standard) const;
     long long Seconds(long long standard) const;
     /// As it was ordered; empty for none.
-    std::string Text() const;
+    std::string Spelling() const;
     /// Whether what the client gets says that the request was not carried out, and it was not.
     bool ClaimsFailure() const { return row && row->effect == kUndone && !afterEffect; }
 };

@@ -223,7 +223,7 @@ HttpResponse Proxy::Check(const Connection& client, const HttpRequest& request, 
     HttpResponse response;
     LoggedRequest log = BeginEntry(client, m_Log, request);
     log.service = log.operation = "proxy";
-    log.fault = fault.Text();
+    log.fault = fault.Spelling();
     log.credentials = Standing(request);
     log.violation = ReadGoal(request, goal);
     if (!log.violation.empty()) response.status = 400;

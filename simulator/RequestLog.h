@@ -6,7 +6,7 @@
 #include <deque>
 #include <mutex>
 
-#include "Storefront.h"
+#include "LoggedRequest.h"
 
 namespace simulator {
 

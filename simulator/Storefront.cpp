@@ -262,7 +262,7 @@ bool Simulator::Handshake(Connection& connection)
         LoggedRequest log = BeginEntry(connection, m_Log);
         log.service = log.operation = "connect";
         log.tls = true;
-        log.fault = fault.Text();
+        log.fault = fault.Spelling();
         m_Log.Add(std::move(log));
     }
     if (!m_Server.Pause(fault.delay)) return false;
@@ -287,7 +287,7 @@ bool Simulator::ServeOne(Connection& connection, const HttpRequest& request)
     LoggedRequest log = BeginEntry(connection, m_Log, request);
     Fault fault;
     HttpResponse response = Answer(request, connection, log, fault);
-    log.fault = fault.Text();
+    log.fault = fault.Spelling();
     m_Log.Add(std::move(log));
     return m_Server.Pause(m_Latency + fault.delay) &&
            m_Writer.Send(connection.channel, request, std::move(response), fault);

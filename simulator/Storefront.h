@@ -11,6 +11,8 @@
 #include <string>
 #include <vector>
 
+#include "LoggedRequest.h"
+
 /// What the server certificate is like. All but Good must make a careful client refuse.
 enum class CertificateKind { Good, Untrusted, Expired, NotYetValid, WrongName, WideWildcard, NameOnly };
 
@@ -71,31 +73,6 @@ struct StorefrontOptions {
     /// Called with every exchange before its answer is sent, on the thread of its connection: for tests in the same
     /// process.
     std::function<void(const SoapExchange&)> onExchange;
-};
-
-struct LoggedRequest {
-    unsigned long number = 0;
-    std::string service;    ///< "browse", "account", "stream", "discovery", "clock", "bandwidth", "boxart", "contract",
-                            ///< "connect" or "proxy".
-    std::string operation;  ///< SOAP operation; the service's name for the others; the prefix for box art.
-    std::string method;     ///< HTTP's.
-    std::string target;     ///< What stands behind it: a path and a query, a whole address, or host and port.
-    std::vector<std::pair<std::string, std::string>>
-        headers;  ///< HTTP headers, names in lower case; of Proxy-Authorization only the scheme.
-    std::vector<std::pair<std::string, std::string>>
-        soap;  ///< The SOAP header's: user, messageID, to, settings (the block's name), the settings' children,
-               ///< AuthToken as "***", and token: "none", "current" (the one that its device was given last),
-               ///< "replaced" (given out before that one), "withdrawn" or "unknown", as it was when the request came.
-    std::vector<std::pair<std::string, std::string>>
-        children;  ///< The request's, in order; passwords and PINs as "***".
-    unsigned long connection = 0;
-    unsigned long proxy = 0;  ///< The connection to the proxy through which it came; 0: none, it came directly.
-    std::string credentials;  ///< Those for the proxy: "right", "wrong" or "none"; empty when it asks for none.
-    bool tls = false;
-    bool resumed = false;   ///< TLS session resumed.
-    double time = 0;        ///< Seconds since the start.
-    std::string fault;      ///< The fault that was applied.
-    std::string violation;  ///< Why the request was refused.
 };
 
 class Storefront {

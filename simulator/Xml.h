@@ -9,7 +9,7 @@ std::string XmlEscape(const std::string& text);
 
 class XmlWriter {
 public:
-    const std::string& Text() const { return m_Text; }
+    const std::string& Xml() const { return m_Text; }
     /// The writer is empty after that.
     std::string Take() { return std::move(m_Text); }
 

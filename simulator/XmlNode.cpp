@@ -8,7 +8,7 @@ namespace simulator {
 
 namespace {
 
-const char* Text(const xmlChar* text)
+const char* Chars(const xmlChar* text)
 {
     return reinterpret_cast<const char*>(text);
 }
@@ -17,7 +17,7 @@ const char* Text(const xmlChar* text)
 std::string Taken(xmlChar* text)
 {
     const std::unique_ptr<xmlChar, void (*)(void*)> owned(text, xmlFree);
-    return owned ? Text(owned.get()) : "";
+    return owned ? Chars(owned.get()) : "";
 }
 
 bool HasInstruction(xmlNodePtr first)
@@ -45,17 +45,18 @@ bool HasInstruction(const Document& document)
 
 std::string Node::Name() const
 {
-    return m_Node ? Text(m_Node->name) : "";
+    return m_Node ? Chars(m_Node->name) : "";
 }
 
 std::string Node::Namespace() const
 {
-    return m_Node && m_Node->ns ? Text(m_Node->ns->href) : "";
+    return m_Node && m_Node->ns ? Chars(m_Node->ns->href) : "";
 }
 
 bool Node::Is(const char* space, const char* name) const
 {
-    return m_Node && m_Node->ns && strcmp(Text(m_Node->name), name) == 0 && strcmp(Text(m_Node->ns->href), space) == 0;
+    return m_Node && m_Node->ns && strcmp(Chars(m_Node->name), name) == 0 &&
+           strcmp(Chars(m_Node->ns->href), space) == 0;
 }
 
 std::vector<Node> Node::Children() const
@@ -108,7 +109,7 @@ bool Node::HasAttribute(const char* name, const char* space) const
 std::string Node::AttributeOutside(const char* space) const
 {
     for (const xmlAttr* one = m_Node ? m_Node->properties : nullptr; one; one = one->next) {
-        if (!one->ns || strcmp(Text(one->ns->href), space) != 0) return Text(one->name);
+        if (!one->ns || strcmp(Chars(one->ns->href), space) != 0) return Chars(one->name);
     }
     return "";
 }
@@ -117,14 +118,14 @@ std::string Node::NamespaceOf(const std::string& prefix) const
 {
     const auto* name = prefix.empty() ? nullptr : reinterpret_cast<const xmlChar*>(prefix.c_str());
     const xmlNs* space = m_Node ? xmlSearchNs(m_Node->doc, m_Node, name) : nullptr;
-    return space && space->href ? Text(space->href) : "";
+    return space && space->href ? Chars(space->href) : "";
 }
 
 std::vector<std::pair<std::string, std::string>> Node::Attributes() const
 {
     std::vector<std::pair<std::string, std::string>> attributes;
     for (const xmlAttr* one = m_Node ? m_Node->properties : nullptr; one; one = one->next) {
-        if (!one->ns) attributes.emplace_back(Text(one->name), Attribute(Text(one->name), nullptr));
+        if (!one->ns) attributes.emplace_back(Chars(one->name), Attribute(Chars(one->name), nullptr));
     }
     return attributes;
 }

@@ -8,10 +8,7 @@ public:
 };
 
 // How many hours are left of a rental, and whether to warn the customer.
-class _ZV1__checkRentalExpiration {
-public:
-    int PassId 1;
-};
+class _ZV1__checkRentalExpiration { public: int PassId 1; };
 class _ZV1__checkRentalExpirationResponse {
 public:
     ZV1__CheckRentalExpirationResponse* checkRentalExpirationResult 0;
@@ -20,25 +17,16 @@ public:
 // The number of the country whose store the customer uses.
 class _ZV1__GetCountryID {
 };
-class _ZV1__GetCountryIDResponse {
-public:
-    int* GetCountryIDResult 0;
-};
+class _ZV1__GetCountryIDResponse { public: int* GetCountryIDResult 0; };
 
 // Values that the service gives its players, by key. The address of the bandwidth test stands under "BandwithCheckURL",
 // spelled so.
 class _ZV1__getConfig {
 };
-class _ZV1__getConfigResponse {
-public:
-    ZV1__GetConfigResponse* getConfigResult 0;
-};
+class _ZV1__getConfigResponse { public: ZV1__GetConfigResponse* getConfigResult 0; };
 
 // Whether that is the customer's PIN for adult titles. It is never repeated by itself, since wrong ones may be counted.
-class _ZV1__checkAdultVerificationPin {
-public:
-    char* Pin 0;
-};
+class _ZV1__checkAdultVerificationPin { public: char* Pin 0; };
 class _ZV1__checkAdultVerificationPinResponse {
 public:
     ZV1__CheckAdultVerificationPinResponse* checkAdultVerificationPinResult 0;
@@ -53,14 +41,8 @@ public:
 };
 
 // Puts a title into the wish list. One that is already there is no failure.
-class _ZV1__addItemToWishlist {
-public:
-    int TitleID 1;
-};
-class _ZV1__addItemToWishlistResponse {
-public:
-    ZV1__WishListActionResponse* addItemToWishlistResult 0;
-};
+class _ZV1__addItemToWishlist { public: int TitleID 1; };
+class _ZV1__addItemToWishlistResponse { public: ZV1__WishListActionResponse* addItemToWishlistResult 0; };
 
 // Empties the wish list.
 class _ZV1__removeAllItemsFromWishList {
@@ -71,14 +53,8 @@ public:
 };
 
 // Takes a title out of the wish list.
-class _ZV1__removeItemFromWishList {
-public:
-    int TitleID 1;
-};
-class _ZV1__removeItemFromWishListResponse {
-public:
-    ZV1__WishListActionResponse* removeItemFromWishListResult 0;
-};
+class _ZV1__removeItemFromWishList { public: int TitleID 1; };
+class _ZV1__removeItemFromWishListResponse { public: ZV1__WishListActionResponse* removeItemFromWishListResult 0; };
 
 // A page of the wish list, sorted by when a title was put there (0), by its name (1), rating (2) or stars (3).
 class _ZV1__getWishlistItems {
@@ -88,16 +64,10 @@ public:
     int ItemsPerPage 1;
     enum ZV1__TitleTypeFilter TitleType 1;
 };
-class _ZV1__getWishlistItemsResponse {
-public:
-    ZV1__GetWishlistItemsResponse* getWishlistItemsResult 0;
-};
+class _ZV1__getWishlistItemsResponse { public: ZV1__GetWishlistItemsResponse* getWishlistItemsResult 0; };
 
 // Adds the worth of a gift code to the customer's prepaid money, once, and tells the new balance.
-class _ZV1__assignGiftCertificateToUser {
-public:
-    char* GiftCertificateCode 0;
-};
+class _ZV1__assignGiftCertificateToUser { public: char* GiftCertificateCode 0; };
 class _ZV1__assignGiftCertificateToUserResponse {
 public:
     ZV1__GiftCertificateResponse* assignGiftCertificateToUserResult 0;
@@ -106,44 +76,26 @@ public:
 // What a settings page shows of the account and the device.
 class _ZV1__getSettingsPageInfo {
 };
-class _ZV1__getSettingsPageInfoResponse {
-public:
-    ZV1__SettingsPageInfo* getSettingsPageInfoResult 0;
-};
+class _ZV1__getSettingsPageInfoResponse { public: ZV1__SettingsPageInfo* getSettingsPageInfoResult 0; };
 
 // The customer's e-mail address.
 class _ZV1__getEmailAddress {
 };
-class _ZV1__getEmailAddressResponse {
-public:
-    ZV1__GetEmailAddressResponse* getEmailAddressResult 0;
-};
+class _ZV1__getEmailAddressResponse { public: ZV1__GetEmailAddressResponse* getEmailAddressResult 0; };
 
 // The customer's prepaid money, in cents.
 class _ZV1__showPrePaidCardBalance {
 };
-class _ZV1__showPrePaidCardBalanceResponse {
-public:
-    ZV1__PPCardBalanceResponse* showPrePaidCardBalanceResult 0;
-};
+class _ZV1__showPrePaidCardBalanceResponse { public: ZV1__PPCardBalanceResponse* showPrePaidCardBalanceResult 0; };
 
 // The kind and the last four digits of the card on file.
 class _ZV1__getBillingInfo {
 };
-class _ZV1__getBillingInfoResponse {
-public:
-    ZV1__BillingInfoResponse* getBillingInfoResult 0;
-};
+class _ZV1__getBillingInfoResponse { public: ZV1__BillingInfoResponse* getBillingInfoResult 0; };
 
 // Whether the customer has bought or rented the title.
-class _ZV1__checkForPurchasedTitle {
-public:
-    int TitleID 1;
-};
-class _ZV1__checkForPurchasedTitleResponse {
-public:
-    bool* checkForPurchasedTitleResult 0;
-};
+class _ZV1__checkForPurchasedTitle { public: int TitleID 1; };
+class _ZV1__checkForPurchasedTitleResponse { public: bool* checkForPurchasedTitleResult 0; };
 
 // A page of what the customer has bought or rented, for devices that download.
 class _ZV1__getMyVideos {
@@ -154,10 +106,7 @@ public:
     enum ZV1__TitleTypeFilter TitleType 1;
     enum ZV1__WatchStatus WatchStatusFilter 1;
 };
-class _ZV1__getMyVideosResponse {
-public:
-    ZV1__GetMyVideosResponse* getMyVideosResult 0;
-};
+class _ZV1__getMyVideosResponse { public: ZV1__GetMyVideosResponse* getMyVideosResult 0; };
 
 // Buys or rents a product, with prepaid money ("yes") or the card on file ("no"). It is never repeated by itself.
 class _ZV1__doPurchaseSavedbilling {
@@ -166,38 +115,20 @@ public:
     char* IPAddress 0;
     char* UsePrePaidFunds 0;
 };
-class _ZV1__doPurchaseSavedbillingResponse {
-public:
-    ZV1__PurchaseResponse* doPurchaseSavedbillingResult 0;
-};
+class _ZV1__doPurchaseSavedbillingResponse { public: ZV1__PurchaseResponse* doPurchaseSavedbillingResult 0; };
 
 // Ties the device to the customer who was shown the PIN. The token of the answer comes with every later request.
-class _ZV1__authorizeDevice {
-public:
-    char* PIN 0;
-};
-class _ZV1__authorizeDeviceResponse {
-public:
-    ZV1__AuthorizeDeviceResponse* authorizeDeviceResult 0;
-};
+class _ZV1__authorizeDevice { public: char* PIN 0; };
+class _ZV1__authorizeDeviceResponse { public: ZV1__AuthorizeDeviceResponse* authorizeDeviceResult 0; };
 
 // Unties the device from its customer.
 class _ZV1__deactivateDevice {
 };
-class _ZV1__deactivateDeviceResponse {
-public:
-    ZV1__StandardResponse* deactivateDeviceResult 0;
-};
+class _ZV1__deactivateDeviceResponse { public: ZV1__StandardResponse* deactivateDeviceResult 0; };
 
 // Whether a token that authorizeDevice gave is still good.
-class _ZV1__checkAuthToken {
-public:
-    char* AuthToken 0;
-};
-class _ZV1__checkAuthTokenResponse {
-public:
-    bool* checkAuthTokenResult 0;
-};
+class _ZV1__checkAuthToken { public: char* AuthToken 0; };
+class _ZV1__checkAuthTokenResponse { public: bool* checkAuthTokenResult 0; };
 
 //gsoap ZV4 service name: DownloadAPISoap12
 //gsoap ZV4 service type: DownloadAPISoap12

@@ -4,99 +4,51 @@
 // extension. A session that was not told whether its device streams or downloads starts with it.
 class _ZV1__getFileType {
 };
-class _ZV1__getFileTypeResponse {
-public:
-    ZV1__FileType* getFileTypeResult 0;
-};
+class _ZV1__getFileTypeResponse { public: ZV1__FileType* getFileTypeResult 0; };
 
 // Whether the catalogue has changed since the time that getLastCacheLoadTimeUTC told: 0 when it has not, 1 when what a
 // player keeps of it is stale.
-class _ZV1__shouldUpdateCache {
-public:
-    char* UTCTime 0;
-};
-class _ZV1__shouldUpdateCacheResponse {
-public:
-    int* shouldUpdateCacheResult 0;
-};
+class _ZV1__shouldUpdateCache { public: char* UTCTime 0; };
+class _ZV1__shouldUpdateCacheResponse { public: int* shouldUpdateCacheResult 0; };
 
 // Titles like the one given.
-class _ZV1__getRecommendedTitles {
-public:
-    int TitleId 1;
-};
-class _ZV1__getRecommendedTitlesResponse {
-public:
-    ZV1__RecommendedTitlesResponse* getRecommendedTitlesResult 0;
-};
+class _ZV1__getRecommendedTitles { public: int TitleId 1; };
+class _ZV1__getRecommendedTitlesResponse { public: ZV1__RecommendedTitlesResponse* getRecommendedTitlesResult 0; };
 
 // When the catalogue was loaded last, a text that the player keeps as it is and hands back to shouldUpdateCache.
 class _ZV1__getLastCacheLoadTimeUTC {
 };
-class _ZV1__getLastCacheLoadTimeUTCResponse {
-public:
-    char* getLastCacheLoadTimeUTCResult 0;
-};
+class _ZV1__getLastCacheLoadTimeUTCResponse { public: char* getLastCacheLoadTimeUTCResult 0; };
 
 // The title that a product belongs to.
-class _ZV1__translateSkuId {
-public:
-    int SkuId 1;
-};
-class _ZV1__translateSkuIdResponse {
-public:
-    ZV1__TranslateSkuIdResponse* translateSkuIdResult 0;
-};
+class _ZV1__translateSkuId { public: int SkuId 1; };
+class _ZV1__translateSkuIdResponse { public: ZV1__TranslateSkuIdResponse* translateSkuIdResult 0; };
 
 // The title that another guide knows by that identifier.
-class _ZV1__translateTivoExternalId {
-public:
-    char* TivoExternalId 0;
-};
+class _ZV1__translateTivoExternalId { public: char* TivoExternalId 0; };
 class _ZV1__translateTivoExternalIdResponse {
 public:
     ZV1__TranslatedTivoExternalIdResponse* translateTivoExternalIdResult 0;
 };
 
 // Every episode of a season with all its details, in the order of their numbers.
-class _ZV1__getAllTvEpisodeListings {
-public:
-    int TitleID 1;
-};
+class _ZV1__getAllTvEpisodeListings { public: int TitleID 1; };
 class _ZV1__getAllTvEpisodeListingsResponse {
 public:
     ZV1__ArrayOfTitleListingResponse* getAllTvEpisodeListingsResult 0;
 };
 
 // All details of one episode.
-class _ZV1__getTvEpisodeListing {
-public:
-    int EpisodeID 1;
-};
-class _ZV1__getTvEpisodeListingResponse {
-public:
-    ZV1__TitleListingResponse* getTvEpisodeListingResult 0;
-};
+class _ZV1__getTvEpisodeListing { public: int EpisodeID 1; };
+class _ZV1__getTvEpisodeListingResponse { public: ZV1__TitleListingResponse* getTvEpisodeListingResult 0; };
 
 // The episodes of a season by name and number.
-class _ZV1__getTvEpisodeListByTitleID {
-public:
-    int TitleID 1;
-};
-class _ZV1__getTvEpisodeListByTitleIDResponse {
-public:
-    ZV1__TvEpisodeList* getTvEpisodeListByTitleIDResult 0;
-};
+class _ZV1__getTvEpisodeListByTitleID { public: int TitleID 1; };
+class _ZV1__getTvEpisodeListByTitleIDResponse { public: ZV1__TvEpisodeList* getTvEpisodeListByTitleIDResult 0; };
 
 // All details of one title, and whether it is in the customer's wish list.
-class _ZV1__getTitleListing {
-public:
-    int TitleID 1;
-};
-class _ZV1__getTitleListingResponse {
-public:
-    ZV1__TitleListingResponse* getTitleListingResult 0;
-};
+class _ZV1__getTitleListing { public: int TitleID 1; };
+class _ZV1__getTitleListingResponse { public: ZV1__TitleListingResponse* getTitleListingResult 0; };
 
 // The same page of each of several genres, one answer record a genre in the order asked.
 class _ZV1__getTitlesByGenreArray {
@@ -106,10 +58,7 @@ public:
     int ItemsPerPage 1;
     enum ZV1__StreamAPIPurchaseType PurchaseType 1;
 };
-class _ZV1__getTitlesByGenreArrayResponse {
-public:
-    ZV1__ArrayOfGetTitlesResponse* getTitlesByGenreArrayResult 0;
-};
+class _ZV1__getTitlesByGenreArrayResponse { public: ZV1__ArrayOfGetTitlesResponse* getTitlesByGenreArrayResult 0; };
 
 // A page of a genre's titles.
 class _ZV1__getTitlesByNavigation {
@@ -119,20 +68,11 @@ public:
     int ItemsPerPage 1;
     enum ZV1__StreamAPIPurchaseType PurchaseType 1;
 };
-class _ZV1__getTitlesByNavigationResponse {
-public:
-    ZV1__GetTitlesResponse* getTitlesByNavigationResult 0;
-};
+class _ZV1__getTitlesByNavigationResponse { public: ZV1__GetTitlesResponse* getTitlesByNavigationResult 0; };
 
 // The text that labels a genre, and the one that explains it.
-class _ZV1__getGenreLabel {
-public:
-    int GenreID 1;
-};
-class _ZV1__getGenreLabelResponse {
-public:
-    ZV1__GetGenreLabelResponse* getGenreLabelResult 0;
-};
+class _ZV1__getGenreLabel { public: int GenreID 1; };
+class _ZV1__getGenreLabelResponse { public: ZV1__GetGenreLabelResponse* getGenreLabelResult 0; };
 
 // A page of the titles with the text in their names or among the people who made them.
 class _ZV1__searchForTitleDetail {
@@ -143,10 +83,7 @@ public:
     enum ZV1__StreamAPIPurchaseType PurchaseType 1;
     enum ZV1__TitleTypeFilter TitleType 1;
 };
-class _ZV1__searchForTitleDetailResponse {
-public:
-    ZV1__GetTitlesResponse* searchForTitleDetailResult 0;
-};
+class _ZV1__searchForTitleDetailResponse { public: ZV1__GetTitlesResponse* searchForTitleDetailResult 0; };
 
 // A page of the titles whose names hold the text.
 class _ZV1__searchForTitle {
@@ -157,18 +94,12 @@ public:
     enum ZV1__StreamAPIPurchaseType PurchaseType 1;
     enum ZV1__TitleTypeFilter TitleType 1;
 };
-class _ZV1__searchForTitleResponse {
-public:
-    ZV1__GetTitlesResponse* searchForTitleResult 0;
-};
+class _ZV1__searchForTitleResponse { public: ZV1__GetTitlesResponse* searchForTitleResult 0; };
 
 // Every genre, as a flat list in which each names the one above it.
 class _ZV1__getNavigation {
 };
-class _ZV1__getNavigationResponse {
-public:
-    ZV1__GenreRequest* getNavigationResult 0;
-};
+class _ZV1__getNavigationResponse { public: ZV1__GenreRequest* getNavigationResult 0; };
 
 //gsoap ZV3 service name: RealTimeBrowseSoap12
 //gsoap ZV3 service type: RealTimeBrowseSoap12

@@ -19,64 +19,34 @@ public:
     enum ZV1__FileProfile FileProfile 1;
     enum ZV1__AudioProfile AudioSetting 1;
 };
-class _ZV1__getTHXMediaDirectorResponse {
-public:
-    ZV1__THXMediaDirectorResponse* getTHXMediaDirectorResult 0;
-};
+class _ZV1__getTHXMediaDirectorResponse { public: ZV1__THXMediaDirectorResponse* getTHXMediaDirectorResult 0; };
 
 // Keeps the sound that the customer prefers.
-class _ZV1__setAudioDefaultProperty {
-public:
-    enum ZV1__AudioProfile AudioSetting 1;
-};
-class _ZV1__setAudioDefaultPropertyResponse {
-public:
-    ZV1__StandardResponse* setAudioDefaultPropertyResult 0;
-};
+class _ZV1__setAudioDefaultProperty { public: enum ZV1__AudioProfile AudioSetting 1; };
+class _ZV1__setAudioDefaultPropertyResponse { public: ZV1__StandardResponse* setAudioDefaultPropertyResult 0; };
 
 // The sound that the customer prefers.
 class _ZV1__getAudioDefaultProperty {
 };
-class _ZV1__getAudioDefaultPropertyResponse {
-public:
-    enum ZV1__AudioProfile* getAudioDefaultPropertyResult 0;
-};
+class _ZV1__getAudioDefaultPropertyResponse { public: enum ZV1__AudioProfile* getAudioDefaultPropertyResult 0; };
 
 // What a product costs, without and with tax.
-class _ZV1__calcOrderTax {
-public:
-    int SKUID 1;
-};
-class _ZV1__calcOrderTaxResponse {
-public:
-    ZV1__CalcOrderTaxResponse* calcOrderTaxResult 0;
-};
+class _ZV1__calcOrderTax { public: int SKUID 1; };
+class _ZV1__calcOrderTaxResponse { public: ZV1__CalcOrderTaxResponse* calcOrderTaxResult 0; };
 
 // Diagnostic: a player reports a timeout, or sees how it takes what the service answers here.
 class _ZV1__ReturnTimeout {
 };
-class _ZV1__ReturnTimeoutResponse {
-public:
-    ZV1__StandardResponse* ReturnTimeoutResult 0;
-};
+class _ZV1__ReturnTimeoutResponse { public: ZV1__StandardResponse* ReturnTimeoutResult 0; };
 
 // Diagnostic: a player reports an error, or sees how it takes what the service answers here.
 class _ZV1__ReturnError {
 };
-class _ZV1__ReturnErrorResponse {
-public:
-    ZV1__StandardResponse* ReturnErrorResult 0;
-};
+class _ZV1__ReturnErrorResponse { public: ZV1__StandardResponse* ReturnErrorResult 0; };
 
 // Forgets every purchase of the account, whose password it wants.
-class _ZV1__removeAllMyPurchases {
-public:
-    char* password 0;
-};
-class _ZV1__removeAllMyPurchasesResponse {
-public:
-    ZV1__StandardResponse* removeAllMyPurchasesResult 0;
-};
+class _ZV1__removeAllMyPurchases { public: char* password 0; };
+class _ZV1__removeAllMyPurchasesResponse { public: ZV1__StandardResponse* removeAllMyPurchasesResult 0; };
 
 // Where to go on playing what a pass stands for: the stream that was played last, and the second at which it stopped.
 class _ZV1__loadLastStreamingAssetLocationForPass {
@@ -90,10 +60,7 @@ public:
 };
 
 // Where a trailer plays from.
-class _ZV1__getBonusAssetLocation {
-public:
-    int BonusAssetID 1;
-};
+class _ZV1__getBonusAssetLocation { public: int BonusAssetID 1; };
 class _ZV1__getBonusAssetLocationResponse {
 public:
     ZV1__GetStreamingAssetLocationResponse* getBonusAssetLocationResult 0;
@@ -117,10 +84,7 @@ public:
     enum ZV1__StreamStatus Status 1;
     int StopTimeSeconds 1;
 };
-class _ZV1__manageStreamInstanceStatusResponse {
-public:
-    ZV1__StandardResponse* manageStreamInstanceStatusResult 0;
-};
+class _ZV1__manageStreamInstanceStatusResponse { public: ZV1__StandardResponse* manageStreamInstanceStatusResult 0; };
 
 // The card on file and the prepaid money in one answer.
 class _ZV1__getBillingInfoAndPPCBalance {
@@ -131,30 +95,15 @@ public:
 };
 
 // Whether the customer has bought or rented the product.
-class _ZV1__checkForPurchasedStream {
-public:
-    int SkuID 1;
-};
-class _ZV1__checkForPurchasedStreamResponse {
-public:
-    bool* checkForPurchasedStreamResult 0;
-};
+class _ZV1__checkForPurchasedStream { public: int SkuID 1; };
+class _ZV1__checkForPurchasedStreamResponse { public: bool* checkForPurchasedStreamResult 0; };
 
 // Whether the customer has bought or rented the title.
-class _ZV1__checkForPurchasedStreamByTitleID {
-public:
-    int TitleID 1;
-};
-class _ZV1__checkForPurchasedStreamByTitleIDResponse {
-public:
-    bool* checkForPurchasedStreamByTitleIDResult 0;
-};
+class _ZV1__checkForPurchasedStreamByTitleID { public: int TitleID 1; };
+class _ZV1__checkForPurchasedStreamByTitleIDResponse { public: bool* checkForPurchasedStreamByTitleIDResult 0; };
 
 // The purchased titles behind several passes.
-class _ZV1__getTitleListingsPurchasedForPasses {
-public:
-    ZV1__ArrayOfInt* Passes 0;
-};
+class _ZV1__getTitleListingsPurchasedForPasses { public: ZV1__ArrayOfInt* Passes 0; };
 class _ZV1__getTitleListingsPurchasedForPassesResponse {
 public:
     ZV1__ArrayOfTitleListingPurchasedForPass* getTitleListingsPurchasedForPassesResult 0;
@@ -169,10 +118,7 @@ public:
     enum ZV1__TitleTypeFilter TitleType 1;
     enum ZV1__WatchStatus WatchStatusFilter 1;
 };
-class _ZV1__getMyStreamingVideosResponse {
-public:
-    ZV1__GetMyVideosResponse* getMyStreamingVideosResult 0;
-};
+class _ZV1__getMyStreamingVideosResponse { public: ZV1__GetMyVideosResponse* getMyStreamingVideosResult 0; };
 
 //gsoap ZV2 service name: StreamAPISoap12
 //gsoap ZV2 service type: StreamAPISoap12

@@ -16,8 +16,8 @@ ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_P
     ServiceCall<Op> call(function, handle, videos);
     if (!call.Accepts(IsPage(page))) return call.Refusal();
     if (isCached) {
-        call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, kVideosTable, page->CurrentPageNumber, page->ItemsPerPage,
-                     purchaseType, typeFilter, watchStatus);
+        call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, page->CurrentPageNumber, page->ItemsPerPage, purchaseType,
+                     typeFilter, watchStatus);
     }
     SetPage(call, *page);
     call.SetEnum(call->PurchaseType, purchaseType);
@@ -29,8 +29,7 @@ ZV_WS_Status MyVideos(const char* function, ZV_WS_Session* handle, const ZV_WS_P
 template <class Op>
 ZV_WS_Status IsTitlePurchased(const char* function, ZV_WS_Session* handle, int titleID, bool* isPurchased)
 {
-    return LogAnswer(function, AskAbout<Op>(&Op::Request::TitleID, titleID, function, handle, isPurchased),
-                     *isPurchased);
+    return LogAnswer(function, AskAbout(&Op::Request::TitleID, titleID, function, handle, isPurchased), *isPurchased);
 }
 
 bool Downloads(const ZV_WS_Session* handle)
@@ -67,14 +66,13 @@ ZV_WS_Status ZV_WS_checkForPurchasedTitle(ZV_WS_Session* handle, int titleID, bo
 
 ZV_WS_Status ZV_WS_checkForPurchasedSku(ZV_WS_Session* handle, int skuID, bool* isPurchased)
 {
-    using Op = Operation::checkForPurchasedStream;
-    return LogAnswer(__func__, AskAbout<Op>(&Op::Request::SkuID, skuID, __func__, handle, isPurchased), *isPurchased);
+    return LogAnswer(__func__, AskAbout(&_ZV1__checkForPurchasedStream::SkuID, skuID, __func__, handle, isPurchased),
+                     *isPurchased);
 }
 
 ZV_WS_Status ZV_WS_checkRentalExpiration(ZV_WS_Session* handle, int passID, ZV_WS_RentalExpirationResponse* expiration)
 {
-    return AskAbout<Operation::checkRentalExpiration>(&_ZV1__checkRentalExpiration::PassId, passID, __func__, handle,
-                                                      expiration);
+    return AskAbout(&_ZV1__checkRentalExpiration::PassId, passID, __func__, handle, expiration);
 }
 
 ZV_WS_Status ZV_WS_removeAllMyPurchases(ZV_WS_Session* handle, const char* password, ZV_WS_StandardResponse* answer)
@@ -92,7 +90,6 @@ ZV_WS_Status ZV_WS_checkAdultVerificationEnabled(ZV_WS_Session* handle,
 {
     using Op = Operation::checkAdultVerificationEnabled;
     ServiceCall<Op> call(__func__, handle, answer);
-    if (!call.Accepts()) return call.Refusal();
     // What cannot be read must not pass for "no check wanted".
     return call.Into([&](const ServiceCall<Op>::Answer* result) {
         bool isEnabled = false;
@@ -107,7 +104,6 @@ ZV_WS_Status ZV_WS_checkAdultVerificationPin(ZV_WS_Session* handle, int pin,
                                              ZV_WS_CheckAdultVerificationPinResponse* answer)
 {
     ServiceCall<Operation::checkAdultVerificationPin> call(__func__, handle, answer);
-    if (!call.Accepts()) return call.Refusal();
     char text[16];
     snprintf(text, sizeof text, "%04d", pin);
     call->Pin = text;
@@ -116,14 +112,12 @@ ZV_WS_Status ZV_WS_checkAdultVerificationPin(ZV_WS_Session* handle, int pin,
 
 ZV_WS_Status ZV_WS_getEmailAddress(ZV_WS_Session* handle, ZV_WS_EmailAddressResponse* address)
 {
-    return Ask<Operation::getEmailAddress>(__func__, handle, address, ZV_WS_CacheParam::CacheData_Userdata,
-                                           "getEmailAddress");
+    return Ask<Operation::getEmailAddress>(__func__, handle, address, ZV_WS_CacheParam::CacheData_Userdata);
 }
 
 ZV_WS_Status ZV_WS_getBillingInfo(ZV_WS_Session* handle, ZV_WS_BillingInfoResponse* billing)
 {
-    return Ask<Operation::getBillingInfo>(__func__, handle, billing, ZV_WS_CacheParam::CacheData_Userdata,
-                                          "getBillingInfo");
+    return Ask<Operation::getBillingInfo>(__func__, handle, billing, ZV_WS_CacheParam::CacheData_Userdata);
 }
 
 ZV_WS_Status ZV_WS_getBillingInfoAndPPCBalance(ZV_WS_Session* handle, ZV_WS_BillingInfoAndPPCBalanceResponse* billing)
@@ -140,7 +134,6 @@ ZV_WS_Status ZV_WS_assignGiftCertificateToUser(ZV_WS_Session* handle, const char
                                                ZV_WS_GiftCertificateResponse* answer)
 {
     ServiceCall<Operation::assignGiftCertificateToUser> call(__func__, handle, answer);
-    if (!call.Accepts()) return call.Refusal();
     call.SetText(call->GiftCertificateCode, code);
     return call.Into(answer);
 }
@@ -149,7 +142,6 @@ ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, cons
                                           ZV_WS_PurchaseResponse* purchase)
 {
     ServiceCall<Operation::doPurchaseSavedbilling> call(__func__, handle, purchase);
-    if (!call.Accepts()) return call.Refusal();
     call->SkuID = skuID;
     call.SetText(call->IPAddress, ipAddress);
     call.SetText(call->UsePrePaidFunds, usePrepaidFund ? "yes" : "no");
@@ -160,5 +152,5 @@ ZV_WS_Status ZV_WS_doPurchaseSavedBilling(ZV_WS_Session* handle, int skuID, cons
 
 ZV_WS_Status ZV_WS_calcOrderTax(ZV_WS_Session* handle, int skuID, ZV_WS_CalcOrderTaxResponse* tax)
 {
-    return AskAbout<Operation::calcOrderTax>(&_ZV1__calcOrderTax::SKUID, skuID, __func__, handle, tax);
+    return AskAbout(&_ZV1__calcOrderTax::SKUID, skuID, __func__, handle, tax);
 }

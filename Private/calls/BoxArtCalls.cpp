@@ -31,8 +31,7 @@ ZV_WS_Status ZV_WS_getBoxArtImageData(ZV_WS_Session* handle, ZV_WS_BoxArtSize si
                                       ZV_WS_Image* image)
 {
     ZV_ASSERT(image != 0);
-    return GuardCall([&] {
-        Records::Tag(*image);
+    return Records::Fill(*image, [&] {
         if (!SessionOf(handle) || !IsPlainName(prefix)) return ZV_WS_Status_invalid_param;
         ZVString bytes;
         const ZV_WS_Status status = ImageStore(*handle->_pSessionImpl, size, prefix).BringBytes(bytes);
@@ -44,8 +43,7 @@ ZV_WS_Status ZV_WS_getBoxArtImageData(ZV_WS_Session* handle, ZV_WS_BoxArtSize si
 ZV_WS_Status ZV_WS_getBoxArtImage(ZV_WS_Session* handle, ZV_WS_BoxArtSize size, const char* prefix, ZV_WS_String* place)
 {
     ZV_ASSERT(place != 0);
-    return GuardCall([&] {
-        Records::Tag(*place);
+    return Records::Fill(*place, [&] {
         if (!SessionOf(handle) || !IsPlainName(prefix)) return ZV_WS_Status_invalid_param;
         SessionImpl& session = *handle->_pSessionImpl;
         ImageStore image(session, size, prefix);

@@ -52,8 +52,7 @@ ZV_WS_Status ZV_WS_getConfig(ZV_WS_Session* handle, ZV_WS_ConfigResponse* config
 
 ZV_WS_Status ZV_WS_getSettingsPageInfo(ZV_WS_Session* handle, ZV_WS_SettingsPageInfoResponse* info)
 {
-    return Ask<Operation::getSettingsPageInfo>(__func__, handle, info, ZV_WS_CacheParam::CacheData_Userdata,
-                                               "getSettingsPageInfo");
+    return Ask<Operation::getSettingsPageInfo>(__func__, handle, info, ZV_WS_CacheParam::CacheData_Userdata);
 }
 
 ZV_WS_Status ZV_WS_getCountryID(ZV_WS_Session* handle, int* countryID)
@@ -65,7 +64,6 @@ ZV_WS_Status ZV_WS_setAudioDefaultProperty(ZV_WS_Session* handle, ZV_WS_AudioPro
                                            ZV_WS_StandardResponse* answer)
 {
     ServiceCall<Operation::setAudioDefaultProperty> call(__func__, handle, answer);
-    if (!call.Accepts()) return call.Refusal();
     call.SetEnum(call->AudioSetting, profile);
     return call.Into(answer);
 }

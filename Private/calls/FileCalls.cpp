@@ -38,8 +38,7 @@ ZV_WS_Status ZV_WS_copyFile(const char* source, const char* target)
 ZV_WS_Status ZV_WS_getFolderName(const char* path, ZV_WS_String* folder)
 {
     ZV_ASSERT(folder != 0);
-    return GuardCall([&] {
-        Records::Tag(*folder);
+    return Records::Fill(*folder, [&] {
         if (!path) return ZV_WS_Status_invalid_param;
         ZVUtilities::SetText(*folder, ZVFile::GetFolderName(path));
         return ZV_WS_Status_ok;

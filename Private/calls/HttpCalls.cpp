@@ -188,8 +188,7 @@ ZV_WS_Status ZV_WS_checkBandwidth(ZV_WS_Session* handle, unsigned int* bitsPerSe
 ZV_WS_Status ZV_WS_getLocalIPAddr(ZV_WS_Session* handle, ZV_WS_String* address)
 {
     ZV_ASSERT(address != 0);
-    return LogStatus(__func__, GuardCall([&] {
-                         Records::Tag(*address);
+    return LogStatus(__func__, Records::Fill(*address, [&] {
                          if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
                          ZVString text;
                          const ZV_WS_Status found = FindLocalAddress(*handle->_pSessionImpl, text);

@@ -1,21 +1,24 @@
 // The shape of every call of a service, from the emptied output to the status.
 //
-//     ServiceCall<Operation::getTitleListing> call(__func__, handle, listing);
-//     if (!call.Accepts()) return call.Refusal();
-//     call.CacheAs(ZV_WS_CacheParam::CacheData_Metadata, "getTitleListing", titleID);
-//     call->TitleID = titleID;
-//     return call.Into(listing);
+//     ServiceCall<Operation::getTitlesByNavigation> call(__func__, handle, titles);
+//     if (!call.Accepts(IsPage(page))) return call.Refusal();
+//     call.CacheAs(ZV_WS_CacheParam::CacheData_Metadata, genreID, page->CurrentPageNumber, page->ItemsPerPage);
+//     call->GenreID = genreID;
+//     SetPage(call, *page);
+//     return call.Into(titles);
 //
-// The first line empties and tags the output, so that it can be released however the call ends. Then the call's own
-// argument checks, where the cache keeps the answer (if it does), and the request's children; texts and enumerations go
-// through SetText and SetEnum, which notice what no request can carry. Into refuses that, looks into the cache, or
-// sends the request, once more when a connection kept from an earlier call turns out to be dead and the operation
-// allows it, or when the service refuses it for a wrong clock, converts the answer's result (Conversion.h), cleans up,
-// writes the log line and maps the status. Nothing is thrown through it.
+// The first line empties and tags the output, so that it can be released however the call ends. Then come the checks of
+// arguments that the call itself looks into, where the cache keeps the answer (if it does), and the request's children;
+// texts and enumerations go through SetText and SetEnum, which notice what no request can carry. Into refuses that, and
+// a call without a session; looks into the cache, or sends the request, once more when a connection kept from an
+// earlier call turns out to be dead and the operation allows it, or when the service refuses it for a wrong clock;
+// converts the answer's result (Conversion.h), cleans up, writes the log line and maps the status. Nothing is thrown
+// through it.
 #pragma once
 
 #include <ctype.h>
 #include <limits.h>
+#include <string.h>
 
 #include <utility>
 
@@ -81,7 +84,7 @@ public:
     void SetEnum(Wire& to, Value value)
     {
         to = static_cast<Wire>(value);
-        m_IsSendable &= CallDetail::IsListed(m_Session->m_Browse, to);
+        m_IsSendable &= m_Session && CallDetail::IsListed(m_Session->m_Browse, to);
     }
     void SetSortOrder(int& to, ZV_WS_SortOrder order)
     {
@@ -92,13 +95,13 @@ public:
     /// The status shall tell of the transport only: the service's response code stays in the record.
     void IgnoreResponseCode() { m_UsesResponseCode = false; }
 
-    /// The answer is looked for in the session's cache before the service is asked, and kept there when the service
-    /// says success. The key is made of all the arguments, numbers and texts.
+    /// The answer is looked for in the session's cache, under the function's name, before the service is asked, and
+    /// kept there when the service says success. The key is made of all the arguments, numbers and texts.
     template <class... Arguments>
-    void CacheAs(ZV_WS_CacheParam::CacheData kind, const char* table, const Arguments&... arguments)
+    void CacheAs(ZV_WS_CacheParam::CacheData kind, const Arguments&... arguments)
     {
         // Without memory for the key the answer is not cached.
-        WithinMemory([&] { m_Entry = {kind, table, arguments...}; });
+        WithinMemory([&] { m_Entry = {kind, m_Function + strlen("ZV_WS_"), arguments...}; });
     }
 
     /// Only when the call can be made.
@@ -153,11 +156,7 @@ public:
     ServiceCall(const char* function, const ZV_WS_Session* handle, Output* out) : ServiceCallBase(function, handle)
     {
         ZV_ASSERT(out != 0);
-        if constexpr (Records::kIsRecord<Output>) {
-            m_Tagged = WithinMemory([&] { Records::Tag(*out); });
-        } else {
-            *out = Output();
-        }
+        m_Tagged = WithinMemory([&] { Records::Empty(*out); });
     }
 
     /// The request.
@@ -175,7 +174,7 @@ public:
     template <class Convert, class = std::enable_if_t<!std::is_pointer_v<Convert>>>
     ZV_WS_Status Into(Convert convert)
     {
-        if (!m_IsSendable) return ZV_WS_Status_invalid_param;
+        if (!Accepts() || !m_IsSendable) return Refusal();
         auto& service = Op::Service(*m_Session);
         Outcome outcome;
         if (!WithinMemory([&] { Make(service, convert, outcome); }))
@@ -216,26 +215,23 @@ private:
     typename Op::Response m_Response;
 };
 
-/// A whole call of an operation without arguments, whose answer is kept in the cache when a table is named.
+/// A whole call of an operation without arguments, whose answer is kept in the cache among those of a kind when one is
+/// named.
 template <class Op, class Output>
-ZV_WS_Status Ask(const char* function, const ZV_WS_Session* handle, Output* out, ZV_WS_CacheParam::CacheData kind = {},
-                 const char* table = nullptr)
+ZV_WS_Status Ask(const char* function, const ZV_WS_Session* handle, Output* out, ZV_WS_CacheParam::CacheData kind = {})
 {
     ServiceCall<Op> call(function, handle, out);
-    if (!call.Accepts()) return call.Refusal();
-    if (table) call.CacheAs(kind, table, 0);
+    if (kind) call.CacheAs(kind, 0);
     return call.Into(out);
 }
 
-/// A whole call of an operation whose only argument is a number; `child` is the request's. Kept in the cache among the
-/// catalogue's answers when a table is named.
-template <class Op, class Output>
-ZV_WS_Status AskAbout(int Op::Request::*child, int id, const char* function, const ZV_WS_Session* handle, Output* out,
-                      const char* table = nullptr)
+/// Likewise of the operation whose request's only child is that number.
+template <class Request, class Output>
+ZV_WS_Status AskAbout(int Request::*child, int id, const char* function, const ZV_WS_Session* handle, Output* out,
+                      ZV_WS_CacheParam::CacheData kind = {})
 {
-    ServiceCall<Op> call(function, handle, out);
-    if (!call.Accepts()) return call.Refusal();
-    if (table) call.CacheAs(ZV_WS_CacheParam::CacheData_Metadata, table, id);
+    ServiceCall<decltype(Operation::Of(std::declval<Request*>()))> call(function, handle, out);
+    if (kind) call.CacheAs(kind, id);
     (call.operator->())->*child = id;
     return call.Into(out);
 }

@@ -271,12 +271,7 @@ template <class Output, class Use>
 ZV_WS_Status WithSession(const ZV_WS_Session* handle, Output* out, Use use)
 {
     ZV_ASSERT(out != 0);
-    return GuardCall([&] {
-        if constexpr (Records::kIsRecord<Output>) {
-            Records::Tag(*out);
-        } else {
-            *out = Output();
-        }
+    return Records::Fill(*out, [&] {
         if (!SessionOf(handle)) return ZV_WS_Status_invalid_param;
         return use(*handle->_pSessionImpl);
     });
@@ -350,8 +345,7 @@ void ZV_WS_abort(const ZV_WS_Session* handle)
 ZV_WS_Status ZV_WS_getVersion(ZV_WS_VersionInfo* version)
 {
     ZV_ASSERT(version != 0);
-    return GuardCall([&] {
-        Records::Tag(*version);
+    return Records::Fill(*version, [&] {
         version->Major = 1;
         version->Minor = 3;
         version->Revision = 1;

@@ -37,8 +37,7 @@ bool IsPath(const char* path)
 ZV_WS_Status ZV_WS_readSetting(const char* path, const char* key, bool protectedValue, ZV_WS_String* value)
 {
     ZV_ASSERT(value != 0);
-    return GuardCall([&] {
-        Records::Tag(*value);
+    return Records::Fill(*value, [&] {
         if (!IsPath(path) || !key) return ZV_WS_Status_invalid_param;
         ZVString text;
         const unsigned int result = CfgXMLFile(path).Read(key, text, protectedValue);

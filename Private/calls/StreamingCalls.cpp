@@ -8,7 +8,6 @@ ZV_WS_Status LocatePass(const char* function, ZV_WS_Session* handle, int passID,
                         ZV_WS_StreamingAssetLocationResponse* location)
 {
     ServiceCall<Op> call(function, handle, location);
-    if (!call.Accepts()) return call.Refusal();
     call->PassID = passID;
     call.SetEnum(call->FileProfile, fileProfile);
     return call.Into(location);
@@ -32,8 +31,7 @@ ZV_WS_Status ZV_WS_loadLastStreamingAssetLocation(ZV_WS_Session* handle, int pas
 ZV_WS_Status ZV_WS_getStreamingBonusAssetLocation(ZV_WS_Session* handle, int bonusAssetID,
                                                   ZV_WS_StreamingAssetLocationResponse* location)
 {
-    return AskAbout<Operation::getBonusAssetLocation>(&_ZV1__getBonusAssetLocation::BonusAssetID, bonusAssetID,
-                                                      __func__, handle, location);
+    return AskAbout(&_ZV1__getBonusAssetLocation::BonusAssetID, bonusAssetID, __func__, handle, location);
 }
 
 ZV_WS_Status ZV_WS_manageStreamingInstanceStatus(ZV_WS_Session* handle, const char* streamID, ZV_WS_StreamStatus status,
@@ -51,7 +49,6 @@ ZV_WS_Status ZV_WS_getTHXMediaDirector(ZV_WS_Session* handle, int passID, ZV_WS_
                                        ZV_WS_AudioProfile audioProfile, ZV_WS_THXMediaDirectorResponse* data)
 {
     ServiceCall<Operation::getTHXMediaDirector> call(__func__, handle, data);
-    if (!call.Accepts()) return call.Refusal();
     call.IgnoreResponseCode();
     call->PassID = passID;
     call.SetEnum(call->FileProfile, fileProfile);
@@ -64,7 +61,6 @@ ZV_WS_Status ZV_WS_getTHXMediaDirectorBonusAsset(ZV_WS_Session* handle, int bonu
                                                  ZV_WS_THXMediaDirectorResponse* data)
 {
     ServiceCall<Operation::getTHXMediaDirectorBonusAsset> call(__func__, handle, data);
-    if (!call.Accepts()) return call.Refusal();
     call.IgnoreResponseCode();
     call->BonusAssetID = bonusAssetID;
     call.SetEnum(call->FileProfile, fileProfile);

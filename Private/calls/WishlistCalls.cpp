@@ -18,7 +18,6 @@ ZV_WS_Status ChangeItem(const char* function, ZV_WS_Session* handle, int titleID
                         ZV_WS_StandardResponse* answer)
 {
     ServiceCall<Op> call(function, handle, answer);
-    if (!call.Accepts()) return call.Refusal();
     call->TitleID = titleID;
     const ZV_WS_Status status = call.Into(answer);
     const bool isKnown = call.change() == ServiceCallBase::Change::Made;
@@ -67,8 +66,8 @@ ZV_WS_Status ZV_WS_getWishlistItems(ZV_WS_Session* handle, ZV_WS_SortOrder sortO
 {
     ServiceCall<Operation::getWishlistItems> call(__func__, handle, items);
     if (!call.Accepts(IsPage(page))) return call.Refusal();
-    call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, kListTable, sortOrder, page->CurrentPageNumber,
-                 page->ItemsPerPage, typeFilter);
+    call.CacheAs(ZV_WS_CacheParam::CacheData_Userdata, sortOrder, page->CurrentPageNumber, page->ItemsPerPage,
+                 typeFilter);
     call.SetSortOrder(call->sortOrder, sortOrder);
     SetPage(call, *page);
     call.SetEnum(call->TitleType, typeFilter);
@@ -88,7 +87,6 @@ ZV_WS_Status ZV_WS_removeItemFromWishlist(ZV_WS_Session* handle, int titleID, ZV
 ZV_WS_Status ZV_WS_removeAllItemsFromWishlist(ZV_WS_Session* handle, ZV_WS_StandardResponse* answer)
 {
     ServiceCall<Operation::removeAllItemsFromWishList> call(__func__, handle, answer);
-    if (!call.Accepts()) return call.Refusal();
     const ZV_WS_Status status = call.Into(answer);
     DropStale(call, kListTable, [](CacheInterface& cache) { return cache.RemoveAllWishlistFlags(); });
     return status;
@@ -114,8 +112,7 @@ ZV_WS_Status ZV_WS_checkTitlesInWishlist(ZV_WS_Session* handle, const int* title
                                          ZV_WS_TitleTypeFilter typeFilter, ZV_WS_TitlesInWishlist* answers)
 {
     ZV_ASSERT(answers != 0);
-    return LogStatus(__func__, GuardCall([&] {
-                         Records::Tag(*answers);
+    return LogStatus(__func__, Records::Fill(*answers, [&] {
                          if (!SessionOf(handle) || !IsArray(titleIDs, count)) return ZV_WS_Status_invalid_param;
                          if (count == 0) return ZV_WS_Status_ok;
                          SessionImpl& session = *handle->_pSessionImpl;

@@ -5,6 +5,7 @@
 #include <new>
 #include <type_traits>
 
+#include "CallGuard.h"
 #include "ZV_WS_Records.h"
 
 namespace Records {
@@ -117,6 +118,28 @@ void Allocate(unsigned int& size, T*& elements, unsigned int count)
         for (unsigned int i = 0; i < count; ++i)
             Tag(elements[i]);
     }
+}
+
+/// Any output before it is filled: a record is emptied and tagged, a plain value becomes zero.
+template <class Output>
+void Empty(Output& output)
+{
+    if constexpr (kIsRecord<Output>) {
+        Tag(output);
+    } else {
+        output = Output();
+    }
+}
+
+/// The result of `call()`, before which the output is emptied; ZV_WS_Status_general_error when memory was
+/// exhausted in either. However it ends, a record can be released.
+template <class Output, class Call>
+ZV_WS_Status Fill(Output& output, Call&& call)
+{
+    return GuardCall([&] {
+        Empty(output);
+        return call();
+    });
 }
 
 }  // namespace Records

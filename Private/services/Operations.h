@@ -2,7 +2,8 @@
 // because it changes something there.
 //
 // Operation::X has the generated request and response of operation X, sends it, and finds the result in its answer. A
-// row's name is the operation's name on the wire.
+// row's name is the operation's name on the wire. Operation::Of, which is only declared, has the operation of a
+// request.
 #pragma once
 
 #include "Services.h"
@@ -19,7 +20,8 @@
             return services.service.name(&request, &response);                                \
         }                                                                                     \
         static const auto* Result(const Response& response) { return response.name##Result; } \
-    };
+    };                                                                                        \
+    name Of(const _ZV1__##name*);
 
 namespace Operation {
 

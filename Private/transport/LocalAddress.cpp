@@ -81,7 +81,7 @@ ZVString LocalAddressTowards(std::vector<Address> peers)
     peers.push_back(FarPeer(AF_INET));
     peers.push_back(FarPeer(AF_INET6));
     for (const Address& peer : peers) {
-        const ZVString own = SourceTowards(peer);
+        ZVString own = SourceTowards(peer);
         if (!own.empty()) return own;
     }
     return ZVString();

@@ -15,45 +15,45 @@ public:
 
     void Open(int64_t duration)
     {
-        m_duration = duration;
-        m_state = ZVPlayerLibAE::kStopped;
-        m_position = 0;
+        m_Duration = duration;
+        m_State = ZVPlayerLibAE::kStopped;
+        m_Position = 0;
     }
     void Close() { *this = PlaybackClock(); }
 
     State StateAt(Time now) const
     {
-        return m_state == ZVPlayerLibAE::kPlaying && PositionAt(now) == m_duration ? ZVPlayerLibAE::kEnded : m_state;
+        return m_State == ZVPlayerLibAE::kPlaying && PositionAt(now) == m_Duration ? ZVPlayerLibAE::kEnded : m_State;
     }
     int64_t PositionAt(Time now) const
     {
-        if (m_state != ZVPlayerLibAE::kPlaying) return m_position;
-        const auto played = std::chrono::duration_cast<std::chrono::milliseconds>(now - m_since).count();
-        return std::min(m_position + played, m_duration);
+        if (m_State != ZVPlayerLibAE::kPlaying) return m_Position;
+        const auto played = std::chrono::duration_cast<std::chrono::milliseconds>(now - m_Since).count();
+        return std::min(m_Position + played, m_Duration);
     }
-    int64_t Duration() const { return m_duration; }
+    int64_t Duration() const { return m_Duration; }
 
     // A movie is open for the rest.
     void PlayFrom(int64_t position, Time now)
     {
-        m_position = position;
-        m_since = now;
-        m_state = ZVPlayerLibAE::kPlaying;
+        m_Position = position;
+        m_Since = now;
+        m_State = ZVPlayerLibAE::kPlaying;
     }
     void Pause(Time now)
     {
-        m_position = PositionAt(now);
-        m_state = ZVPlayerLibAE::kPaused;
+        m_Position = PositionAt(now);
+        m_State = ZVPlayerLibAE::kPaused;
     }
     void Stop()
     {
-        m_position = 0;
-        m_state = ZVPlayerLibAE::kStopped;
+        m_Position = 0;
+        m_State = ZVPlayerLibAE::kStopped;
     }
 
 private:
-    State m_state = ZVPlayerLibAE::kNoPlayer;
-    int64_t m_duration = 0;
-    int64_t m_position = 0;  // where it rests; while it plays, where it was at m_since
-    Time m_since;
+    State m_State = ZVPlayerLibAE::kNoPlayer;
+    int64_t m_Duration = 0;
+    int64_t m_Position = 0;  // where it rests; while it plays, where it was at m_Since
+    Time m_Since;
 };

@@ -15,28 +15,28 @@ void* HeapObjectOf(const ASValue& value)
 class CurrentMethod {
 public:
     CurrentMethod(ScriptEngine& engine, std::string name)
-        : m_engine(engine), m_outer(engine.SetCurrentMethod(std::move(name)))
+        : m_Engine(engine), m_Outer(engine.SetCurrentMethod(std::move(name)))
     {}
-    ~CurrentMethod() { m_engine.SetCurrentMethod(std::move(m_outer)); }
+    ~CurrentMethod() { m_Engine.SetCurrentMethod(std::move(m_Outer)); }
     CurrentMethod(const CurrentMethod&) = delete;
     CurrentMethod& operator=(const CurrentMethod&) = delete;
 
 private:
-    ScriptEngine& m_engine;
-    std::string m_outer;
+    ScriptEngine& m_Engine;
+    std::string m_Outer;
 };
 
 }  // namespace
 
 Extensions::Extensions(ScriptEngine& engine, StageWindow& window, const std::vector<ExtensionClass>& classes)
-    : m_engine(engine),
-      m_window(window),
-      m_classes(classes),
-      m_constructors(classes.size()),
-      m_staticInstances(classes.size())
+    : m_Engine(engine),
+      m_Window(window),
+      m_Classes(classes),
+      m_Constructors(classes.size()),
+      m_StaticInstances(classes.size())
 {
-    m_engine.SetExtensions(this);
-    for (size_t i = 0; i < m_classes.size(); ++i) {
+    m_Engine.SetExtensions(this);
+    for (size_t i = 0; i < m_Classes.size(); ++i) {
         Define(i);
     }
 }
@@ -44,20 +44,20 @@ Extensions::Extensions(ScriptEngine& engine, StageWindow& window, const std::vec
 Extensions::~Extensions()
 {
     DestructAll();
-    m_constructors.clear();
-    m_engine.SetExtensions(nullptr);
+    m_Constructors.clear();
+    m_Engine.SetExtensions(nullptr);
 }
 
 // ---- Script classes
 
 void Extensions::Define(size_t classIndex)
 {
-    const ExtensionClass& extension = m_classes[classIndex];
-    const int construct = m_engine.AddNative([this, &extension](NativeCall& call) { Construct(extension, call); });
-    const int finalize = m_engine.AddNative([this](NativeCall& call) {
+    const ExtensionClass& extension = m_Classes[classIndex];
+    const int construct = m_Engine.AddNative([this, &extension](NativeCall& call) { Construct(extension, call); });
+    const int finalize = m_Engine.AddNative([this](NativeCall& call) {
         if (!call.arguments.empty() && call.arguments[0].IsObject()) Destruct(HeapObjectOf(call.arguments[0]));
     });
-    m_engine.Evaluate(
+    m_Engine.Evaluate(
         [&](duk_context* pContext) {
             ScriptEngine::PushNative(pContext, construct);
             duk_push_object(pContext);
@@ -69,17 +69,17 @@ void Extensions::Define(size_t classIndex)
             duk_dup(pContext, -1);
             ScriptEngine::PutGlobal(pContext, extension.name.c_str());
         },
-        m_constructors[classIndex]);
+        m_Constructors[classIndex]);
     DefineMethods(classIndex);
 }
 
 void Extensions::DefineMethods(size_t classIndex)
 {
-    for (const ASExtensionClass::Method& method : m_classes[classIndex].methods) {
+    for (const ASExtensionClass::Method& method : m_Classes[classIndex].methods) {
         const int native =
-            m_engine.AddNative([this, classIndex, &method](NativeCall& call) { Invoke(classIndex, method, call); });
-        m_engine.Execute([&](duk_context* pContext) {
-            ScriptEngine::PushValue(pContext, m_constructors[classIndex]);
+            m_Engine.AddNative([this, classIndex, &method](NativeCall& call) { Invoke(classIndex, method, call); });
+        m_Engine.Execute([&](duk_context* pContext) {
+            ScriptEngine::PushValue(pContext, m_Constructors[classIndex]);
             duk_get_prop_string(pContext, -1, "prototype");
             ScriptEngine::PushNative(pContext, native);
             duk_dup(pContext, -1);
@@ -93,7 +93,7 @@ void Extensions::DefineMethods(size_t classIndex)
 
 void Extensions::Invoke(size_t classIndex, const ASExtensionClass::Method& method, NativeCall& call)
 {
-    const ExtensionClass& extension = m_classes[classIndex];
+    const ExtensionClass& extension = m_Classes[classIndex];
     const std::string name = extension.name + "." + method.m_pName;
     ASValue self = call.self;
     if (method.m_type == ASExtensionClass::Method::kStaticFunction && !Find(self, extension)) {
@@ -104,19 +104,19 @@ void Extensions::Invoke(size_t classIndex, const ASExtensionClass::Method& metho
         call.error = name + ": called on something that is no live instance of the class";
         return;
     }
-    const CurrentMethod running(m_engine, name);
-    (pInstance->pNative->*method.m_function)(&m_window, *self.GetObject(), call.arguments, call.result);
+    const CurrentMethod running(m_Engine, name);
+    (pInstance->pNative->*method.m_function)(&m_Window, *self.GetObject(), call.arguments, call.result);
 }
 
 // The instance on which static functions run that are called on the class; undefined when it cannot be constructed.
 ASValue Extensions::StaticInstance(size_t classIndex)
 {
-    ASValue& instance = m_staticInstances[classIndex];
+    ASValue& instance = m_StaticInstances[classIndex];
     if (!instance.IsObject()) {
         ASValue made;
-        m_engine.Evaluate(
+        m_Engine.Evaluate(
             [&](duk_context* pContext) {
-                ScriptEngine::PushValue(pContext, m_constructors[classIndex]);
+                ScriptEngine::PushValue(pContext, m_Constructors[classIndex]);
                 duk_new(pContext, 0);
             },
             made);
@@ -129,15 +129,15 @@ ASValue Extensions::StaticInstance(size_t classIndex)
 
 const Extensions::Instance* Extensions::Find(const ASValue& value, const ExtensionClass& extension) const
 {
-    const auto found = m_instances.find(HeapObjectOf(value));
-    const bool usable = found != m_instances.end() && found->second.pClass == &extension && found->second.pNative;
+    const auto found = m_Instances.find(HeapObjectOf(value));
+    const bool usable = found != m_Instances.end() && found->second.pClass == &extension && found->second.pNative;
     return usable ? &found->second : nullptr;
 }
 
 ASExtensionClass* Extensions::InstanceOf(void* pHeapObject)
 {
-    const auto found = m_instances.find(pHeapObject);
-    return found != m_instances.end() ? found->second.pNative : nullptr;
+    const auto found = m_Instances.find(pHeapObject);
+    return found != m_Instances.end() ? found->second.pNative : nullptr;
 }
 
 void Extensions::Construct(const ExtensionClass& extension, NativeCall& call)
@@ -147,40 +147,40 @@ void Extensions::Construct(const ExtensionClass& extension, NativeCall& call)
         return;
     }
     void* const pHeapObject = HeapObjectOf(call.self);
-    m_instances[pHeapObject] = Instance{&extension, nullptr, ++m_counter, false};
+    m_Instances[pHeapObject] = Instance{&extension, nullptr, ++m_Counter, false};
     ASExtensionClass* pNative;
     {
-        const CurrentMethod running(m_engine, extension.name);
-        pNative = extension.construct(&m_window, *call.self.GetObject(), call.arguments);
+        const CurrentMethod running(m_Engine, extension.name);
+        pNative = extension.construct(&m_Window, *call.self.GetObject(), call.arguments);
     }
     if (pNative) {
-        m_instances[pHeapObject].pNative = pNative;
+        m_Instances[pHeapObject].pNative = pNative;
         return;
     }
-    m_instances.erase(pHeapObject);
+    m_Instances.erase(pHeapObject);
     StopUpdates(*static_cast<ScriptObject*>(call.self.GetObject()));
     call.error = extension.name + ": no instance could be constructed";
 }
 
 void Extensions::Destruct(void* pHeapObject)
 {
-    const auto found = m_instances.find(pHeapObject);
-    if (found == m_instances.end() || !found->second.pNative || found->second.destructing) return;
+    const auto found = m_Instances.find(pHeapObject);
+    if (found == m_Instances.end() || !found->second.pNative || found->second.destructing) return;
     found->second.destructing = true;
-    ScriptObject* pObject = m_engine.Wrap(pHeapObject);
+    ScriptObject* pObject = m_Engine.Wrap(pHeapObject);
     StopUpdates(*pObject);
-    found->second.pClass->destruct(&m_window, *pObject);
-    m_instances.erase(found);
+    found->second.pClass->destruct(&m_Window, *pObject);
+    m_Instances.erase(found);
     pObject->Release();
 }
 
 void Extensions::DestructAll()
 {
-    m_staticInstances.assign(m_classes.size(), ASValue());
+    m_StaticInstances.assign(m_Classes.size(), ASValue());
     for (;;) {
         void* pYoungest = nullptr;
         uint64_t number = 0;
-        for (const auto& entry : m_instances) {
+        for (const auto& entry : m_Instances) {
             const bool candidate = entry.second.pNative && !entry.second.destructing;
             if (candidate && entry.second.number > number) {
                 pYoungest = entry.first;
@@ -196,36 +196,36 @@ void Extensions::DestructAll()
 
 void Extensions::StartUpdates(ScriptObject& object)
 {
-    const bool registered = std::any_of(m_updates.begin(), m_updates.end(),
+    const bool registered = std::any_of(m_Updates.begin(), m_Updates.end(),
                                         [&](const Registration& update) { return update.pObject == &object; });
-    const auto instance = m_instances.find(object.HeapObject());
-    if (registered || instance == m_instances.end() || instance->second.destructing) return;
+    const auto instance = m_Instances.find(object.HeapObject());
+    if (registered || instance == m_Instances.end() || instance->second.destructing) return;
     object.AddRef();
-    m_updates.push_back(Registration{&object, ++m_counter});
+    m_Updates.push_back(Registration{&object, ++m_Counter});
 }
 
 void Extensions::StopUpdates(ScriptObject& object)
 {
-    const auto found = std::find_if(m_updates.begin(), m_updates.end(),
+    const auto found = std::find_if(m_Updates.begin(), m_Updates.end(),
                                     [&](const Registration& update) { return update.pObject == &object; });
-    if (found == m_updates.end()) return;
-    m_updates.erase(found);
+    if (found == m_Updates.end()) return;
+    m_Updates.erase(found);
     object.Release();
 }
 
 void Extensions::Update(const std::function<bool()>& ended)
 {
     // Registrations made meanwhile have higher numbers and wait for the next tick.
-    const uint64_t last = m_counter;
+    const uint64_t last = m_Counter;
     for (uint64_t done = 0; !ended();) {
-        const auto next = std::find_if(m_updates.begin(), m_updates.end(),
+        const auto next = std::find_if(m_Updates.begin(), m_Updates.end(),
                                        [&](const Registration& update) { return update.number > done; });
-        if (next == m_updates.end() || next->number > last) break;
+        if (next == m_Updates.end() || next->number > last) break;
         done = next->number;
         const ASValue held = ASValue::Object(next->pObject);
-        const auto instance = m_instances.find(next->pObject->HeapObject());
-        if (instance == m_instances.end() || !instance->second.pNative) continue;
-        const CurrentMethod running(m_engine, instance->second.pClass->name + ".OnUpdate");
-        instance->second.pNative->OnUpdate(&m_window, *held.GetObject());
+        const auto instance = m_Instances.find(next->pObject->HeapObject());
+        if (instance == m_Instances.end() || !instance->second.pNative) continue;
+        const CurrentMethod running(m_Engine, instance->second.pClass->name + ".OnUpdate");
+        instance->second.pNative->OnUpdate(&m_Window, *held.GetObject());
     }
 }

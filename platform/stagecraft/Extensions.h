@@ -1,6 +1,6 @@
 // The registered extension classes inside one movie: their script classes, instances and update calls.
 //
-// Invariants: an instance is in m_instances from before its ConstructInstance until after its DestructInstance, which
+// Invariants: an instance is in m_Instances from before its ConstructInstance until after its DestructInstance, which
 // is called once. An object with an update registration holds a reference, so it is not collected.
 //
 // Threads: main thread only.
@@ -31,7 +31,7 @@ public:
     Extensions(const Extensions&) = delete;
     Extensions& operator=(const Extensions&) = delete;
 
-    bool HasUpdates() const { return !m_updates.empty(); }
+    bool HasUpdates() const { return !m_Updates.empty(); }
     // Calls OnUpdate of every object that is registered now, in the order of registration, until `ended` says so.
     void Update(const std::function<bool()>& ended);
 
@@ -62,12 +62,12 @@ private:
     ae::stagecraft::ASValue StaticInstance(size_t classIndex);
     const Instance* Find(const ae::stagecraft::ASValue& value, const ExtensionClass& extension) const;
 
-    ScriptEngine& m_engine;
-    ae::stagecraft::StageWindow& m_window;
-    const std::vector<ExtensionClass>& m_classes;
-    std::vector<ae::stagecraft::ASValue> m_constructors;     // of each class
-    std::vector<ae::stagecraft::ASValue> m_staticInstances;  // of each class; undefined until one is needed
-    std::map<void*, Instance> m_instances;                   // by the engine's address of the script object
-    std::vector<Registration> m_updates;
-    uint64_t m_counter = 0;
+    ScriptEngine& m_Engine;
+    ae::stagecraft::StageWindow& m_Window;
+    const std::vector<ExtensionClass>& m_Classes;
+    std::vector<ae::stagecraft::ASValue> m_Constructors;     // of each class
+    std::vector<ae::stagecraft::ASValue> m_StaticInstances;  // of each class; undefined until one is needed
+    std::map<void*, Instance> m_Instances;                   // by the engine's address of the script object
+    std::vector<Registration> m_Updates;
+    uint64_t m_Counter = 0;
 };

@@ -13,11 +13,11 @@ namespace {
 
 class KernelMutex final : public IAEKernel::Mutex {
 public:
-    void Lock() override { m_mutex.lock(); }
-    void Unlock() override { m_mutex.unlock(); }
+    void Lock() override { m_Mutex.lock(); }
+    void Unlock() override { m_Mutex.unlock(); }
 
 private:
-    std::mutex m_mutex;
+    std::mutex m_Mutex;
 };
 
 class Kernel final : public IAEKernel {

@@ -23,26 +23,26 @@ class Movie final : public ae::stagecraft::StageWindow {
 public:
     Movie(MovieOptions options, std::string text, const std::vector<ExtensionClass>& classes, StopRequest& stop);
 
-    void EndMovie() override { m_ended = true; }
+    void EndMovie() override { m_Ended = true; }
 
     // Blocks until the movie has ended. false when a script error at the top level ended it, and when script code had
     // to be broken off.
     bool Run();
 
 private:
-    bool Ended() const { return m_ended || !m_engine.Alive() || m_stop.Raised(); }
-    bool Idle() const { return m_timers.empty() && !m_extensions.HasUpdates(); }
+    bool Ended() const { return m_Ended || !m_Engine.Alive() || m_Stop.Raised(); }
+    bool Idle() const { return m_Timers.empty() && !m_Extensions.HasUpdates(); }
     void DefineGlobals();
     void DefineFlashVars();
     void DefineTimer(const char* pName, bool repeats);
     void Tick();
 
-    const MovieOptions m_options;
-    const std::string m_text;
-    StopRequest& m_stop;
-    bool m_ended = false;
+    const MovieOptions m_Options;
+    const std::string m_Text;
+    StopRequest& m_Stop;
+    bool m_Ended = false;
     // The order counts: values of the timers go before the instances, both before the engine.
-    ScriptEngine m_engine;
-    Extensions m_extensions;
-    Timers m_timers;
+    ScriptEngine m_Engine;
+    Extensions m_Extensions;
+    Timers m_Timers;
 };

@@ -96,7 +96,7 @@ AEError Runtime::RegisterExtensionClass(const char* pClassName, GetMethodsFuncti
         return Failed(AEError::InvalidParameters);
     }
     ExtensionClass extension{pClassName, {}, construct, destruct};
-    const bool known = std::any_of(m_classes.begin(), m_classes.end(),
+    const bool known = std::any_of(m_Classes.begin(), m_Classes.end(),
                                    [&](const ExtensionClass& other) { return other.name == extension.name; });
     if (known) return Failed(AEError::InvalidParameters);
     firesEvents();  // this runtime has no events to fire
@@ -104,14 +104,14 @@ AEError Runtime::RegisterExtensionClass(const char* pClassName, GetMethodsFuncti
     for (const ASExtensionClass::Method& method : extension.methods) {
         if (!method.m_pName || !*method.m_pName || !method.m_function) return Failed(AEError::InvalidParameters);
     }
-    m_classes.push_back(std::move(extension));
+    m_Classes.push_back(std::move(extension));
     return Ok();
 }
 
 AEError Runtime::CreateAndConfigureStageWindowSet(AEArray<StageWindow*>& set, int argc, const char* const* argv,
                                                   int configure)
 {
-    if (m_movie) return Failed(AEError::Usage);
+    if (m_Movie) return Failed(AEError::Usage);
     if (!argv || argc < 1 || std::find(argv, argv + argc, nullptr) != argv + argc) {
         return Failed(AEError::InvalidParameters);
     }
@@ -119,37 +119,37 @@ AEError Runtime::CreateAndConfigureStageWindowSet(AEArray<StageWindow*>& set, in
     std::string text;
     if (!ReadMovie(options.path, text)) return Failed(AEError::NotFound);
 
-    m_movieClasses = m_classes;
-    m_movie = std::make_unique<Movie>(std::move(options), std::move(text), m_movieClasses, m_stop);
-    m_wasRun = false;
-    m_stop.Reset();
-    set.Append(m_movie.get());
+    m_MovieClasses = m_Classes;
+    m_Movie = std::make_unique<Movie>(std::move(options), std::move(text), m_MovieClasses, m_Stop);
+    m_WasRun = false;
+    m_Stop.Reset();
+    set.Append(m_Movie.get());
     return Ok();
 }
 
 bool Runtime::Holds(const AEArray<StageWindow*>& set) const
 {
-    return m_movie && std::find(set.begin(), set.end(), m_movie.get()) != set.end();
+    return m_Movie && std::find(set.begin(), set.end(), m_Movie.get()) != set.end();
 }
 
 AEError Runtime::RunStageWindowSet(AEArray<StageWindow*>& set)
 {
-    if (!Holds(set) || m_wasRun) return Failed(AEError::Usage);
-    m_wasRun = true;
+    if (!Holds(set) || m_WasRun) return Failed(AEError::Usage);
+    m_WasRun = true;
     LastLine::MovieBegins();
-    const bool succeeded = m_movie->Run();
-    LastLine::MovieEnds(m_stop.Raised());
+    const bool succeeded = m_Movie->Run();
+    LastLine::MovieEnds(m_Stop.Raised());
     return succeeded ? Ok() : Failed(AEError::Generic);
 }
 
 AEError Runtime::DestroyStageWindowSet(AEArray<StageWindow*>& set)
 {
-    if (Holds(set)) m_movie.reset();
+    if (Holds(set)) m_Movie.reset();
     set.RemoveAll();
     return Ok();
 }
 
 void Runtime::SendRequest(uint32_t code)
 {
-    if (code == kRequestStop) m_stop.Raise();
+    if (code == kRequestStop) m_Stop.Raise();
 }

@@ -23,10 +23,10 @@ public:
 private:
     bool Holds(const AEArray<ae::stagecraft::StageWindow*>& set) const;
 
-    std::vector<ExtensionClass> m_classes;
-    StopRequest m_stop;
-    std::unique_ptr<Movie> m_movie;
+    std::vector<ExtensionClass> m_Classes;
+    StopRequest m_Stop;
+    std::unique_ptr<Movie> m_Movie;
     // The classes as they were when the movie was created: later registrations must not move what it refers to.
-    std::vector<ExtensionClass> m_movieClasses;
-    bool m_wasRun = false;
+    std::vector<ExtensionClass> m_MovieClasses;
+    bool m_WasRun = false;
 };

@@ -107,19 +107,19 @@ BreakTimer::BreakTimer()
     action.sa_sigaction = OnBreakSignal;
     action.sa_flags = SA_SIGINFO | SA_RESTART | SA_NODEFER;
     sigemptyset(&action.sa_mask);
-    sigaction(BreakSignal(), &action, &m_previous);
+    sigaction(BreakSignal(), &action, &m_Previous);
 
     sigevent event{};
     event.sigev_notify = SIGEV_THREAD_ID;
     event.sigev_signo = BreakSignal();
     event._sigev_un._tid = static_cast<pid_t>(syscall(SYS_gettid));
-    m_created = timer_create(CLOCK_MONOTONIC, &event, &m_timer) == 0;
+    m_Created = timer_create(CLOCK_MONOTONIC, &event, &m_Timer) == 0;
 }
 
 BreakTimer::~BreakTimer()
 {
-    if (m_created) timer_delete(m_timer);
-    sigaction(BreakSignal(), &m_previous, nullptr);
+    if (m_Created) timer_delete(m_Timer);
+    sigaction(BreakSignal(), &m_Previous, nullptr);
 }
 
 bool BreakTimer::Start(std::chrono::milliseconds delay)
@@ -128,5 +128,5 @@ bool BreakTimer::Start(std::chrono::milliseconds delay)
         return timespec{static_cast<time_t>(time.count() / 1000), static_cast<long>(time.count() % 1000 * 1000000)};
     };
     const itimerspec when{toTimespec(kTryAgain), toTimespec(delay)};
-    return m_created && timer_settime(m_timer, 0, &when, nullptr) == 0;
+    return m_Created && timer_settime(m_Timer, 0, &when, nullptr) == 0;
 }

@@ -44,7 +44,7 @@ public:
     bool Start(std::chrono::milliseconds delay);
 
 private:
-    timer_t m_timer{};
-    bool m_created = false;
-    struct sigaction m_previous {};
+    timer_t m_Timer{};
+    bool m_Created = false;
+    struct sigaction m_Previous {};
 };

@@ -36,8 +36,8 @@ ScriptEngine& EngineOf(duk_context* pContext)
 
 ScriptEngine::ScriptEngine()
 {
-    m_pContext = duk_create_heap(Allocate, Reallocate, Free, this, OnFatal);
-    if (!m_pContext) OnFatal(nullptr, "out of memory");
+    m_PContext = duk_create_heap(Allocate, Reallocate, Free, this, OnFatal);
+    if (!m_PContext) OnFatal(nullptr, "out of memory");
     Execute([](duk_context* pContext) {
         duk_push_heap_stash(pContext);
         duk_push_array(pContext);
@@ -50,13 +50,13 @@ ScriptEngine::ScriptEngine()
 
 ScriptEngine::~ScriptEngine()
 {
-    for (const auto& entry : m_objects) {
+    for (const auto& entry : m_Objects) {
         entry.second->Detach();
     }
-    m_objects.clear();
-    m_natives.clear();  // finalizers still run
-    if (m_alive) duk_destroy_heap(m_pContext);
-    for (Block* pBlock = m_blocks.pNext; pBlock != &m_blocks;) {
+    m_Objects.clear();
+    m_Natives.clear();  // finalizers still run
+    if (m_Alive) duk_destroy_heap(m_PContext);
+    for (Block* pBlock = m_Blocks.pNext; pBlock != &m_Blocks;) {
         free(std::exchange(pBlock, pBlock->pNext));
     }
 }
@@ -76,7 +76,7 @@ void* ScriptEngine::Reallocate(void* pEngine, void* pOld, duk_size_t size)
     auto* pBlock = static_cast<Block*>(realloc(pOldBlock, sizeof(Block) + size));
     if (!pBlock) return nullptr;
     if (!pOldBlock) {
-        Block& anchor = static_cast<ScriptEngine*>(pEngine)->m_blocks;
+        Block& anchor = static_cast<ScriptEngine*>(pEngine)->m_Blocks;
         pBlock->pPrevious = &anchor;
         pBlock->pNext = anchor.pNext;
     }
@@ -103,60 +103,60 @@ bool ScriptEngine::TryRaw(duk_safe_call_function function, void* pData)
         duk_safe_call_function function;
         void* pData;
         duk_int_t result;
-    } call{m_pContext, function, pData, DUK_EXEC_ERROR};
-    if (!m_alive) return false;
+    } call{m_PContext, function, pData, DUK_EXEC_ERROR};
+    if (!m_Alive) return false;
 
-    m_alive = EnterScript(
+    m_Alive = EnterScript(
         [](void* pCall) {
             Call& call = *static_cast<Call*>(pCall);
             if (!duk_check_stack(call.pContext, kStackRoom)) OnFatal(nullptr, "out of memory");
             call.result = duk_safe_call(call.pContext, call.function, call.pData, 0, 1);
         },
         &call);
-    return m_alive && call.result == DUK_EXEC_SUCCESS;
+    return m_Alive && call.result == DUK_EXEC_SUCCESS;
 }
 
 void ScriptEngine::Pop()
 {
-    if (m_alive)
-        m_alive = EnterScript([](void* pContext) { duk_pop(static_cast<duk_context*>(pContext)); }, m_pContext);
+    if (m_Alive)
+        m_Alive = EnterScript([](void* pContext) { duk_pop(static_cast<duk_context*>(pContext)); }, m_PContext);
 }
 
 bool ScriptEngine::Take(bool succeeded, ASValue& result)
 {
     ASValue value;
-    if (m_alive && succeeded) {
+    if (m_Alive && succeeded) {
         ReadValue(-1, value);
         Pop();
-    } else if (m_alive) {
+    } else if (m_Alive) {
         ReportError();
     }
     result = std::move(value);
-    return m_alive && succeeded;
+    return m_Alive && succeeded;
 }
 
 void ScriptEngine::ReadValue(duk_idx_t index, ASValue& value)
 {
-    switch (duk_get_type(m_pContext, index)) {
+    switch (duk_get_type(m_PContext, index)) {
         case DUK_TYPE_NULL:
             value = ASValue::Null();
             break;
         case DUK_TYPE_BOOLEAN:
-            value = ASValue::Boolean(duk_get_boolean(m_pContext, index));
+            value = ASValue::Boolean(duk_get_boolean(m_PContext, index));
             break;
         case DUK_TYPE_NUMBER:
-            value = ASValue::Number(duk_get_number(m_pContext, index));
+            value = ASValue::Number(duk_get_number(m_PContext, index));
             break;
         case DUK_TYPE_STRING: {
-            if (duk_is_symbol(m_pContext, index)) break;
+            if (duk_is_symbol(m_PContext, index)) break;
             duk_size_t length;
-            const char* pText = duk_get_lstring(m_pContext, index, &length);
+            const char* pText = duk_get_lstring(m_PContext, index, &length);
             const std::string text = Utf8FromScriptText(pText, length);
             value = ASValue::String(AEString(text.data(), text.size()));
             break;
         }
         default:
-            if (void* pHeapObject = duk_get_heapptr(m_pContext, index)) {
+            if (void* pHeapObject = duk_get_heapptr(m_PContext, index)) {
                 ScriptObject* pObject = Wrap(pHeapObject);
                 value = ASValue::Object(pObject);
                 pObject->Release();
@@ -169,8 +169,8 @@ void ScriptEngine::ReportError()
     // Reading an error can run script code, which can raise again.
     const auto describe = [this](duk_context* pContext) {
         const duk_idx_t error = duk_get_top_index(pContext);
-        const char* pFile = m_throwFile;
-        int line = m_throwLine;
+        const char* pFile = m_ThrowFile;
+        int line = m_ThrowLine;
         if (duk_is_error(pContext, error)) {
             duk_get_prop_string(pContext, error, "fileName");
             duk_get_prop_string(pContext, error, "lineNumber");
@@ -186,28 +186,28 @@ void ScriptEngine::ReportError()
     };
     ASValue text;
     const bool described = Try(describe);
-    if (m_alive && described) ReadValue(-1, text);
+    if (m_Alive && described) ReadValue(-1, text);
     Pop();
     Pop();
     LastLine::ScriptError();
     fprintf(stderr, "script error: %s%s%s\n", described ? text.GetString().c_str() : "an error without description",
-            m_currentMethod.empty() ? "" : ", called by ", m_currentMethod.c_str());
+            m_CurrentMethod.empty() ? "" : ", called by ", m_CurrentMethod.c_str());
 }
 
 // Duktape.errThrow: remembers which line of a script throws, and leaves the thrown value as it is.
 duk_ret_t ScriptEngine::OnThrow(duk_context* pContext)
 {
     ScriptEngine& engine = EngineOf(pContext);
-    engine.m_throwLine = 0;
-    for (duk_int_t level = -2; engine.m_throwLine <= 0; --level) {
+    engine.m_ThrowLine = 0;
+    for (duk_int_t level = -2; engine.m_ThrowLine <= 0; --level) {
         duk_inspect_callstack_entry(pContext, level);
         if (!duk_is_object(pContext, -1)) break;
         duk_get_prop_string(pContext, -1, "lineNumber");
         duk_get_prop_string(pContext, -2, "function");
         duk_get_prop_string(pContext, -1, "fileName");
         const char* pFile = duk_get_string_default(pContext, -1, "");
-        snprintf(engine.m_throwFile, sizeof(engine.m_throwFile), "%s", pFile);
-        engine.m_throwLine = duk_get_int(pContext, -3);
+        snprintf(engine.m_ThrowFile, sizeof(engine.m_ThrowFile), "%s", pFile);
+        engine.m_ThrowLine = duk_get_int(pContext, -3);
         duk_set_top(pContext, 1);
     }
     duk_set_top(pContext, 1);
@@ -308,8 +308,8 @@ void ScriptEngine::PushNative(duk_context* pContext, int native)
 
 int ScriptEngine::AddNative(NativeFunction function)
 {
-    m_natives.push_back(std::move(function));
-    return static_cast<int>(m_natives.size()) - 1;
+    m_Natives.push_back(std::move(function));
+    return static_cast<int>(m_Natives.size()) - 1;
 }
 
 bool ScriptEngine::DefineGlobal(const char* pName, NativeFunction function)
@@ -381,21 +381,21 @@ bool ScriptEngine::ToText(const ASValue& value, AEString& text)
 
 ScriptObject* ScriptEngine::Wrap(void* pHeapObject)
 {
-    const auto known = m_objects.find(pHeapObject);
-    if (known != m_objects.end()) {
+    const auto known = m_Objects.find(pHeapObject);
+    if (known != m_Objects.end()) {
         known->second->AddRef();
         return known->second;
     }
     auto* pObject = new ScriptObject(*this, pHeapObject);
-    m_objects[pHeapObject] = pObject;
-    if (m_freeReferences.empty()) m_freeReferences.push_back(m_referenceCount++);
-    pObject->m_slot = m_freeReferences.back();
-    m_freeReferences.pop_back();
+    m_Objects[pHeapObject] = pObject;
+    if (m_FreeReferences.empty()) m_FreeReferences.push_back(m_ReferenceCount++);
+    pObject->m_Slot = m_FreeReferences.back();
+    m_FreeReferences.pop_back();
     Execute([&](duk_context* pContext) {
         duk_push_heap_stash(pContext);
         duk_get_prop_string(pContext, -1, kReferences);
         duk_push_heapptr(pContext, pHeapObject);
-        duk_put_prop_index(pContext, -2, pObject->m_slot);
+        duk_put_prop_index(pContext, -2, pObject->m_Slot);
     });
     return pObject;
 }
@@ -403,14 +403,14 @@ ScriptObject* ScriptEngine::Wrap(void* pHeapObject)
 void ScriptEngine::Forget(ScriptObject& object)
 {
     // First off the list: giving the reference back can finalize the object, which takes a new one.
-    m_objects.erase(object.HeapObject());
+    m_Objects.erase(object.HeapObject());
     Execute([&](duk_context* pContext) {
         duk_push_heap_stash(pContext);
         duk_get_prop_string(pContext, -1, kReferences);
         duk_push_undefined(pContext);
-        duk_put_prop_index(pContext, -2, object.m_slot);
+        duk_put_prop_index(pContext, -2, object.m_Slot);
     });
-    m_freeReferences.push_back(object.m_slot);
+    m_FreeReferences.push_back(object.m_Slot);
 }
 
 // ---- Calls out of the engine
@@ -424,10 +424,10 @@ duk_ret_t ScriptEngine::NativeEntry(duk_context* pContext)
 bool ScriptEngine::RunNative(duk_context* pContext)
 {
     ScriptEntry* pEntry = EnterNative();
-    duk_context* pOuterContext = std::exchange(m_pContext, pContext);
+    duk_context* pOuterContext = std::exchange(m_PContext, pContext);
     const bool succeeded = CallNative(pContext);
-    m_pContext = pOuterContext;
-    LeaveNative(pEntry, !m_alive);
+    m_PContext = pOuterContext;
+    LeaveNative(pEntry, !m_Alive);
     return succeeded;
 }
 
@@ -440,15 +440,15 @@ bool ScriptEngine::CallNative(duk_context* pContext)
     const duk_idx_t count = duk_get_top(pContext);
     duk_push_this(pContext);
     ReadValue(count, call.self);
-    for (duk_idx_t i = 0; i < count && m_alive; ++i) {
+    for (duk_idx_t i = 0; i < count && m_Alive; ++i) {
         ASValue argument;
         ReadValue(i, argument);
         call.arguments.Append(std::move(argument));
     }
     Pop();
-    if (!m_alive) return false;
+    if (!m_Alive) return false;
 
-    if (native < m_natives.size()) m_natives[native](call);
+    if (native < m_Natives.size()) m_Natives[native](call);
 
     if (call.error.empty()) {
         const auto pushResult = [&](duk_context* pTarget) { PushValue(pTarget, call.result); };

@@ -4,7 +4,7 @@
 // what runs there must own nothing that has to be destroyed. Native functions are plain C++ on the other side of
 // NativeEntry, which alone turns their errors into script errors.
 //
-// Invariant: a ScriptObject with references is listed in m_objects, and the engine's object behind it is held in the
+// Invariant: a ScriptObject with references is listed in m_Objects, and the engine's object behind it is held in the
 // table of references, so that its address stays valid and stands for its identity.
 //
 // Threads: main thread only.
@@ -51,15 +51,15 @@ public:
     ScriptEngine& operator=(const ScriptEngine&) = delete;
 
     // false once script code was broken off: every operation then fails.
-    bool Alive() const { return m_alive; }
+    bool Alive() const { return m_Alive; }
 
     // Whether native code may call script functions.
-    bool Running() const { return m_running; }
-    void SetRunning(bool running) { m_running = running; }
+    bool Running() const { return m_Running; }
+    void SetRunning(bool running) { m_Running = running; }
 
     // Null until set, and null again while the registry goes.
-    ExtensionRegistry* Extensions() const { return m_pExtensions; }
-    void SetExtensions(ExtensionRegistry* pExtensions) { m_pExtensions = pExtensions; }
+    ExtensionRegistry* Extensions() const { return m_PExtensions; }
+    void SetExtensions(ExtensionRegistry* pExtensions) { m_PExtensions = pExtensions; }
 
     // Runs `body`, a function of the engine's context that leaves one value on the stack, and takes that value. false,
     // and undefined, after a script error, which is reported.
@@ -104,7 +104,7 @@ public:
     bool ToText(const ae::stagecraft::ASValue& value, AEString& text);
 
     // The native method that runs, for error reports. Returns the one before.
-    std::string SetCurrentMethod(std::string name) { return std::exchange(m_currentMethod, std::move(name)); }
+    std::string SetCurrentMethod(std::string name) { return std::exchange(m_CurrentMethod, std::move(name)); }
 
     // ---- For ScriptObject.
     // The object at that address; the caller owns a reference.
@@ -142,17 +142,17 @@ private:
     static void* Reallocate(void* pEngine, void* pOld, duk_size_t size);
     static void Free(void* pEngine, void* pOld);
 
-    Block m_blocks{&m_blocks, &m_blocks};
-    duk_context* m_pContext = nullptr;  // the one that runs: a coroutine has its own
-    bool m_alive = true;
-    bool m_running = false;
-    ExtensionRegistry* m_pExtensions = nullptr;
-    std::vector<NativeFunction> m_natives;
-    std::map<void*, ScriptObject*> m_objects;
-    std::vector<duk_uarridx_t> m_freeReferences;
-    duk_uarridx_t m_referenceCount = 0;
-    std::string m_currentMethod;
+    Block m_Blocks{&m_Blocks, &m_Blocks};
+    duk_context* m_PContext = nullptr;  // the one that runs: a coroutine has its own
+    bool m_Alive = true;
+    bool m_Running = false;
+    ExtensionRegistry* m_PExtensions = nullptr;
+    std::vector<NativeFunction> m_Natives;
+    std::map<void*, ScriptObject*> m_Objects;
+    std::vector<duk_uarridx_t> m_FreeReferences;
+    duk_uarridx_t m_ReferenceCount = 0;
+    std::string m_CurrentMethod;
     // Where the last throw happened: thrown values that are no Error do not know.
-    char m_throwFile[256] = "";
-    int m_throwLine = 0;
+    char m_ThrowFile[256] = "";
+    int m_ThrowLine = 0;
 };

@@ -18,20 +18,20 @@ void RefuseSymbol(duk_context* pContext)
 
 void ScriptObject::Release()
 {
-    if (--m_references > 0) return;
-    if (m_pEngine) m_pEngine->Forget(*this);
+    if (--m_References > 0) return;
+    if (m_PEngine) m_PEngine->Forget(*this);
     delete this;
 }
 
 template <class Body>
 bool ScriptObject::Evaluate(Body&& body, ASValue& result)
 {
-    if (!m_pEngine) {
+    if (!m_PEngine) {
         result = ASValue();
         return false;
     }
-    void* const pSelf = m_pHeapObject;
-    return m_pEngine->Evaluate(
+    void* const pSelf = m_PHeapObject;
+    return m_PEngine->Evaluate(
         [&](duk_context* pContext) {
             duk_push_heapptr(pContext, pSelf);
             body(pContext);
@@ -53,7 +53,7 @@ bool ScriptObject::IsInstanceOf(const char* pClassName)
 
 ASExtensionClass* ScriptObject::GetExtensionInstance()
 {
-    return m_pEngine && m_pEngine->Extensions() ? m_pEngine->Extensions()->InstanceOf(m_pHeapObject) : nullptr;
+    return m_PEngine && m_PEngine->Extensions() ? m_PEngine->Extensions()->InstanceOf(m_PHeapObject) : nullptr;
 }
 
 bool ScriptObject::GetProperty(const char* pName, ASValue& value)
@@ -99,7 +99,7 @@ bool ScriptObject::GetElement(uint32_t index, ASValue& value)
 
 bool ScriptObject::Call(const char* pFunctionName, const ASValueArray& arguments, ASValue& result)
 {
-    if (m_pEngine && !m_pEngine->Running()) {
+    if (m_PEngine && !m_PEngine->Running()) {
         result = ASValue();
         return false;
     }
@@ -127,22 +127,22 @@ bool ScriptObject::Construct(const char* pClassName, const ASValueArray& argumen
 
 void ScriptObject::StartUpdates()
 {
-    if (m_pEngine && m_pEngine->Extensions()) m_pEngine->Extensions()->StartUpdates(*this);
+    if (m_PEngine && m_PEngine->Extensions()) m_PEngine->Extensions()->StartUpdates(*this);
 }
 
 void ScriptObject::StopUpdates()
 {
-    if (m_pEngine && m_pEngine->Extensions()) m_pEngine->Extensions()->StopUpdates(*this);
+    if (m_PEngine && m_PEngine->Extensions()) m_PEngine->Extensions()->StopUpdates(*this);
 }
 
 double ScriptObject::ToNumber(const ASValue& value)
 {
-    return m_pEngine ? m_pEngine->ToNumber(value) : NAN;
+    return m_PEngine ? m_PEngine->ToNumber(value) : NAN;
 }
 
 bool ScriptObject::ToText(const ASValue& value, AEString& text)
 {
-    if (m_pEngine) return m_pEngine->ToText(value, text);
+    if (m_PEngine) return m_PEngine->ToText(value, text);
     text = AEString();
     return false;
 }

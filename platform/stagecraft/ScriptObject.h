@@ -10,9 +10,9 @@ class ScriptEngine;
 class ScriptObject final : public ae::stagecraft::ASObject {
 public:
     // The maker owns the first reference.
-    ScriptObject(ScriptEngine& engine, void* pHeapObject) : m_pEngine(&engine), m_pHeapObject(pHeapObject) {}
+    ScriptObject(ScriptEngine& engine, void* pHeapObject) : m_PEngine(&engine), m_PHeapObject(pHeapObject) {}
 
-    void AddRef() override { ++m_references; }
+    void AddRef() override { ++m_References; }
     void Release() override;
     bool IsInstanceOf(const char* pClassName) override;
     ae::stagecraft::ASExtensionClass* GetExtensionInstance() override;
@@ -31,14 +31,14 @@ public:
 
     // The object's address in the engine: its identity, valid as long as this object has references. Null once the
     // engine is gone.
-    void* HeapObject() const { return m_pHeapObject; }
+    void* HeapObject() const { return m_PHeapObject; }
 
     // ---- For the engine.
-    duk_uarridx_t m_slot = 0;  // in its table of references
+    duk_uarridx_t m_Slot = 0;  // in its table of references
     void Detach()              // it goes
     {
-        m_pEngine = nullptr;
-        m_pHeapObject = nullptr;
+        m_PEngine = nullptr;
+        m_PHeapObject = nullptr;
     }
 
 private:
@@ -47,7 +47,7 @@ private:
     template <class Body>
     bool Evaluate(Body&& body, ae::stagecraft::ASValue& result);
 
-    ScriptEngine* m_pEngine;
-    void* m_pHeapObject;
-    unsigned m_references = 1;
+    ScriptEngine* m_PEngine;
+    void* m_PHeapObject;
+    unsigned m_References = 1;
 };

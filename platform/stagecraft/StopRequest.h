@@ -11,46 +11,46 @@ class StopRequest {
 public:
     void Raise()
     {
-        const std::lock_guard<std::mutex> lock(m_mutex);
-        if (m_raised) return;
-        m_raised = true;
-        if (m_pBreakTimer) m_pBreakTimer->Start(kScriptGrace);
-        m_wake.notify_all();
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        if (m_Raised) return;
+        m_Raised = true;
+        if (m_PBreakTimer) m_PBreakTimer->Start(kScriptGrace);
+        m_Wake.notify_all();
     }
 
     // Forgets requests: they were for an earlier movie, or for none.
     void Reset()
     {
-        const std::lock_guard<std::mutex> lock(m_mutex);
-        m_raised = false;
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        m_Raised = false;
     }
 
     // The timer that a request raised from now on starts; null: none. A request raised before starts nothing.
     void SetBreakTimer(BreakTimer* pTimer)
     {
-        const std::lock_guard<std::mutex> lock(m_mutex);
-        m_pBreakTimer = pTimer;
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        m_PBreakTimer = pTimer;
     }
 
     bool Raised() const
     {
-        const std::lock_guard<std::mutex> lock(m_mutex);
-        return m_raised;
+        const std::lock_guard<std::mutex> lock(m_Mutex);
+        return m_Raised;
     }
 
     // Blocks until then at the latest; whether a request was raised.
     bool WaitUntil(std::chrono::steady_clock::time_point then)
     {
-        std::unique_lock<std::mutex> lock(m_mutex);
-        return m_wake.wait_until(lock, then, [this] { return m_raised; });
+        std::unique_lock<std::mutex> lock(m_Mutex);
+        return m_Wake.wait_until(lock, then, [this] { return m_Raised; });
     }
 
 private:
     // How long the script may go on after a stop request before it is broken off.
     static constexpr std::chrono::milliseconds kScriptGrace{1000};
 
-    mutable std::mutex m_mutex;
-    std::condition_variable m_wake;
-    bool m_raised = false;
-    BreakTimer* m_pBreakTimer = nullptr;
+    mutable std::mutex m_Mutex;
+    std::condition_variable m_Wake;
+    bool m_Raised = false;
+    BreakTimer* m_PBreakTimer = nullptr;
 };

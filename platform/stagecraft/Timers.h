@@ -19,7 +19,7 @@ public:
                  ae::stagecraft::ASValueArray arguments);
     // A number that stands for no timer does nothing.
     void Remove(uint32_t number);
-    bool empty() const { return m_timers.empty(); }
+    bool empty() const { return m_Timers.empty(); }
 
     // Calls what is due, the earliest first, at equal times in the order of creation. Timers that these calls start
     // wait for the next run; an interval is called once however late the run is.
@@ -36,6 +36,6 @@ private:
     };
     std::vector<Timer>::iterator Find(uint32_t number);
 
-    std::vector<Timer> m_timers;
-    uint32_t m_lastNumber = 0;
+    std::vector<Timer> m_Timers;
+    uint32_t m_LastNumber = 0;
 };

@@ -137,7 +137,7 @@ TEST(CacheDocument, Tables)
     for (const char* name : {"Service", "Userdata", "BoxArt", "Cache"}) {
         const auto columns = [&](const std::string& what, const std::string& which) {
             const std::string from = " || ',' FROM pragma_table_info('" + std::string(name) + "') ";
-            const std::string list = file.Query("SELECT " + what + from + which);
+            const std::string list = file.Query(std::string("SELECT ").append(what).append(from).append(which));
             return list.substr(0, list.rfind(','));
         };
         table += Row({Code(name), columns("name || ' ' || type", ""), columns("name", "WHERE pk > 0 ORDER BY pk")});

@@ -45,7 +45,7 @@ TEST(ThreadsDocument, HasEveryLock)
     std::set<std::string> locks = Find(declaration);
     locks.merge(Find(std::regex("\nZVMutex& (\\w+)\\(\\)\n")));
     // What the classes of locks are made of.
-    for (const char* own : {"ZVMutex.h m_Mutex", "Kernel.cpp m_mutex"})
+    for (const char* own : {"ZVMutex.h m_Mutex", "Kernel.cpp m_Mutex"})
         EXPECT_EQ(1u, locks.erase(own)) << own;
     EXPECT_EQ(locks, Rows("Locks"));
 }

@@ -269,6 +269,7 @@ TEST_F(Methods, AnswerWhatTheStoreHolds)
     const std::vector<Row> rows = Rows(*store);
     // What later rows change is read before, and what they change to, after the movie has ended.
     std::vector<std::string> expected;
+    expected.reserve(std::size(rows));
     for (const Row& row : rows)
         expected.push_back(store->Query(row.expected));
 

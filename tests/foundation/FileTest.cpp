@@ -74,6 +74,7 @@ TEST(FileTest, MakesAFolderThatOthersMakeAtTheSameTime)
         const std::string path = folder / (std::to_string(round) + "/a/b/c");
         std::atomic<int> ready{0}, made{0};
         std::vector<std::thread> threads;
+        threads.reserve(kTogether);
         for (int i = 0; i < kTogether; ++i) {
             threads.emplace_back([&] {
                 for (++ready; ready < kTogether;)

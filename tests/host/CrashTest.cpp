@@ -214,7 +214,7 @@ class CrashTest : public testing::Test {
 protected:
     Environment Variables(const Environment& more = {})
     {
-        Environment environment = {{"STAGECRAFT_MOVIE", m_folder.Write("movie.js", kRunsOn)},
+        Environment environment = {{"STAGECRAFT_MOVIE", m_Folder.Write("movie.js", kRunsOn)},
                                    // A sanitizer's own handlers would be the actions from before.
                                    {"TSAN_OPTIONS", "handle_segv=0"},
                                    {"ASAN_OPTIONS", "handle_segv=0"}};
@@ -240,7 +240,7 @@ protected:
         EXPECT_EQ(0, syscall(SYS_tgkill, process.Pid(), thread, signal));
     }
 
-    TempFolder m_folder;
+    TempFolder m_Folder;
 };
 
 TEST_F(CrashTest, SegvLeavesTheProcessPaused)

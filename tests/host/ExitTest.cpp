@@ -18,29 +18,29 @@ class ExitTest : public testing::Test {
 protected:
     Environment WithMovie(const std::string& movie)
     {
-        return {{"ZV_IPC_SOCKET", m_folder / "player"}, {"STAGECRAFT_MOVIE", m_folder.Write("movie.js", movie)}};
+        return {{"ZV_IPC_SOCKET", m_Folder / "player"}, {"STAGECRAFT_MOVIE", m_Folder.Write("movie.js", movie)}};
     }
 
     // Everything that the player system must have got, up to the end of the connection.
     void ExpectReceived(const std::vector<uint32_t>& types)
     {
         for (const uint32_t type : types) {
-            EXPECT_EQ(Player::Message(type), m_player.Receive());
+            EXPECT_EQ(Player::Message(type), m_Player.Receive());
         }
-        EXPECT_EQ("", m_player.Receive());
+        EXPECT_EQ("", m_Player.Receive());
     }
 
-    TempFolder m_folder;
-    Player m_player{m_folder / "player"};
+    TempFolder m_Folder;
+    Player m_Player{m_Folder / "player"};
 };
 
 TEST_F(ExitTest, ActiveExit)
 {
     Process host({ZV_STAGECRAFT, "5"}, WithMovie(kEndsAtOnce));
-    m_player.Accept();
-    m_player.Send(1);
-    EXPECT_EQ(Player::Message(5), m_player.Receive());
-    m_player.Send(6);
+    m_Player.Accept();
+    m_Player.Send(1);
+    EXPECT_EQ(Player::Message(5), m_Player.Receive());
+    m_Player.Send(6);
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"hello"}) + ActiveExitLines(),
                         ListenLines({InitMessage(), DoneMessage()})));
@@ -57,23 +57,23 @@ TEST_F(ExitTest, TheErrorStreamEndsWithWhatTheMovieDid)
                                                         {"setTimeout(function () { nothing(); }, 0);", "script error"}};
     for (const auto& [movie, end] : rows) {
         Process host({ZV_STAGECRAFT, "5"}, WithMovie(movie));
-        m_player.Accept();
+        m_Player.Accept();
         ASSERT_TRUE(host.WaitForLine("[ZV_FLASH] ZV FLASH Run End "));
-        m_player.SendBytes("x");
-        m_player.Send(6);
+        m_Player.SendBytes("x");
+        m_Player.Send(6);
         EXPECT_EQ(0, host.WaitForEnd());
         const Lines errors = host.Errors();
         ASSERT_GE(errors.size(), 2u);
         EXPECT_EQ("player: dropped a packet of 1 bytes, a message has 16", errors[errors.size() - 2]);
         EXPECT_EQ(std::string("movie ended: ") + end, errors.back());
-        m_player.Close();
+        m_Player.Close();
     }
 }
 
 TEST_F(ExitTest, ActiveExitThatNobodyAcknowledges)
 {
     Process host({ZV_STAGECRAFT, "5"}, WithMovie(kEndsAtOnce));
-    m_player.Accept();
+    m_Player.Accept();
     EXPECT_EQ(0, host.WaitForEnd());
     ExpectReceived({5});
 }
@@ -99,14 +99,14 @@ TEST_F(ExitTest, RequestedCloseWhileACallHangs)
             "setInterval(function () {}, 10);");
         environment.emplace_back("ZV_DEPLOYMENT", store->DeploymentFile());
         Process host({ZV_STAGECRAFT, "5"}, environment);
-        m_player.Accept();
+        m_Player.Accept();
         ASSERT_TRUE(store->WaitForRequests(row.requests));
         const auto asked = std::chrono::steady_clock::now();
-        m_player.Send(3);
+        m_Player.Send(3);
         EXPECT_EQ(0, host.WaitForEnd());
         EXPECT_LT(std::chrono::steady_clock::now() - asked, std::chrono::seconds(3));
         ExpectReceived({4});
-        m_player.Close();
+        m_Player.Close();
     }
 }
 
@@ -114,13 +114,13 @@ TEST_F(ExitTest, RequestedCloseWhileACallHangs)
 TEST_F(ExitTest, RequestedCloseBeforeTheMovieHasBegun)
 {
     Environment environment = WithMovie("");
-    environment.back().second = m_folder / "fifo";
-    ASSERT_EQ(0, mkfifo((m_folder / "fifo").c_str(), 0600));
+    environment.back().second = m_Folder / "fifo";
+    ASSERT_EQ(0, mkfifo((m_Folder / "fifo").c_str(), 0600));
     Process host({ZV_STAGECRAFT, "5"}, environment);
-    m_player.Accept();
-    m_player.Send(3);
+    m_Player.Accept();
+    m_Player.Send(3);
     ASSERT_TRUE(host.WaitForLine("<ZV_FLASH> ipc listener thread main has exit!"));
-    std::ofstream(m_folder / "fifo") << kRunsOn;
+    std::ofstream(m_Folder / "fifo") << kRunsOn;
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines() + ReleaseLines(), ListenLines({UninitMessage()})));
     ExpectReceived({4});
@@ -129,9 +129,9 @@ TEST_F(ExitTest, RequestedCloseBeforeTheMovieHasBegun)
 TEST_F(ExitTest, PlayerSystemGoes)
 {
     Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
-    m_player.Accept();
+    m_Player.Accept();
     ASSERT_TRUE(host.WaitForLine("running"));
-    m_player.Close();
+    m_Player.Close();
     EXPECT_EQ(0, host.WaitForEnd());
     const Lines nothingSent = {"[ZV_FLASH] ipc thread already exit, now do nothing! ", "[ZV_FLASH] ZV FLASH Run End "};
     EXPECT_TRUE(IsMerge(host.Output(), StartLines() + MovieLines({"running"}) + FinalizeLines() + nothingSent,
@@ -142,14 +142,14 @@ TEST_F(ExitTest, PlayerSystemGoes)
 TEST_F(ExitTest, RequestedClose)
 {
     Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
-    m_player.Accept();
+    m_Player.Accept();
     ASSERT_TRUE(host.WaitForLine("running"));
-    m_player.Send(7);
-    m_player.SendBytes(std::string(15, 'x'));
-    m_player.Send(2);
-    m_player.SendBytes(Player::Message(3) + "x");
-    m_player.Send(0xFFFFFFFFu);
-    m_player.SendBytes(Player::Message(3).substr(0, 4) + std::string(12, '\x7f'));  // words 1 to 3 do not count
+    m_Player.Send(7);
+    m_Player.SendBytes(std::string(15, 'x'));
+    m_Player.Send(2);
+    m_Player.SendBytes(Player::Message(3) + "x");
+    m_Player.Send(0xFFFFFFFFu);
+    m_Player.SendBytes(Player::Message(3).substr(0, 4) + std::string(12, '\x7f'));  // words 1 to 3 do not count
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(
         host.Output(), StartLines() + MovieLines({"running"}) + ReleaseLines(),
@@ -163,13 +163,13 @@ TEST_F(ExitTest, RequestedClose)
 TEST_F(ExitTest, FloodOfMessages)
 {
     Process host({ZV_STAGECRAFT, "5"}, WithMovie(kRunsOn));
-    m_player.Accept();
+    m_Player.Accept();
     ASSERT_TRUE(host.WaitForLine("running"));
     const size_t kMany = 500;  // fewer bytes of output than its pipe holds
     for (size_t i = 0; i < kMany; ++i) {
-        m_player.Send(8);
+        m_Player.Send(8);
     }
-    m_player.Send(3);
+    m_Player.Send(3);
     EXPECT_EQ(0, host.WaitForEnd());
     std::vector<Lines> messages(kMany, Lines{"[ZV_FLASH] IPC get 8 "});
     messages.push_back(UninitMessage());
@@ -179,7 +179,7 @@ TEST_F(ExitTest, FloodOfMessages)
 TEST_F(ExitTest, NoQueue)
 {
     Environment environment = WithMovie("setInterval(function () {}, 10);");
-    environment.front().second = m_folder / "nobody";
+    environment.front().second = m_Folder / "nobody";
     Process host({ZV_STAGECRAFT, "5"}, environment);
     EXPECT_EQ(0, host.WaitForEnd());
     Lines start = StartLines();
@@ -187,7 +187,7 @@ TEST_F(ExitTest, NoQueue)
     const Lines nothingSent = {"[ZV_FLASH] ipc thread already exit, now do nothing! ", "[ZV_FLASH] ZV FLASH Run End "};
     EXPECT_TRUE(IsMerge(host.Output(), start + MovieLines() + FinalizeLines() + nothingSent,
                         ListenLines({ReceiveFailure(ENOTCONN)})));
-    EXPECT_EQ((Lines{"player: no queue to the player system at " + m_folder / "nobody" + ": No such file or directory",
+    EXPECT_EQ((Lines{"player: no queue to the player system at " + m_Folder / "nobody" + ": No such file or directory",
                      "movie ended: stopped"}),
               host.Errors());
 }
@@ -195,11 +195,11 @@ TEST_F(ExitTest, NoQueue)
 TEST_F(ExitTest, StageWindowSetFails)
 {
     Environment environment = WithMovie("");
-    environment.back().second = m_folder / "no movie";
+    environment.back().second = m_Folder / "no movie";
     Process host({ZV_STAGECRAFT, "5"}, environment);
-    m_player.Accept();
-    EXPECT_EQ(Player::Message(5), m_player.Receive());
-    m_player.Send(6);
+    m_Player.Accept();
+    EXPECT_EQ(Player::Message(5), m_Player.Receive());
+    m_Player.Send(6);
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(host.Output(),
                         StartLines() + Lines{"[ZV_FLASH]CreateAndConfigureStageWindowSet fail "} + ActiveExitLines(),
@@ -209,10 +209,10 @@ TEST_F(ExitTest, StageWindowSetFails)
 // A copy of the program that finds no runtime beside itself; the second time without a queue either.
 TEST_F(ExitTest, RuntimeLibraryMissing)
 {
-    std::filesystem::copy_file(ZV_STAGECRAFT, m_folder / "zv_stagecraft");
-    const Lines arguments = {m_folder / "zv_stagecraft", "5"};
+    std::filesystem::copy_file(ZV_STAGECRAFT, m_Folder / "zv_stagecraft");
+    const Lines arguments = {m_Folder / "zv_stagecraft", "5"};
     Process host(arguments, WithMovie(kEndsAtOnce));
-    m_player.Accept();
+    m_Player.Accept();
     EXPECT_EQ(0, host.WaitForEnd());
     EXPECT_TRUE(IsMerge(host.Output(), StartLines() + ReleaseLines(), ListenLines({ReceiveFailure(ENOTCONN)})));
     EXPECT_EQ(Lines{"Failed to load libIAEKernel.so: libIAEKernel.so: cannot open shared object file: No such file or "
@@ -220,7 +220,7 @@ TEST_F(ExitTest, RuntimeLibraryMissing)
               host.Errors());
     ExpectReceived({4});
 
-    Process alone(arguments, {{"ZV_IPC_SOCKET", m_folder / "nobody"}});
+    Process alone(arguments, {{"ZV_IPC_SOCKET", m_Folder / "nobody"}});
     EXPECT_TRUE(alone.WaitForLine("[ZV_FLASH] IPC:,NETWORK_MSG_STUB_UNINIT_RET failed! ERR = "));
     EXPECT_EQ(0, alone.WaitForEnd());
 }

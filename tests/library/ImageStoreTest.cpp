@@ -141,7 +141,7 @@ TEST_F(Images, FilesWithoutARowDoNotPileUp)
 TEST_F(Images, OpeningSweepsTheFolder)
 {
     const auto touch = [&](const std::string& name, int daysAgo = 0) {
-        const std::string file = folder + "/" + name;
+        std::string file = folder + "/" + name;
         if (!fs::exists(file)) std::ofstream(file) << "left over";
         fs::last_write_time(file, fs::file_time_type::clock::now() - std::chrono::hours(24 * daysAgo));
         return file;

@@ -234,7 +234,8 @@ TEST_F(Stale, AnotherCustomerOnTheSamePlayer)
             ZV_WS_Session* const actor = isByDuplicate ? &other : &session;
             const auto all = [&](const char* standing) {
                 store->ClearLog();
-                const std::string one = seen(&session), two = seen(&other);
+                std::string one = seen(&session);
+                const std::string two = seen(&other);
                 EXPECT_EQ(one, two);
                 for (const LoggedRequest& request : store->Log())
                     EXPECT_NE(0, std::count(request.soap.begin(), request.soap.end(),

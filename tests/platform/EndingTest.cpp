@@ -26,7 +26,7 @@ TEST_F(RuntimeTest, MoviesEndAndNothingFollows)
         AEString how;
         call.object.ToText(call.arguments[0], how);
         if (how == "end") call.pWindow->EndMovie();
-        if (how == "stop") m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+        if (how == "stop") m_PRuntime->SendRequest(IStagecraft::kRequestStop);
     };
     Probe::s_onUpdate = [](const Invocation& call) {
         Probe::s_lines.push_back("end in update");
@@ -39,19 +39,19 @@ TEST_F(RuntimeTest, MoviesEndAndNothingFollows)
 // Before there is a set, when it is gone, and before it runs; and unknown codes.
 TEST_F(RuntimeTest, StopRequestsAreForTheSetThatIsThere)
 {
-    m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+    m_PRuntime->SendRequest(IStagecraft::kRequestStop);
     EXPECT_EQ(Logged("probe.log('one');"), Lines{"one"});
-    m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+    m_PRuntime->SendRequest(IStagecraft::kRequestStop);
     EXPECT_EQ(Logged("probe.log('two');"), Lines{"two"});
     Probe::s_run = [&](const Invocation&) {
         for (const uint32_t code : {0u, 0x400000u, 0x400101u, 0xFFFFFFFFu}) {
-            m_pRuntime->SendRequest(code);
+            m_PRuntime->SendRequest(code);
         }
     };
     EXPECT_EQ(Logged("probe.run(); setTimeout(function() { probe.log('three'); }, 0);"), Lines{"three"});
     WriteMovie("probe.log('never');");
     ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
-    m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+    m_PRuntime->SendRequest(IStagecraft::kRequestStop);
     EXPECT_EQ(Run().m_nErrorValue, AEError::OK);
     EXPECT_EQ(Probe::s_lines, Lines{"three"});
 }
@@ -63,7 +63,7 @@ TEST_F(RuntimeTest, AStopRequestComesBeforeTheNextTick)
     Probe::s_run = [&](const Invocation&) { running.set_value(); };
     std::thread listener([&] {
         running.get_future().wait();
-        m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+        m_PRuntime->SendRequest(IStagecraft::kRequestStop);
     });
     EXPECT_EQ(Logged("setTimeout(function() { probe.log('never'); }, 0); probe.run();"), Lines{});
     listener.join();
@@ -75,7 +75,7 @@ TEST_F(RuntimeTest, StopRequestsAtAnyTime)
     std::atomic<bool> done{false};
     std::thread listener([&] {
         while (!done) {
-            m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+            m_PRuntime->SendRequest(IStagecraft::kRequestStop);
             std::this_thread::yield();
         }
     });
@@ -120,13 +120,13 @@ TEST_F(RuntimeTest, EndlessScriptsAreBrokenOffByAStopRequest)
         Probe::s_onUpdate = [&](const Invocation& call) { callsScript(call.object); };
         std::thread listener([&] {
             endless.get_future().wait();
-            m_pRuntime->SendRequest(IStagecraft::kRequestStop);
-            m_pRuntime->SendRequest(IStagecraft::kRequestStop);
+            m_PRuntime->SendRequest(IStagecraft::kRequestStop);
+            m_PRuntime->SendRequest(IStagecraft::kRequestStop);
         });
         Probe::s_lines.clear();
         EXPECT_EQ(Play(pScript).m_nErrorValue, AEError::Generic);
         listener.join();
-        EXPECT_EQ(m_errors.rfind("script error: ", 0), 0u) << m_errors;
+        EXPECT_EQ(m_Errors.rfind("script error: ", 0), 0u) << m_Errors;
         EXPECT_EQ(Probe::s_lines, expected);
 
         // The runtime is as good as new.

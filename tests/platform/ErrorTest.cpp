@@ -46,32 +46,32 @@ TEST_F(RuntimeTest, ScriptErrorsTellMessageFileAndLine)
         Probe::s_lines.clear();
         EXPECT_EQ(Play(row.pScript).m_nErrorValue, row.ends ? AEError::Generic : AEError::OK) << row.pScript;
         EXPECT_EQ(Probe::s_lines, row.logged) << row.pScript;
-        EXPECT_EQ(m_errors.rfind("script error: ", 0), 0u) << m_errors;
+        EXPECT_EQ(m_Errors.rfind("script error: ", 0), 0u) << m_Errors;
         for (const std::string& part : row.reported) {
-            EXPECT_NE(m_errors.find(part), std::string::npos) << part << " in " << m_errors;
+            EXPECT_NE(m_Errors.find(part), std::string::npos) << part << " in " << m_Errors;
         }
     }
 }
 
 TEST_F(RuntimeTest, UnreadableMoviesAreOneLine)
 {
-    const std::string movie = m_movie;
+    const std::string movie = m_Movie;
     WriteMovie("probe.log('readable');");
     const std::pair<std::string, int> rows[] = {
-        {m_folder / "", EISDIR}, {m_folder / "absent.js", ENOENT}, {movie + "/below.js", ENOTDIR}, {"", ENOENT}};
+        {m_Folder / "", EISDIR}, {m_Folder / "absent.js", ENOENT}, {movie + "/below.js", ENOTDIR}, {"", ENOENT}};
     for (const auto& [path, reason] : rows) {
-        m_movie = path;
+        m_Movie = path;
         testing::internal::CaptureStderr();
         const AEError result = Create();
         const std::string line = testing::internal::GetCapturedStderr();
         EXPECT_EQ(result.m_nErrorValue, AEError::NotFound) << path;
-        EXPECT_TRUE(m_set.empty());
+        EXPECT_TRUE(m_Set.empty());
         EXPECT_NE(line.find(path), std::string::npos) << line;
         EXPECT_NE(line.find(strerror(reason)), std::string::npos) << line;
         EXPECT_EQ(std::count(line.begin(), line.end(), '\n'), 1) << line;
         EXPECT_EQ(Destroy().m_nErrorValue, AEError::OK);
     }
-    m_movie = movie;
+    m_Movie = movie;
     ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
     EXPECT_EQ(Run().m_nErrorValue, AEError::OK);
     EXPECT_EQ(Probe::s_lines, Lines{"readable"});

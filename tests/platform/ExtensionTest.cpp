@@ -8,16 +8,16 @@ namespace {
 
 TEST_F(RuntimeTest, ModulesAreLoadedByName)
 {
-    EXPECT_EQ(m_loadModule(IAEMODULE_STAGECRAFT), static_cast<void*>(m_pRuntime));
-    EXPECT_EQ(m_loadModule("IStagecraft2"), nullptr);
-    EXPECT_EQ(m_loadModule(nullptr), nullptr);
-    m_unloadModule("IStagecraft2");
+    EXPECT_EQ(m_LoadModule(IAEMODULE_STAGECRAFT), static_cast<void*>(m_PRuntime));
+    EXPECT_EQ(m_LoadModule("IStagecraft2"), nullptr);
+    EXPECT_EQ(m_LoadModule(nullptr), nullptr);
+    m_UnloadModule("IStagecraft2");
 }
 
 TEST_F(RuntimeTest, KernelMutexesExclude)
 {
     constexpr int kRounds = 20000;
-    IAEKernel::Mutex* pMutex = m_pKernel->CreateMutex();
+    IAEKernel::Mutex* pMutex = m_PKernel->CreateMutex();
     int count = 0;
     const auto work = [&] {
         for (int i = 0; i < kRounds; ++i) {
@@ -30,14 +30,14 @@ TEST_F(RuntimeTest, KernelMutexesExclude)
     work();
     other.join();
     EXPECT_EQ(count, 2 * kRounds);
-    m_pKernel->DestroyMutex(pMutex);
+    m_PKernel->DestroyMutex(pMutex);
 }
 
 using KernelDeathTest = RuntimeTest;
 
 TEST_F(KernelDeathTest, UsageFaultsAbort)
 {
-    EXPECT_EXIT(m_pKernel->AssertionFailed("pMutex != 0", "./Some.cpp", 47, "SetMutex"),
+    EXPECT_EXIT(m_PKernel->AssertionFailed("pMutex != 0", "./Some.cpp", 47, "SetMutex"),
                 testing::KilledBySignal(SIGABRT), "pMutex != 0.*\\./Some.cpp.*47.*SetMutex");
 }
 
@@ -47,7 +47,7 @@ TEST_F(RuntimeTest, RegistrationIsChecked)
                             IStagecraft::FiresEventsFunction firesEvents = &Probe::FiresEvents,
                             IStagecraft::ConstructInstanceFunction construct = &Probe::ConstructInstance,
                             IStagecraft::DestructInstanceFunction destruct = &Probe::DestructInstance) {
-        return m_pRuntime->RegisterExtensionClass(pName, getMethods, firesEvents, construct, destruct).m_nErrorValue;
+        return m_PRuntime->RegisterExtensionClass(pName, getMethods, firesEvents, construct, destruct).m_nErrorValue;
     };
     for (const char* pName : {static_cast<const char*>(nullptr), "", ".com", "com.", "com..Other", "com.example.Probe"})
         EXPECT_EQ(add(pName), AEError::InvalidParameters) << (pName ? pName : "null");
@@ -126,9 +126,9 @@ TEST_F(RuntimeTest, SetsFollowEachOther)
     WriteMovie("probe.log(typeof leftover); var leftover = 1;");
     for (int round = 0; round < 2; ++round) {
         ASSERT_EQ(Create().m_nErrorValue, AEError::OK);
-        EXPECT_EQ(m_set.size(), 1u);
+        EXPECT_EQ(m_Set.size(), 1u);
         AEArray<StageWindow*> second;
-        EXPECT_EQ(m_pRuntime->CreateAndConfigureStageWindowSet(second, 1, std::vector<const char*>{"x"}.data(), 1)
+        EXPECT_EQ(m_PRuntime->CreateAndConfigureStageWindowSet(second, 1, std::vector<const char*>{"x"}.data(), 1)
                       .m_nErrorValue,
                   AEError::Usage);
         EXPECT_TRUE(second.empty());

@@ -141,10 +141,10 @@ TEST_F(RuntimeTest, FailingOperationsReportAndReturn)
         };
         EXPECT_EQ(Play(std::string("probe.run(") + row.pObject + "); probe.log('on');").m_nErrorValue, AEError::OK);
         EXPECT_EQ(Probe::s_lines, (Lines{"native code goes on", "on"})) << row.pObject;
-        EXPECT_EQ(m_errors.rfind("script error: ", 0), 0u) << m_errors;
-        EXPECT_NE(m_errors.find("com.example.Probe.run"), std::string::npos) << m_errors;
+        EXPECT_EQ(m_Errors.rfind("script error: ", 0), 0u) << m_Errors;
+        EXPECT_NE(m_Errors.find("com.example.Probe.run"), std::string::npos) << m_Errors;
         for (const char* pPart : row.reported)
-            EXPECT_NE(m_errors.find(pPart), std::string::npos) << pPart << " in " << m_errors;
+            EXPECT_NE(m_Errors.find(pPart), std::string::npos) << pPart << " in " << m_Errors;
     }
 }
 

@@ -14,9 +14,9 @@ class QueueTest : public testing::Test {
 protected:
     QueueTest()
     {
-        setenv("ZV_IPC_SOCKET", (m_folder / "player").c_str(), 1);
+        setenv("ZV_IPC_SOCKET", (m_Folder / "player").c_str(), 1);
         EXPECT_EQ(0, init_network_msg_queue());
-        m_player.Accept();
+        m_Player.Accept();
     }
     ~QueueTest() override
     {
@@ -36,25 +36,25 @@ protected:
         return network_stub_send_ipc_msg(&message);
     }
 
-    TempFolder m_folder;
-    Player m_player{m_folder / "player"};
+    TempFolder m_Folder;
+    Player m_Player{m_Folder / "player"};
 };
 
 TEST_F(QueueTest, WordsAreLittleEndian)
 {
     EXPECT_EQ(0, Send());
-    EXPECT_EQ(std::string("\5\0\0\0\1\0\0\0\2\0\0\0\4\3\2\1", 16), m_player.Receive());
-    m_player.SendBytes(std::string("\1\2\0\0\0\0\0\0\0\0\0\0\0\0\1\0", 16));
+    EXPECT_EQ(std::string("\5\0\0\0\1\0\0\0\2\0\0\0\4\3\2\1", 16), m_Player.Receive());
+    m_Player.SendBytes(std::string("\1\2\0\0\0\0\0\0\0\0\0\0\0\0\1\0", 16));
     EXPECT_EQ("513 65536", Received());
 }
 
 TEST_F(QueueTest, MessagesSentBeforeThePlayerWentArrive)
 {
-    m_player.SendBytes("");
-    m_player.SendBytes("");
-    m_player.Send(7);
-    m_player.SendBytes("");
-    m_player.Close();
+    m_Player.SendBytes("");
+    m_Player.SendBytes("");
+    m_Player.Send(7);
+    m_Player.SendBytes("");
+    m_Player.Close();
     EXPECT_EQ("7 0", Received());
     EXPECT_EQ(strerror(ECONNRESET), Received());
     EXPECT_EQ(EPIPE, Send());
@@ -67,7 +67,7 @@ TEST_F(QueueTest, FullQueueDoesNotBlock)
         error = Send();
     }
     EXPECT_EQ(EAGAIN, error);
-    EXPECT_EQ(16u, m_player.Receive().size());
+    EXPECT_EQ(16u, m_Player.Receive().size());
     EXPECT_EQ(0, Send());
 }
 
@@ -81,8 +81,8 @@ TEST_F(QueueTest, ClosingEndsAReceive)
         receiver.join();
         EXPECT_EQ(ENOTCONN, Send());
         ASSERT_EQ(0, init_network_msg_queue());
-        m_player.Close();
-        m_player.Accept();
+        m_Player.Close();
+        m_Player.Accept();
     }
 }
 

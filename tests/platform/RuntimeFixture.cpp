@@ -37,7 +37,7 @@ void Probe::DestructInstance(StageWindow*, ASObject& object)
     EXPECT_EQ(std::this_thread::get_id(), s_mainThread);
     auto* pProbe = static_cast<Probe*>(object.GetExtensionInstance());
     ASSERT_NE(pProbe, nullptr);
-    if (!pProbe->m_name.empty()) s_lines.push_back("destructed " + pProbe->m_name);
+    if (!pProbe->m_Name.empty()) s_lines.push_back("destructed " + pProbe->m_Name);
     delete pProbe;
 }
 
@@ -50,7 +50,7 @@ void Probe::OnUpdate(StageWindow* pWindow, ASObject& object)
         ASValue unused;
         s_onUpdate({pWindow, object, none, unused});
     } else {
-        s_lines.push_back("update " + m_name);
+        s_lines.push_back("update " + m_Name);
     }
 }
 
@@ -93,44 +93,44 @@ void RuntimeTest::SetUp()
 {
     const char* pOther = getenv("STAGECRAFT_RUNTIME_LIBRARY");
     const char* pLibrary = pOther && *pOther ? pOther : RUNTIME_LIBRARY;
-    m_pLibrary = dlopen(pLibrary, RTLD_NOW | RTLD_GLOBAL);
-    ASSERT_NE(m_pLibrary, nullptr) << dlerror();
+    m_PLibrary = dlopen(pLibrary, RTLD_NOW | RTLD_GLOBAL);
+    ASSERT_NE(m_PLibrary, nullptr) << dlerror();
     const auto initialize =
-        reinterpret_cast<IAEModule_InitializeKernelFunction>(dlsym(m_pLibrary, IAEMODULE_INITIALIZE_KERNEL));
-    m_loadModule = reinterpret_cast<IAEModule_LoadModuleFunction>(dlsym(m_pLibrary, IAEMODULE_LOAD_MODULE));
-    m_unloadModule = reinterpret_cast<IAEModule_UnloadModuleFunction>(dlsym(m_pLibrary, IAEMODULE_UNLOAD_MODULE));
-    ASSERT_TRUE(initialize && m_loadModule && m_unloadModule);
+        reinterpret_cast<IAEModule_InitializeKernelFunction>(dlsym(m_PLibrary, IAEMODULE_INITIALIZE_KERNEL));
+    m_LoadModule = reinterpret_cast<IAEModule_LoadModuleFunction>(dlsym(m_PLibrary, IAEMODULE_LOAD_MODULE));
+    m_UnloadModule = reinterpret_cast<IAEModule_UnloadModuleFunction>(dlsym(m_PLibrary, IAEMODULE_UNLOAD_MODULE));
+    ASSERT_TRUE(initialize && m_LoadModule && m_UnloadModule);
 
     const char* const arguments[] = {"stagecraft"};
-    m_pKernel = initialize(1, arguments);
-    ASSERT_NE(m_pKernel, nullptr);
-    EXPECT_EQ(initialize(1, arguments), m_pKernel);
-    m_pRuntime = static_cast<IStagecraft*>(m_loadModule(IAEMODULE_STAGECRAFT));
-    ASSERT_NE(m_pRuntime, nullptr);
-    ASSERT_EQ(m_pRuntime->RegisterExtensionClass<Probe>().m_nErrorValue, AEError::OK);
+    m_PKernel = initialize(1, arguments);
+    ASSERT_NE(m_PKernel, nullptr);
+    EXPECT_EQ(initialize(1, arguments), m_PKernel);
+    m_PRuntime = static_cast<IStagecraft*>(m_LoadModule(IAEMODULE_STAGECRAFT));
+    ASSERT_NE(m_PRuntime, nullptr);
+    ASSERT_EQ(m_PRuntime->RegisterExtensionClass<Probe>().m_nErrorValue, AEError::OK);
 }
 
 void RuntimeTest::TearDown()
 {
-    if (m_pRuntime) {
+    if (m_PRuntime) {
         Destroy();
-        m_unloadModule(IAEMODULE_STAGECRAFT);
+        m_UnloadModule(IAEMODULE_STAGECRAFT);
     }
     EXPECT_EQ(Probe::s_deleted, Probe::s_constructed) << "each instance is destructed once";
-    if (m_pLibrary) dlclose(m_pLibrary);
+    if (m_PLibrary) dlclose(m_PLibrary);
 }
 
 void RuntimeTest::WriteMovie(const std::string& script)
 {
-    m_folder.Write("movie.js", "var Probe = com.example.Probe, probe = new Probe();\n" + script);
+    m_Folder.Write("movie.js", "var Probe = com.example.Probe, probe = new Probe();\n" + script);
 }
 
 AEError RuntimeTest::Create(const std::vector<const char*>& options)
 {
     std::vector<const char*> arguments{"stagecraft"};
     arguments.insert(arguments.end(), options.begin(), options.end());
-    arguments.push_back(m_movie.c_str());
-    return m_pRuntime->CreateAndConfigureStageWindowSet(m_set, static_cast<int>(arguments.size()), arguments.data(), 1);
+    arguments.push_back(m_Movie.c_str());
+    return m_PRuntime->CreateAndConfigureStageWindowSet(m_Set, static_cast<int>(arguments.size()), arguments.data(), 1);
 }
 
 AEError RuntimeTest::Play(const std::string& script, const std::vector<const char*>& options)
@@ -140,8 +140,8 @@ AEError RuntimeTest::Play(const std::string& script, const std::vector<const cha
     AEError result = Create(options);
     if (result.m_nErrorValue == AEError::OK) result = Run();
     EXPECT_EQ(Destroy().m_nErrorValue, AEError::OK);
-    m_errors = testing::internal::GetCapturedStderr();
-    EXPECT_TRUE(m_set.empty());
+    m_Errors = testing::internal::GetCapturedStderr();
+    EXPECT_TRUE(m_Set.empty());
     return result;
 }
 
@@ -149,6 +149,6 @@ Lines RuntimeTest::Logged(const std::string& script, const std::vector<const cha
 {
     Probe::s_lines.clear();
     EXPECT_EQ(Play(script, options).m_nErrorValue, AEError::OK) << script;
-    EXPECT_EQ(m_errors, "") << script;
+    EXPECT_EQ(m_Errors, "") << script;
     return Probe::s_lines;
 }

@@ -30,7 +30,7 @@ struct Invocation {
 
 class Probe final : public ASExtensionClass {
 public:
-    explicit Probe(std::string name) : m_name(std::move(name)) {}
+    explicit Probe(std::string name) : m_Name(std::move(name)) {}
     ~Probe() override { ++s_deleted; }
 
     static const char* GetClassName() { return "com.example.Probe"; }
@@ -52,11 +52,11 @@ public:
 private:
     void Log(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
     void Run(StageWindow* pWindow, ASObject& object, ASValueArray& arguments, ASValue& result);
-    void Name(StageWindow*, ASObject&, ASValueArray&, ASValue& result) { result = ASValue::String(m_name.c_str()); }
+    void Name(StageWindow*, ASObject&, ASValueArray&, ASValue& result) { result = ASValue::String(m_Name.c_str()); }
     void StartUpdates(StageWindow*, ASObject& object, ASValueArray&, ASValue&) { object.StartUpdates(); }
     void StopUpdates(StageWindow*, ASObject& object, ASValueArray&, ASValue&) { object.StopUpdates(); }
 
-    const std::string m_name;
+    const std::string m_Name;
 };
 
 class RuntimeTest : public ::testing::Test {
@@ -68,22 +68,22 @@ protected:
     // Writes the script, after the line that makes the probe, as the movie's file.
     void WriteMovie(const std::string& script);
     AEError Create(const std::vector<const char*>& options = {});
-    AEError Run() { return m_pRuntime->RunStageWindowSet(m_set); }
-    AEError Destroy() { return m_pRuntime->DestroyStageWindowSet(m_set); }
-    // All of it; the result is that of Run. What the movie printed to the error stream is in m_errors.
+    AEError Run() { return m_PRuntime->RunStageWindowSet(m_Set); }
+    AEError Destroy() { return m_PRuntime->DestroyStageWindowSet(m_Set); }
+    // All of it; the result is that of Run. What the movie printed to the error stream is in m_Errors.
     AEError Play(const std::string& script, const std::vector<const char*>& options = {});
     // Likewise for a movie in which nothing may fail; returns the lines it logged.
     Lines Logged(const std::string& script, const std::vector<const char*>& options = {});
 
-    void* m_pLibrary = nullptr;
-    IAEKernel* m_pKernel = nullptr;
-    IStagecraft* m_pRuntime = nullptr;
-    IAEModule_LoadModuleFunction m_loadModule = nullptr;
-    IAEModule_UnloadModuleFunction m_unloadModule = nullptr;
-    AEArray<StageWindow*> m_set;
-    const TempFolder m_folder;
-    std::string m_movie = m_folder / "movie.js";
-    std::string m_errors;
+    void* m_PLibrary = nullptr;
+    IAEKernel* m_PKernel = nullptr;
+    IStagecraft* m_PRuntime = nullptr;
+    IAEModule_LoadModuleFunction m_LoadModule = nullptr;
+    IAEModule_UnloadModuleFunction m_UnloadModule = nullptr;
+    AEArray<StageWindow*> m_Set;
+    const TempFolder m_Folder;
+    std::string m_Movie = m_Folder / "movie.js";
+    std::string m_Errors;
 };
 
 inline const char* TypeName(const ASValue& value)

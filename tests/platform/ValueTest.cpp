@@ -148,7 +148,7 @@ TEST_F(ValueTest, PropertiesThatCannotBeReadAreTold)
     for (const auto& [pExpression, expected] : rows) {
         EXPECT_EQ(Play(std::string("probe.run(") + pExpression + ");").m_nErrorValue, AEError::OK);
         EXPECT_EQ(Probe::s_lines, Lines{expected}) << pExpression;
-        EXPECT_NE(m_errors.find("com.example.Probe.run"), std::string::npos) << m_errors;
+        EXPECT_NE(m_Errors.find("com.example.Probe.run"), std::string::npos) << m_Errors;
     }
 }
 

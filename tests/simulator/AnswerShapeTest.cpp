@@ -162,7 +162,7 @@ TEST_F(AnswerShapeTest, BytesAreAsTheySay)
 {
     const std::vector<Reply> latin1 = Answers("latin1");
     EXPECT_EQ("text/xml; charset=ISO-8859-1", latin1[0].Header("Content-Type"));
-    EXPECT_NE(std::string::npos, latin1[0].body.find("\xe9"));
+    EXPECT_NE(std::string::npos, latin1[0].body.find('\xe9'));
     EXPECT_EQ(std::string::npos, latin1[0].body.find("\xc3\xa9"));
     EXPECT_EQ(0u, Answers("bom")[0].body.find("\xef\xbb\xbf<?xml"));
     for (const auto& [fault, count] : {std::pair<const char*, int>("", 1), {"absent-arrays", 0}}) {

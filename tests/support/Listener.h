@@ -30,7 +30,7 @@ public:
         // A queue that is full, from which nobody takes: the system drops what else comes.
         for (int i = 0; i < 2; ++i) {
             m_Sockets.push_back(socket(own.ss_family, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
-            connect(m_Sockets.back(), reinterpret_cast<sockaddr*>(&own), size);
+            static_cast<void>(connect(m_Sockets.back(), reinterpret_cast<sockaddr*>(&own), size));
         }
     }
     ~Listener()

@@ -176,7 +176,8 @@ TEST(Answer, TheAdultFlagIsYesOrNo)
     };
     for (const auto& row : rows) {
         const std::string name = "IsAdultVerificationEnabled";
-        const std::string element = row.content ? "<" + name + ">" + row.content + "</" + name + ">" : "";
+        std::string element;
+        if (row.content) element.append("<").append(name).append(">").append(row.content).append("</" + name + ">");
         SCOPED_TRACE(element);
         Exchange<DownloadAPI> exchange;
         _ZV1__checkAdultVerificationEnabled request;
