@@ -41,17 +41,17 @@ public:
 
     AnswerCache(SessionImpl& session, const Entry& entry) : m_Session(session), m_Cache(session), m_Entry(entry) {}
 
-    /// Fills the response from the cache. What it points to lives as long as this object. When there is none, the
-    /// request is to be sent after this.
-    template <class Response>
-    bool Find(Response& response)
+    /// Fills the response from the cache. What it points to lives as long as this object. When there is none, or none
+    /// for which `isWhole(response)`, the request is to be sent after this.
+    template <class Response, class IsWhole>
+    bool Find(Response& response, IsWhole isWhole)
     {
         bool found = false;
         WithinMemory([&] {
             ZVString text;
             if (!m_Entry.table || !m_Cache.Find(m_Entry.kind, m_Entry.table, m_Entry.key, text, m_Stamp)) return;
             m_Serializer = std::make_unique<Serializer>(true, false);
-            found = m_Serializer->Read(text, response);
+            found = m_Serializer->Read(text, response) && isWhole(response);
             if (!found) m_Stamp = m_Cache.Now();
         });
         return found;

@@ -192,8 +192,9 @@ private:
     void Make(Service& service, Convert& convert, Outcome& outcome)
     {
         AnswerCache cache(*m_Session, m_Entry);
-        Answer* answer = cache.Find(m_Response) ? Op::Result(m_Response) : nullptr;
-        const bool isCached = answer != nullptr;
+        const bool isCached =
+            cache.Find(m_Response, [](const auto& response) { return Op::Result(response) != nullptr; });
+        Answer* answer = isCached ? Op::Result(m_Response) : nullptr;
         if (!isCached) {
             outcome.result =
                 Exchange(service, Op::kName, Op::kOnce, [&] { return Op::Send(*m_Session, m_Request, m_Response); });

@@ -52,10 +52,11 @@ bool SessionCache::Find(ZV_WS_CacheParam::CacheData kind, const char* table, con
             found =
                 kind == kUserData ? m_Cache->ReadUserData(table, key, text) : m_Cache->ReadMetaData(table, key, text);
         }
+        found = found && !text.empty();
         if (!found) stamp = Now();
         return true;
     });
-    return found && !text.empty();
+    return found;
 }
 
 void SessionCache::Keep(ZV_WS_CacheParam::CacheData kind, const char* table, const ZVString& key, const ZVString& text,

@@ -26,8 +26,8 @@ public:
     void Output(int id, int severity, const char* text, unsigned int length) ZV_EXCLUDES(m_Mutex);
 
     /// For signal handlers: writes out what the log file's stream holds, and from then on each line at once. Does not
-    /// allocate. Waits half a second at most for a thread that is writing; in a process that is lost (`isFatal`) it
-    /// then goes ahead, else that thread does it.
+    /// allocate. While a thread is writing, it is left to that thread, but in a process that is lost (`isFatal`): there
+    /// this waits half a second at most for the thread, and then goes ahead.
     static void FlushInHandler(bool isFatal);
 
     static ZVString GetCurrentTime();

@@ -9,7 +9,6 @@
 namespace {
 
 constexpr ZV_WS_Status kGeneral = ZV_WS_Status_general_error;
-constexpr int kFamilySize = 1000;
 
 // How one function reads the service's response codes: entry n - 1 is the status of code n. The service numbers each
 // operation on its own, gaps included.

@@ -3,6 +3,7 @@
 #include <fstream>
 #include <functional>
 
+#include "Serializer.h"
 #include "SessionImpl.h"
 #include "Store.h"
 #include "TempFolder.h"
@@ -168,6 +169,21 @@ TEST_F(Cached, DuplicatesShareAFileAndNotTheMemory)
         EXPECT_EQ(ZV_WS_Status_ok, Asking(ZV_WS_getTitleListing, 12)(&copy));
         EXPECT_EQ(type == CacheType_File ? 1u : 2u, store->Log().size());
         ZV_WS_release(&copy);
+    }
+}
+
+// What cannot be used in a call's place is asked anew, once.
+TEST_F(Cached, WhatSaysNothingIsReplaced)
+{
+    ZVString noResult;
+    ASSERT_TRUE(Serializer(true, false).Write(_ZV1__getTitleListingResponse(), noResult));
+    for (const ZVString& text : {noResult, ZVString("no answer of ours")}) {
+        SCOPED_TRACE(text.length());
+        ASSERT_EQ(ZV_WS_Status_ok, Begin(CacheType_Memory));
+        ASSERT_TRUE(session._pSessionImpl->m_Cache->WriteMetaData("getTitleListing", "12", text));
+        for (int i = 0; i < 2; ++i)
+            EXPECT_EQ(ZV_WS_Status_ok, Listing());
+        EXPECT_EQ(1u, store->Log().size());
     }
 }
 
