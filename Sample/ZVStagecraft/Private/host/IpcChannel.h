@@ -1,8 +1,8 @@
 // The channel to the player's system software: the listen thread, what it does on each message, and the ways to end.
 #pragma once
 
-/// Opens the queue. 0, or -1 when that failed: the listen thread's first receive fails then, which ends the process as a
-/// queue that breaks does.
+/// Opens the queue. 0, or -1 when that failed: the listen thread's first receive fails then, which ends the process as
+/// a queue that breaks does.
 int zv_stagecraft_ipc_init();
 /// Does nothing: the queue is closed where its last message was sent or received.
 void zv_stagecraft_ipc_release();
