@@ -1,9 +1,5 @@
 // A service 100 ms away: how often the client waits for it until it has its first page, as a time that the way there
 // and back divides.
-#include <string.h>
-
-#include <fstream>
-
 #include "DelayLine.h"
 #include "NameServer.h"
 #include "Store.h"
@@ -18,14 +14,7 @@ class FarStore {
 public:
     FarStore() : m_Line("127.0.0.2", TheStore().HttpsPort(), kOneWay)
     {
-        std::ifstream from(TheStore().DeploymentFile());
-        std::ofstream to(m_Folder / "deployment.conf");
-        for (std::string line; std::getline(from, line);) {
-            const size_t host = line.find("localhost");
-            to << (host == std::string::npos ? line : line.replace(host, strlen("localhost"), kName)) << "\n";
-        }
-        to.close();
-        setenv("ZV_DEPLOYMENT", (m_Folder / "deployment.conf").c_str(), 1);
+        setenv("ZV_DEPLOYMENT", NamedDeployment(TheStore().DeploymentFile(), kName, m_Folder).c_str(), 1);
     }
     ~FarStore() { setenv("ZV_DEPLOYMENT", TheStore().DeploymentFile().c_str(), 1); }
     FarStore(const FarStore&) = delete;

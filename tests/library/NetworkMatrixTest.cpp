@@ -45,14 +45,7 @@ protected:
     {
         if (GetParam().column == kBandwidth) GTEST_SKIP() << "needs no name that is not in the hosts file";
         ASSERT_NO_FATAL_FAILURE(OpenStore());
-        std::ifstream from(store->DeploymentFile());
-        std::ofstream to(m_Folder / "deployment.conf");
-        for (std::string line; std::getline(from, line);) {
-            const size_t host = line.find("localhost");
-            to << (host == std::string::npos ? line : line.replace(host, strlen("localhost"), kName)) << "\n";
-        }
-        to.close();
-        setenv("ZV_DEPLOYMENT", (m_Folder / "deployment.conf").c_str(), 1);
+        setenv("ZV_DEPLOYMENT", NamedDeployment(store->DeploymentFile(), kName, m_Folder).c_str(), 1);
         ServeNames(NameServer::Fault::None);
         ASSERT_NO_FATAL_FAILURE(Begin(CacheFolder()));
         ASSERT_LT(0, m_Names->Asked(kName));

@@ -125,3 +125,18 @@ std::string NameServer::Answer(std::string question)
     if (m_Fault == Fault::CutShort) answer.resize(answer.size() - 3);
     return answer;
 }
+
+std::string NamedDeployment(const std::string& file, const std::string& name, const TempFolder& folder)
+{
+    static const std::string kLocal = "localhost";
+    const std::string path = folder / "deployment.conf";
+    std::ifstream from(file);
+    std::ofstream to(path);
+    for (std::string line; std::getline(from, line);) {
+        const size_t host = line.find(kLocal);
+        to << (host == std::string::npos ? line : line.replace(host, kLocal.size(), name)) << "\n";
+    }
+    to.close();
+    Require(bool(to), "a deployment file");
+    return path;
+}

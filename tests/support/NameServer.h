@@ -55,3 +55,6 @@ private:
     std::set<int> m_Ignored;
     std::thread m_Thread;
 };
+
+/// Writes a deployment like that file's, with the name in place of "localhost", into the folder; returns its path.
+std::string NamedDeployment(const std::string& file, const std::string& name, const TempFolder& folder);
